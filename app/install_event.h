@@ -1,0 +1,128 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+#include "history/ini_file.h"
+
+// The record of one event: what this run's command line says of it, and the accessors of what the
+// history file says of it. The two differ on purpose: the fields are this run's, the keys are the
+// event's.
+//
+// Nothing here reports a failure. A step that fails has no effect, the steps behind it still run,
+// and a key that is missing reads as an empty text.
+class CInstallEvent {
+ public:
+  // The record for this run. A "-start" writes the first contents of the event's section and makes
+  // the event's folder. With Valid false nothing was written and the paths are empty.
+  CInstallEvent(int argc, char** argv);
+
+  // A record to read an event of the history with: only the accessors and CollectFiles may be used.
+  explicit CInstallEvent(const std::string& identity);
+
+  // Runs the steps of the event's kind, in their order. (app/event_dispatch.cpp)
+  void Dispatch();
+
+  // Copies the installer's log, trace and response file into the event's folder and turns their
+  // keys to the copies. A file that is missing or whose target exists is left alone, so that any
+  // number of calls give the same. (report/collected_files.cpp)
+  void CollectFiles();
+
+  // The keys of the event's section, read at each call: at most 255 bytes come back.
+  // (history/event_keys.cpp)
+  std::string GetLogFileName() const;
+  std::string GetTraceFile() const;
+  std::string GetResponseFile() const;
+  std::string GetCopyName() const;
+  std::string GetAction() const;
+  std::string GetCommandLine() const;
+  std::string GetPath() const;
+  std::string GetEventLogFile() const;
+  std::string GetEventID() const;
+  std::string GetResult() const;
+  std::string GetType() const;
+  std::string GetCompleteFlag() const;
+  std::string GetWiLogFile() const;
+  std::string GetEndTime() const;
+  std::string GetStartTime() const;
+  std::string GetVersion() const;
+  std::string GetServiceLevel() const;
+  std::string GetProduct() const;
+
+  // Their twins write the key whole, whatever its length; the fields below do not follow.
+  void SetLogFileName(const std::string& value);
+  void SetTraceFile(const std::string& value);
+  void SetResponseFile(const std::string& value);
+  void SetCopyName(const std::string& value);
+  void SetAction(const std::string& value);
+  void SetCommandLine(const std::string& value);
+  void SetPath(const std::string& value);
+  void SetEventLogFile(const std::string& value);
+  void SetEventID(const std::string& value);
+  void SetResult(const std::string& value);
+  void SetType(const std::string& value);
+  void SetCompleteFlag(const std::string& value);
+  void SetWiLogFile(const std::string& value);
+  void SetEndTime(const std::string& value);
+  void SetStartTime(const std::string& value);
+  void SetVersion(const std::string& value);
+  void SetServiceLevel(const std::string& value);
+  void SetProduct(const std::string& value);
+
+  std::string EventID;       // names the event's section and folder
+  bool Valid = false;        // the command line named an event
+  std::string Mode;          // "-start", "-end", "-logmessage", or empty
+  std::string EventLogPath;  // ORXInstallEvent.Log in the event's folder
+  std::string LogFile;
+  std::string TraceFile;
+  std::string ResponseFile;
+  std::string CommandLine;
+  std::string EventFolder;
+  std::string CopyName;
+  std::string Message;
+  std::string Action;
+  std::string Type;
+  std::string Path;
+  std::string Result;
+  std::string Product;
+  std::string Version;
+  std::string ServiceLevel;
+  int32_t SectionNumber = 0;  // of the snapshot's next section
+  CIniFile Ini;
+
+ private:
+  void ParseOptions(int argc, char** argv);
+  void CheckMode();
+  void WriteDefaults();
+
+  // True when the event's folder exists afterwards; otherwise a text on standard output says that
+  // it does not.
+  bool CreateEventFolder() const;
+
+  void OpenEventLog() const;
+  void RecordStart();
+  void RecordEnd();
+
+  // The blocks that frame a report. (eventlog/event_blocks.cpp)
+  void WriteStartBlock() const;
+  void WriteMessageBlock() const;
+  void WriteResultBlock() const;
+  void WriteEndBlock() const;
+
+  // Moves the folder of an ended event below the folder of its copy, if it names one.
+  // (eventlog/event_placement.cpp)
+  void PlaceEventLog();
+
+  // The machine as it is now: a box, six numbered sections, a box. (inventory/snapshot.cpp)
+  void WriteSnapshot();
+  void WriteUserSection();
+  void WriteSoftwareSection();
+  void WriteProcessSection();
+  void WriteServiceSection();
+  void WriteProductSection();
+  void WriteODBCSection();
+  void WriteSectionHeading(const char* title);
+
+  std::string ReadKey(const char* key) const;
+  void WriteKey(const char* key, const std::string& value);
+};

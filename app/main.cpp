@@ -1,0 +1,31 @@
+#include <algorithm>
+#include <string_view>
+
+#include "app/install_history.h"
+#include "app/usage.h"
+#include "platform/ascii_case.h"
+
+static bool IsHelp(std::string_view argument) {
+  constexpr std::string_view words[] = {"-help", "-h", "-?", "--help", "/?"};
+  return std::any_of(std::begin(words), std::end(words), [argument](std::string_view word) {
+    return EqualsIgnoringCase(word, argument);
+  });
+}
+
+// Exit results: 0 to 2 as CInstallHistory::Run gives them, 3 for an archive that is not there.
+int main(int argc, char** argv) {
+  if (argc == 2 && IsHelp(argv[1])) {
+    PrintUsage();
+    return 0;
+  }
+  const bool isReport = argc >= 2 && EqualsIgnoringCase("-report", argv[1]);
+  if (isReport && argc == 2) {
+    PrintUsage();
+    return 2;
+  }
+  CInstallHistory history;
+  if (isReport && argc == 3) {
+    return history.Report(argv[2]) == 1 ? 0 : 3;
+  }
+  return history.Run(argc, argv);
+}

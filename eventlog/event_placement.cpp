@@ -1,0 +1,17 @@
+#include <string>
+
+#include "app/install_event.h"
+#include "history/locations.h"
+#include "platform/files.h"
+
+void CInstallEvent::PlaceEventLog() {
+  if (CopyName.empty() || LeadsOutOfHistory(CopyName) || LeadsOutOfHistory(EventID)) {
+    return;
+  }
+  const std::string copyFolder = JoinPath(GetHistoryDir(), CopyName);
+  const std::string target = JoinPath(copyFolder, EventID);
+  if (!EnsureFolder(copyFolder) || !MoveFolder(EventFolder, target)) {
+    return;
+  }
+  SetEventLogFile(JoinPath(target, "ORXInstallEvent.Log"));
+}

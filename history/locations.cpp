@@ -1,0 +1,63 @@
+#include "history/locations.h"
+
+#include <algorithm>
+#include <string_view>
+
+#include "platform/files.h"
+#include "platform/known_folders.h"
+#include "platform/path.h"
+
+std::string GetCommonAppDataPath() {
+  constexpr int32_t commonAppData = 35;
+  const std::string folder = GetFolderPath(commonAppData);
+  return folder.empty() ? "C:\\Documents and Settings\\All Users\\Application Data" : folder;
+}
+
+std::string GetHistoryDir() {
+  return JoinPath(JoinPath(GetCommonAppDataPath(), "ZEK"), "ORXHistory");
+}
+
+std::string GetHistoryFilePath() { return JoinPath(GetHistoryDir(), "History.ini"); }
+
+std::string JoinPath(const std::string& folder, const std::string& name) {
+  return folder + kPathSeparator + name;
+}
+
+// Windows drops blanks and points from the end of a part, so that ".. " leads up as well.
+static bool LeadsUp(std::string_view part) {
+  return std::count(part.begin(), part.end(), '.') >= 2 &&
+         part.find_first_not_of(". ") == std::string_view::npos;
+}
+
+bool LeadsOutOfHistory(const std::string& name) {
+  if (IsRootedPath(name)) {
+    return true;
+  }
+  for (size_t begin = 0; begin <= name.size();) {
+    const size_t end = std::min(name.find_first_of(kPathSeparators, begin), name.size());
+    if (LeadsUp(std::string_view(name).substr(begin, end - begin)) ||
+        IsSymbolicLink(JoinPath(GetHistoryDir(), name.substr(0, end)))) {
+      return true;
+    }
+    begin = end + 1;
+  }
+  return false;
+}
+
+static FileKind KindOfUnquoted(std::string path) {
+  if (path.starts_with('"')) {
+    path.erase(0, 1);
+  }
+  if (path.ends_with('"')) {
+    path.pop_back();
+  }
+  return KindOf(path);
+}
+
+bool FileExists(const std::string& path) { return KindOfUnquoted(path) == FileKind::kFile; }
+
+bool DirExists(const std::string& path) { return KindOfUnquoted(path) == FileKind::kFolder; }
+
+bool EnsureFolder(const std::string& path) {
+  return DirExists(path) || CreateFolder(path) || DirExists(path);
+}

@@ -1,0 +1,6 @@
+#pragma once
+
+#include <string>
+
+// The present local time in the form "20261124 21:05:07": always 17 characters, no zone.
+std::string GetTimestamp();

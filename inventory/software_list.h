@@ -1,0 +1,11 @@
+#pragma once
+
+#include <cstdint>
+
+#include "inventory/info.h"
+
+class CProductsList : public Info {
+ public:
+  int32_t Collect() override;
+  int32_t Print() override;
+};

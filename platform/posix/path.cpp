@@ -1,0 +1,24 @@
+#include "platform/path.h"
+
+#include <unistd.h>
+
+#include <climits>
+
+const char kPathSeparator = '/';
+const std::string_view kPathSeparators = "/";
+
+bool IsRootedPath(const std::string& path) { return path.starts_with('/'); }
+
+std::optional<std::string> AbsolutePath(const std::string& path) {
+  if (path.empty()) {
+    return std::nullopt;
+  }
+  if (IsRootedPath(path)) {
+    return path;
+  }
+  char folder[PATH_MAX];
+  if (::getcwd(folder, sizeof folder) == nullptr) {
+    return std::nullopt;
+  }
+  return std::string(folder) + '/' + path;
+}

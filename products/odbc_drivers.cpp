@@ -1,0 +1,5 @@
+#include "products/odbc_drivers.h"
+
+void CODBCDriversList::Collect() {}
+
+void CODBCDriversList::Print() {}

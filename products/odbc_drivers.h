@@ -1,0 +1,9 @@
+#pragma once
+
+#include <cstdint>
+
+class CODBCDriversList {
+ public:
+  void Collect();
+  void Print();
+};
