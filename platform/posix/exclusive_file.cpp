@@ -1,0 +1,30 @@
+#include "platform/exclusive_file.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "platform/posix/descriptor.h"
+
+ExclusiveFile::ExclusiveFile(const std::string& path) : Handle(-1) {
+  Descriptor file(RetryOnInterrupt(
+      [&] { return ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC); }));
+  struct stat status = {};
+  if (file.IsOpen() && ::fstat(file.Get(), &status) == 0 && S_ISREG(status.st_mode)) {
+    Handle = file.Release();
+  }
+}
+
+ExclusiveFile::~ExclusiveFile() {
+  if (IsOpen()) {
+    ::close(static_cast<int>(Handle));
+  }
+}
+
+bool ExclusiveFile::IsOpen() const { return Handle >= 0; }
+
+size_t ExclusiveFile::Read(char* buffer, size_t size) {
+  const ssize_t count =
+      RetryOnInterrupt([&] { return ::read(static_cast<int>(Handle), buffer, size); });
+  return count > 0 ? static_cast<size_t>(count) : 0;
+}

@@ -1,0 +1,48 @@
+#include "platform/posix/text_file.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+std::optional<std::string> ReadAll(const Descriptor& file) {
+  struct stat status = {};
+  const bool isSizeKnown = ::fstat(file.Get(), &status) == 0 && status.st_size > 0;
+  constexpr size_t step = 65536;
+  // One byte more than the size, so that the read that fills the text is not the last but one.
+  std::string text(isSizeKnown ? static_cast<size_t>(status.st_size) + 1 : step, '\0');
+  size_t length = 0;
+  for (;;) {
+    if (length == text.size()) {
+      text.resize(length + step);
+    }
+    const ssize_t count = RetryOnInterrupt(
+        [&] { return ::read(file.Get(), text.data() + length, text.size() - length); });
+    if (count < 0) {
+      return std::nullopt;
+    }
+    if (count == 0) {
+      text.resize(length);
+      return text;
+    }
+    length += static_cast<size_t>(count);
+  }
+}
+
+std::optional<std::string> ReadTextFile(const std::string& path) {
+  const Descriptor file(
+      RetryOnInterrupt([&] { return ::open(path.c_str(), O_RDONLY | O_CLOEXEC); }));
+  return file.IsOpen() ? ReadAll(file) : std::nullopt;
+}
+
+bool WriteAll(const Descriptor& file, const std::string& text) {
+  size_t written = 0;
+  while (written < text.size()) {
+    const ssize_t count = RetryOnInterrupt(
+        [&] { return ::write(file.Get(), text.data() + written, text.size() - written); });
+    if (count <= 0) {
+      return false;
+    }
+    written += static_cast<size_t>(count);
+  }
+  return true;
+}

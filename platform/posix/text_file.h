@@ -1,0 +1,15 @@
+#pragma once
+
+#include <optional>
+#include <string>
+
+#include "platform/posix/descriptor.h"
+
+// All bytes from a descriptor's place to its end; nothing if a read fails.
+std::optional<std::string> ReadAll(const Descriptor& file);
+
+// All bytes of a file; nothing if it cannot be opened or read.
+std::optional<std::string> ReadTextFile(const std::string& path);
+
+// True when all bytes of the text were written.
+bool WriteAll(const Descriptor& file, const std::string& text);

@@ -1,0 +1,68 @@
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "platform/accounts.h"
+#include "platform/computer.h"
+#include "platform/processes.h"
+#include "platform/registry.h"
+#include "platform/services.h"
+
+// The machine that the logic under test sees: each test sets the answers it needs. An absent
+// answer is a call that fails.
+struct FakeMachine {
+  std::optional<std::string> ComputerName;
+  std::optional<SystemVersion> ShortVersion;
+  std::optional<SystemVersion> ExtendedVersion;
+  SystemInfo System;
+
+  uint32_t OwnProcess = 0;
+  std::optional<std::vector<uint32_t>> ProcessIDs;
+  std::map<uint32_t, ProcessModule> Modules;
+  std::optional<std::vector<ProcessEntry>> ProcessEntries;
+
+  ServiceListing Services;
+
+  using Members = std::vector<std::string>;
+  std::optional<std::string> DomainUser;
+  std::optional<std::string> WorkstationUser;
+  std::vector<std::pair<std::string, Members>> LocalGroups;
+  std::vector<std::pair<std::string, Members>> GlobalGroups;
+  std::vector<std::string> ServersAsked;  // by the account calls, in their order
+
+  // A key exists if it or a key below it is set. Order is that of the insertion.
+  void SetKey(const std::string& keyPath);
+  void SetText(const std::string& keyPath, const std::string& name, const std::string& text);
+  void SetNumber(const std::string& keyPath, const std::string& name, uint32_t number);
+  void SetData(const std::string& keyPath, const std::string& name, RegistryData data);
+
+  struct Key {
+    std::string Path;
+    std::vector<std::pair<std::string, RegistryData>> Values;
+  };
+  std::vector<Key> Registry;
+};
+
+// The one machine; assign FakeMachine() to begin anew.
+FakeMachine& Machine();
+
+// Makes an empty folder that is the common application data folder from here on, removed with the
+// object; the machine is new as well.
+class ScratchHistory {
+ public:
+  ScratchHistory();
+  ~ScratchHistory();
+  ScratchHistory(const ScratchHistory&) = delete;
+  ScratchHistory& operator=(const ScratchHistory&) = delete;
+
+  std::string Root;
+};
+
+// All bytes of a file; empty if it cannot be read. Text as it is on disk.
+std::string FileText(const std::string& path);
+void WriteFileText(const std::string& path, const std::string& text);
