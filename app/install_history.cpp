@@ -44,7 +44,8 @@ CInstallEvent CInstallHistory::RegisterEvent(int argc, char** argv) {
   ReadCount();  // once more: other runs may have counted since the construction
   CInstallEvent event(argc, argv);
   if (event.Valid && event.Mode == "-start") {
-    ++EventCount;
+    // Unsigned, as a file edited by hand may hold the highest number there is.
+    EventCount = static_cast<int32_t>(static_cast<uint32_t>(EventCount) + 1);
     WriteCount(EventCount);
   }
   return event;

@@ -6,6 +6,7 @@
 #include <iterator>
 #include <random>
 
+#include "app/install_history.h"
 #include "platform/ascii_case.h"
 #include "platform/known_folders.h"
 
@@ -28,6 +29,18 @@ ScratchHistory::~ScratchHistory() {
   std::error_code ignored;
   std::filesystem::remove_all(Root, ignored);
   commonFolder.clear();
+}
+
+ProgramArguments::ProgramArguments(std::vector<std::string> words) : Words(std::move(words)) {
+  Words.insert(Words.begin(), "ORXInstallEventLog");
+  for (std::string& word : Words) {
+    Pointers.push_back(word.data());
+  }
+}
+
+int RunTool(std::vector<std::string> words) {
+  ProgramArguments arguments(std::move(words));
+  return CInstallHistory().Run(arguments.Count(), arguments.Vector());
 }
 
 std::string FileText(const std::string& path) {

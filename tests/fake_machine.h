@@ -63,6 +63,21 @@ class ScratchHistory {
   std::string Root;
 };
 
+// An argument vector as the system hands it to main, the program's name in front.
+class ProgramArguments {
+ public:
+  explicit ProgramArguments(std::vector<std::string> words);
+  int Count() const { return static_cast<int>(Pointers.size()); }
+  char** Vector() { return Pointers.data(); }
+
+ private:
+  std::vector<std::string> Words;
+  std::vector<char*> Pointers;
+};
+
+// One run of the tool in this process, as CInstallHistory::Run; gives its result.
+int RunTool(std::vector<std::string> words);
+
 // All bytes of a file; empty if it cannot be read. Text as it is on disk.
 std::string FileText(const std::string& path);
 void WriteFileText(const std::string& path, const std::string& text);
