@@ -4,6 +4,7 @@
 #include <sys/sendfile.h>
 #include <sys/stat.h>
 #include <unistd.h>
+
 #include <cstdio>
 
 #include "platform/posix/descriptor.h"
