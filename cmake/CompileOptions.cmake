@@ -6,6 +6,10 @@ option(ORX_SANITIZE "Address and undefined-behaviour sanitizers" OFF)
 if(NOT MSVC)
   target_compile_options(orx_options INTERFACE -Wall -Wextra -Wpedantic -Wshadow -Wconversion
     -Wnon-virtual-dtor -Wold-style-cast -Werror)
+  if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+    # GCC 12 sees overlapping copies in plain string concatenation.
+    target_compile_options(orx_options INTERFACE -Wno-restrict)
+  endif()
   if(ORX_SANITIZE)
     target_compile_options(orx_options INTERFACE
       -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)

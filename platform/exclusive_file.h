@@ -22,5 +22,5 @@ class ExclusiveFile {
   size_t Read(char* buffer, size_t size);
 
  private:
-  intptr_t Handle;
+  intptr_t Handle = -1;
 };

@@ -6,7 +6,7 @@
 
 #include "platform/posix/descriptor.h"
 
-ExclusiveFile::ExclusiveFile(const std::string& path) : Handle(-1) {
+ExclusiveFile::ExclusiveFile(const std::string& path) {
   Descriptor file(RetryOnInterrupt(
       [&] { return ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC); }));
   struct stat status = {};

@@ -1,10 +1,11 @@
 #include "platform/files.h"
 
 #include <fcntl.h>
-#include <stdio.h>
 #include <sys/sendfile.h>
 #include <sys/stat.h>
 #include <unistd.h>
+
+#include <cstdio>
 
 #include "platform/posix/descriptor.h"
 

@@ -1,9 +1,10 @@
 #include "platform/posix/profile_store.h"
 
 #include <fcntl.h>
-#include <stdio.h>
 #include <sys/file.h>
 #include <unistd.h>
+
+#include <cstdio>
 
 #include <utility>
 

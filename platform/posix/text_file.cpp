@@ -8,8 +8,9 @@ std::optional<std::string> ReadAll(const Descriptor& file) {
   struct stat status = {};
   const bool isSizeKnown = ::fstat(file.Get(), &status) == 0 && status.st_size > 0;
   constexpr size_t step = 65536;
-  // One byte more than the size, so that the read that fills the text is not the last but one.
-  std::string text(isSizeKnown ? static_cast<size_t>(status.st_size) + 1 : step, '\0');
+  // Room behind the end, so that the read that finds the end needs no growth, nor does a little
+  // text that the caller appends.
+  std::string text((isSizeKnown ? static_cast<size_t>(status.st_size) : 0) + step, '\0');
   size_t length = 0;
   for (;;) {
     if (length == text.size()) {
