@@ -3,11 +3,12 @@
 #
 #   check-archive.sh PROGRAM
 #
-# Needs unzip (with zipinfo) and Python 3. Ends with 1 at the first archive that is not accepted.
+# Ends with 1 at the first archive that is not accepted.
 set -euo pipefail
 
 program=$(realpath "$1")
 scripts=$(dirname "$(realpath "$0")")
+"$scripts/install-packages.sh" unzip python3
 scratch=$(mktemp -d)
 trap 'rm -rf "$scratch"' EXIT
 export ORX_COMMON_APPDATA=$scratch/data
@@ -18,10 +19,11 @@ begin() {
   rm -rf "$scratch"/*
 }
 
+# check ARCHIVE RESULT: the result, 1 at most, that the readers may give; that of an empty archive
+# is a warning.
 check() {
-  "$program" -report "$1"
-  # An archive without entries counts as empty for these two, which they say with a 1.
   local accepted=$2
+  "$program" -report "$1"
   unzip -tq "$1" || [ $? -le "$accepted" ]
   zipinfo "$1" >"$scratch/listing" || [ $? -le "$accepted" ]
   python3 "$scripts/compare-archive.py" "$1" "$history"
