@@ -12,56 +12,27 @@ namespace {
 
 namespace fs = std::filesystem;
 
-class CollectedFiles : public testing::Test {
- protected:
-  void SetUp() override {
-    fs::create_directories(EventFolder());
-    fs::create_directories(Installer("again"));
-    for (const char* name : {"setup.log", "setup.trc", "setup.rsp", "ORXInstallEvent.Log"}) {
-      WriteFileText(Installer(name), std::string("installer's ") + name);
-    }
-    WriteFileText(JoinPath(Installer("again"), "setup.log"), "second");
-    WriteFileText(Collected("ORXInstallEvent.Log"), "report");
-    WriteFileText(Collected("there.log"), "collected");
+TEST(CollectedFiles, AreCopiedOnceOrLeftWhereTheyAre) {
+  const ScratchHistory scratch;
+  const std::string event7 = JoinPath(JoinPath(GetHistoryDir(), "C1"), "7");
+  const std::string uncopied7 = JoinPath(GetHistoryDir(), "7");
+  const std::string setup = JoinPath(scratch.Root, "setup");
+  const auto installer = [&](const char* name) { return JoinPath(setup, name); };
+  const auto collected = [&](const char* name) { return JoinPath(event7, name); };
+  for (const std::string& folder : {event7, uncopied7, setup, JoinPath(scratch.Root, "7")}) {
+    fs::create_directories(folder);
   }
-
-  static std::string EventFolder() { return JoinPath(JoinPath(GetHistoryDir(), "C1"), "7"); }
-  static std::string Collected(const std::string& name) { return JoinPath(EventFolder(), name); }
-  std::string Installer(const std::string& name) const {
-    return JoinPath(JoinPath(Scratch.Root, "installer"), name);
+  for (const char* name : {"a.log", "b.trc", "c.log", "ORXInstallEvent.Log"}) {
+    WriteFileText(installer(name), name);
   }
-
-  static CInstallEvent Event(const std::string& copyName, const std::string& log,
-                             const std::string& trace, const std::string& response) {
-    CInstallEvent event("7");
-    event.SetCopyName(copyName);
-    event.SetLogFileName(log);
-    event.SetTraceFile(trace);
-    event.SetResponseFile(response);
-    return event;
-  }
-
-  const ScratchHistory Scratch;
-};
-
-TEST_F(CollectedFiles, LieInTheFolderOfTheirEvent) {
-  const fs::file_time_type time =
-      fs::last_write_time(Installer("setup.log")) - std::chrono::hours(5);
-  fs::last_write_time(Installer("setup.log"), time);
-  CInstallEvent event =
-      Event("C1", Installer("setup.log"), Installer("setup.trc"), Installer("setup.rsp"));
-  for (int report = 0; report < 2; ++report) {
-    event.CollectFiles();
-    EXPECT_EQ(event.GetLogFileName(), Collected("setup.log"));
-    EXPECT_EQ(event.GetTraceFile(), Collected("setup.trc"));
-    EXPECT_EQ(event.GetResponseFile(), Collected("setup.rsp"));
-    EXPECT_EQ(FileText(Collected("setup.rsp")), "installer's setup.rsp");
-    EXPECT_EQ(FileText(Installer("setup.rsp")), "installer's setup.rsp");
-    EXPECT_EQ(fs::last_write_time(Collected("setup.log")), time);
-  }
-}
-
-TEST_F(CollectedFiles, AreLeftWhereTheyCannotBeTaken) {
+  WriteFileText(JoinPath(scratch.Root, "a.log"), "another a.log");
+  WriteFileText(JoinPath(scratch.Root, "up.trc"), "up");
+  WriteFileText(collected("ORXInstallEvent.Log"), "report");
+  const fs::file_time_type time = fs::last_write_time(installer("a.log")) - std::chrono::hours(5);
+  fs::last_write_time(installer("a.log"), time);
+  const std::string otherA = JoinPath(scratch.Root, "a.log");
+  // Where a slash is no separator of ours, the base name is the whole path and would lead up.
+  const std::string upAfter = kPathSeparator == '/' ? JoinPath(uncopied7, "up.trc") : "../up.trc";
   struct {
     std::string CopyName;
     std::string Log;
@@ -70,44 +41,34 @@ TEST_F(CollectedFiles, AreLeftWhereTheyCannotBeTaken) {
     std::string TraceAfter;
   } const cases[] = {
       {"C1", "(none)", "", "(none)", ""},
-      {"C1", Installer("again"), Installer("gone.trc"), Installer("again"), Installer("gone.trc")},
-      {"C1", Installer("ORXInstallEvent.Log"), Collected("there.log"),
-       Installer("ORXInstallEvent.Log"), Collected("there.log")},
-      {"C1", Installer("setup.log"), JoinPath(Installer("again"), "setup.log"),
-       Collected("setup.log"), JoinPath(Installer("again"), "setup.log")},
-      {"C1", Installer("setup.log"), Installer("setup.trc"), Installer("setup.log"),
-       Collected("setup.trc")},
-      {"(Unknown)", Installer("setup.log"), "", Installer("setup.log"), ""},
-      {"..", Installer("setup.log"), "", Installer("setup.log"), ""},
-      {Scratch.Root, Installer("setup.log"), "", Installer("setup.log"), ""},
+      {"C1", setup, installer("gone"), setup, installer("gone")},
+      {"C1", installer("a.log"), otherA, collected("a.log"), otherA},
+      {"C1", otherA, installer("b.trc"), otherA, collected("b.trc")},
+      {"C1", collected("a.log"), collected("b.trc"), collected("a.log"), collected("b.trc")},
+      {"C1", installer("ORXInstallEvent.Log"), "", installer("ORXInstallEvent.Log"), ""},
+      {"", "c.log", "../up.trc", JoinPath(uncopied7, "c.log"), upAfter},
+      {"(Unknown)", "c.log", "", "c.log", ""},
+      {"..", "c.log", "", "c.log", ""},
+      {JoinPath("..", ".."), "c.log", "", "c.log", ""},
+      {scratch.Root, "c.log", "", "c.log", ""},
   };
-  fs::create_directory(JoinPath(Scratch.Root, "7"));
-  fs::create_directory(JoinPath(JoinPath(Scratch.Root, "ZEK"), "7"));
+  const fs::path before = fs::current_path();
+  fs::current_path(setup);
   for (const auto& test : cases) {
-    CInstallEvent event = Event(test.CopyName, test.Log, test.Trace, "");
+    CInstallEvent event("7");
+    event.SetCopyName(test.CopyName);
+    event.SetLogFileName(test.Log);
+    event.SetTraceFile(test.Trace);
     event.CollectFiles();
     EXPECT_EQ(event.GetLogFileName(), test.LogAfter) << test.CopyName;
     EXPECT_EQ(event.GetTraceFile(), test.TraceAfter) << test.CopyName;
   }
-  EXPECT_EQ(FileText(Collected("ORXInstallEvent.Log")), "report");
-  EXPECT_EQ(FileText(Collected("setup.log")), "installer's setup.log");
-  EXPECT_TRUE(fs::is_empty(JoinPath(Scratch.Root, "7")));
-  EXPECT_TRUE(fs::is_empty(JoinPath(JoinPath(Scratch.Root, "ZEK"), "7")));
-}
-
-TEST_F(CollectedFiles, AreFoundInTheWorkingDirectory) {
-  const fs::path before = fs::current_path();
-  fs::current_path(Installer("again"));
-  fs::create_directory(JoinPath(GetHistoryDir(), "7"));
-  CInstallEvent event = Event("", "setup.log", "../setup.trc", "");
-  event.CollectFiles();
   fs::current_path(before);
-  const std::string folder = JoinPath(GetHistoryDir(), "7");
-  EXPECT_EQ(event.GetLogFileName(), JoinPath(folder, "setup.log"));
-  EXPECT_EQ(FileText(JoinPath(folder, "setup.log")), "second");
-  // Where a slash is no separator of ours, the base name is the whole path and would lead up.
-  EXPECT_EQ(event.GetTraceFile(),
-            kPathSeparator == '/' ? JoinPath(folder, "setup.trc") : "../setup.trc");
+  EXPECT_EQ(FileText(collected("a.log")), "a.log");
+  EXPECT_EQ(fs::last_write_time(collected("a.log")), time);
+  EXPECT_EQ(FileText(installer("a.log")), "a.log");
+  EXPECT_EQ(FileText(collected("ORXInstallEvent.Log")), "report");
+  EXPECT_TRUE(fs::is_empty(JoinPath(scratch.Root, "7")));
 }
 
 }  // namespace

@@ -20,10 +20,6 @@ using Names = std::vector<std::string>;
 
 std::string InHistory(const std::string& name) { return JoinPath(GetHistoryDir(), name); }
 
-std::string InHistory(const std::string& folder, const std::string& name) {
-  return JoinPath(InHistory(folder), name);
-}
-
 // The text with "@" for the scratch folder, with slashes and plain line ends.
 std::string Neutral(std::string text, const std::string& root) {
   std::erase(text, '\r');
@@ -50,7 +46,7 @@ class Summary : public testing::Test {
 };
 
 void AddFinishedEvent(const std::string& identity, const std::string& copyName) {
-  std::filesystem::create_directories(InHistory(copyName, identity));
+  std::filesystem::create_directories(InHistory(JoinPath(copyName, identity)));
   CInstallEvent event(identity);
   event.SetEventID(identity);
   event.SetCommandLine("not printed");
@@ -62,7 +58,7 @@ void AddFinishedEvent(const std::string& identity, const std::string& copyName) 
   event.SetServiceLevel("SP2");
   event.SetPath(std::string(300, 'p'));
   event.SetCopyName(copyName);
-  event.SetEventLogFile(JoinPath(InHistory(copyName, identity), "ORXInstallEvent.Log"));
+  event.SetEventLogFile(JoinPath(InHistory(JoinPath(copyName, identity)), "ORXInstallEvent.Log"));
   event.SetResult("Success");
 }
 
@@ -81,9 +77,9 @@ TEST_F(Summary, IsTheSameAtEveryReport) {
   for (int report = 0; report < 2; ++report) {
     EXPECT_EQ(CInstallHistory().WriteSummary(), 1);
     EXPECT_EQ(TextOf(InHistory("Summary.txt")), Golden("summary_overall.txt"));
-    EXPECT_EQ(TextOf(InHistory("C1", "Summary.txt")), Golden("summary_copy.txt"));
-    EXPECT_TRUE(
-        FileText(InHistory("no copy", "Summary.txt")).starts_with("ORX Installation Copy:no copy"));
+    EXPECT_EQ(TextOf(InHistory(JoinPath("C1", "Summary.txt"))), Golden("summary_copy.txt"));
+    EXPECT_TRUE(FileText(InHistory(JoinPath("no copy", "Summary.txt")))
+                    .starts_with("ORX Installation Copy:no copy"));
     EXPECT_FALSE(DirExists(InHistory("(Unknown)")));
   }
 }
@@ -109,18 +105,15 @@ TEST_F(Summary, GroupsByCopyInTheOrderOfFirstEvents) {
   const CInstallHistory history;
   std::vector<std::unique_ptr<CCopyEvents>> groups;
   history.GroupEvents(history.GetEventSections(), groups);
-  std::vector<std::pair<std::string, Names>> seen;
+  std::string seen;
   for (const auto& group : groups) {
-    seen.emplace_back(group->Name, Names());
+    seen += group->Name + ':';
     for (const CInstallEvent& event : group->Events) {
-      seen.back().second.push_back(event.EventID);
+      seen += ' ' + event.EventID;
     }
+    seen += '\n';
   }
-  const std::vector<std::pair<std::string, Names>> expected = {
-      {"(Unknown)", {"1"}}, {"B", {"2", "5"}}, {"A", {"Historyx", "8"}},
-      {"4", {"4", "9"}},    {"b", {"6"}},      {"7", {"7"}},
-  };
-  EXPECT_EQ(seen, expected);
+  EXPECT_EQ(seen, "(Unknown): 1\nB: 2 5\nA: Historyx 8\n4: 4 9\nb: 6\n7: 7\n");
 }
 
 TEST_F(Summary, KeepsToTheHistoryFolderWhateverACopyIsCalled) {
@@ -139,7 +132,7 @@ TEST_F(Summary, KeepsToTheHistoryFolderWhateverACopyIsCalled) {
   for (const std::string& name : copyNames) {
     CInstallEvent("of " + name).SetCopyName(name);
   }
-  std::filesystem::create_directory(InHistory("x", "Summary.txt"));
+  std::filesystem::create_directory(InHistory(JoinPath("x", "Summary.txt")));
 
   EXPECT_EQ(CInstallHistory().WriteSummary(), 1);
   const std::string text = TextOf(InHistory("Summary.txt"));
@@ -148,29 +141,11 @@ TEST_F(Summary, KeepsToTheHistoryFolderWhateverACopyIsCalled) {
     EXPECT_NE(text.find("Copy Name       :" + Neutral(name, Scratch.Root) + "\n"),
               std::string::npos);
   }
-  Names files;
+  int files = 0;
   for (const auto& entry : std::filesystem::recursive_directory_iterator(Scratch.Root)) {
-    if (entry.is_regular_file()) {
-      files.push_back(entry.path().filename().string());
-    }
+    files += entry.is_regular_file() ? 1 : 0;
   }
-  std::sort(files.begin(), files.end());
-  EXPECT_EQ(files, Names({"History.ini", "Summary.txt"}));
-}
-
-TEST_F(Summary, ReadsOnlyAsManySectionsAsTheListHolds) {
-  std::string text = "[History]\r\nCount=3000\r\n";
-  for (int i = 1000; i < 4000; ++i) {
-    text += "[" + std::to_string(i) + std::string(96, 'n') + "]\r\nCopy_Name=C\r\n";
-  }
-  WriteFileText(GetHistoryFilePath(), text);
-  EXPECT_EQ(CInstallHistory().WriteSummary(), 1);
-  // 8 bytes are those of "History", 101 those of each name. A last one of 29 bytes, cut short,
-  // names no section and so an event without a copy.
-  const std::string summary = FileText(InHistory("Summary.txt"));
-  EXPECT_NE(summary.find("Total ORX Copies:2"), std::string::npos);
-  EXPECT_NE(summary.find("Count of Events      :101"), std::string::npos);
-  EXPECT_NE(summary.find("Copy:1101" + std::string(25, 'n')), std::string::npos);
+  EXPECT_EQ(files, 2);  // the history file and the overall summary
 }
 
 }  // namespace
