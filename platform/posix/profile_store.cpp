@@ -5,7 +5,6 @@
 #include <unistd.h>
 
 #include <cstdio>
-
 #include <utility>
 
 #include "platform/posix/text_file.h"
