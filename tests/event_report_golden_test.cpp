@@ -55,7 +55,7 @@ void SetSoftware() {
       "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Installer\\UserData\\S-1-5-18\\Products\\";
   const std::string properties = "\\InstallProperties";
   SetTexts(root + "P1" + properties, {{"DisplayName", "ORX Server"},
-                                      {"DisplayVersion", "9.7.1907"},
+                                      {"DisplayVersion", "9.4.1907"},
                                       {"InstallDate", "20261101"},
                                       {"InstallLocation", "C:\\ZEK\\ORX\\"},
                                       {"Language", "1033"},
@@ -91,19 +91,19 @@ void SetProcesses() {
 
 void SetCopy(const std::string& copyKey, const std::string& productCode) {
   SetTexts(copyKey + "\\CurrentVersion", {{"Version", "9"}});
-  SetTexts(copyKey + "\\GLOBAL_PROFILE", {{"ORXINSTDEF", "ORX1"},
+  SetTexts(copyKey + "\\GLOBAL_PROFILE", {{"DefaultInstance", "ORX1"},
                                           {"A_PROFILE_NAME_OF_29_LETTERS_", "fits"},
                                           {"A_PROFILE_NAME_THAT_DOES_NOT_FIT", "whole"}});
-  Machine().SetNumber(copyKey + "\\GLOBAL_PROFILE", "ORXLIMIT", 0xFFFFFFFE);
+  Machine().SetNumber(copyKey + "\\GLOBAL_PROFILE", "Limit", 0xFFFFFFFE);
   SetTexts(copyKey + "\\PROFILES\\ORX1",
-           {{"ORXPATH", "C:\\ZEK"}, {"A_PARAMETER_NAME_OF_EXACTLY_36_BYTES", "run in"}});
-  Machine().SetData(copyKey + "\\PROFILES\\ORX1", "ORXBLOB", {3, "blob"});
+           {{"Folder", "C:\\ZEK"}, {"A_PARAMETER_NAME_OF_EXACTLY_36_BYTES", "run in"}});
+  Machine().SetData(copyKey + "\\PROFILES\\ORX1", "Blob", {3, "blob"});
   SetTexts(copyKey + "\\PROFILES\\ORX2", {});
   SetTexts(copyKey + "\\ADM_PROFILES\\ADM1", {{"not", "shown"}});
   SetTexts(copyKey + "\\ORX Server\\CurrentVersion", {{"Version", "9"},
-                                                      {"Release", "7"},
+                                                      {"Release", "4"},
                                                       {"Modification", "0"},
-                                                      {"Service Level", "s061215"},
+                                                      {"Service Level", "Service Level 3"},
                                                       {"ProductCode", productCode},
                                                       {"Last Modified Date", "20261101"},
                                                       {"Title", "not shown"}});

@@ -59,9 +59,9 @@ TEST(ProductsList, FillsWhatTheReportDoesNotShow) {
   Machine() = FakeMachine();
   const std::string copyKey = "SOFTWARE\\ZEK\\ORX\\InstalledCopies\\C1";
   Machine().SetNumber(copyKey + "\\CurrentVersion", "Version", 9);
-  Machine().SetText(copyKey + "\\CurrentVersion", "Release", "7");
+  Machine().SetText(copyKey + "\\CurrentVersion", "Release", "4");
   Machine().SetText(copyKey + "\\CurrentVersion", "Modification", "0");
-  Machine().SetText(copyKey + "\\CurrentVersion", "Service Level", "s0");
+  Machine().SetText(copyKey + "\\CurrentVersion", "Service Level", "Level 0");
   Machine().SetKey(copyKey + "\\ORX Client");
   Machine().SetText(copyKey + "\\ORX Server\\CurrentVersion", "Title", "Server");
   Machine().SetText(copyKey + "\\ORX Server\\CurrentVersion", "Description", "The server");
@@ -74,7 +74,7 @@ TEST(ProductsList, FillsWhatTheReportDoesNotShow) {
   const CORXCopy& copy = list.Copies[0];
   EXPECT_EQ(copy.VersionInfo.Version + copy.VersionInfo.Release + copy.VersionInfo.Modification +
                 copy.VersionInfo.ServiceLevel,
-            "970s0");
+            "940Level 0");
   ASSERT_EQ(copy.Products.size(), 2U);
   EXPECT_EQ(copy.Products[0].Name, "ORX Client");
   EXPECT_EQ(copy.Products[0].Title, "");
