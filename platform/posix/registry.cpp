@@ -5,71 +5,57 @@
 #include <unistd.h>
 
 #include <algorithm>
-#include <cerrno>
 #include <memory>
+#include <optional>
 
 #include "platform/known_folders.h"
+#include "platform/posix/descriptor.h"
 #include "platform/posix/registry_export.h"
 
 namespace {
 
-// The export as a file that stays open while the run asks. What is no regular file, or cannot be
-// opened, is empty; so is what lies behind the first GiB.
-class ExportFile {
- public:
-  explicit ExportFile(const std::string& path)
-      : Descriptor(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY)) {
-    struct stat status = {};
-    IsReadable = Descriptor >= 0 && ::fstat(Descriptor, &status) == 0 && S_ISREG(status.st_mode);
-  }
-  ~ExportFile() {
-    if (Descriptor >= 0) {
-      ::close(Descriptor);
+size_t ReadAt(const Descriptor& file, uint64_t offset, char* buffer, size_t size) {
+  size_t got = 0;
+  while (got < size) {
+    const ssize_t count = RetryOnInterrupt([&] {
+      return ::pread(file.Get(), buffer + got, size - got, static_cast<off_t>(offset + got));
+    });
+    if (count <= 0) {
+      break;
     }
+    got += static_cast<size_t>(count);
   }
-  ExportFile(const ExportFile&) = delete;
-  ExportFile& operator=(const ExportFile&) = delete;
+  return got;
+}
 
-  size_t Read(uint64_t offset, char* buffer, size_t size) const {
+// Bytes of a regular file; none of anything else, or of a file that cannot be opened. What lies
+// behind the first GiB is not seen.
+ByteReader ReaderOf(const std::string& path) {
+  // Without O_NONBLOCK a pipe in the file's place would hold up the run.
+  const auto file = std::make_shared<Descriptor>(
+      ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
+  struct stat status = {};
+  if (!file->IsOpen() || ::fstat(file->Get(), &status) != 0 || !S_ISREG(status.st_mode)) {
+    return [](uint64_t, char*, size_t) { return size_t{0}; };
+  }
+  return [file](uint64_t offset, char* buffer, size_t size) {
     constexpr uint64_t longest = uint64_t{1} << 30;
-    size = static_cast<size_t>(std::min<uint64_t>(size, longest - std::min(offset, longest)));
-    size_t got = 0;
-    while (IsReadable && got < size) {
-      const ssize_t count =
-          ::pread(Descriptor, buffer + got, size - got, static_cast<off_t>(offset + got));
-      if (count > 0) {
-        got += static_cast<size_t>(count);
-      } else if (count == 0 || errno != EINTR) {
-        break;
-      }
-    }
-    return got;
-  }
+    const uint64_t left = longest - std::min(offset, longest);
+    return ReadAt(*file, offset, buffer, static_cast<size_t>(std::min<uint64_t>(size, left)));
+  };
+}
 
- private:
-  int Descriptor;
-  bool IsReadable = false;
-};
-
-struct OpenExport {
-  explicit OpenExport(const std::string& path) : Path(path), File(path) {}
-
-  std::string Path;
-  ExportFile File;
-  RegistryExport Export{[this](uint64_t offset, char* buffer, size_t size) {
-    return File.Read(offset, buffer, size);
-  }};
-};
-
-// The one export of a run, opened by the first question.
+// The one export of a run; another only if the folder becomes another.
 RegistryExport& MachineRegistry() {
-  static std::unique_ptr<OpenExport> current;
+  static std::string currentPath;
+  static std::optional<RegistryExport> current;
   constexpr int32_t commonAppData = 35;
   const std::string path = GetFolderPath(commonAppData) + "/ZEK/Registry.reg";
-  if (!current || current->Path != path) {
-    current = std::make_unique<OpenExport>(path);
+  if (path != currentPath) {
+    current.emplace(ReaderOf(path));
+    currentPath = path;
   }
-  return current->Export;
+  return *current;
 }
 
 }  // namespace

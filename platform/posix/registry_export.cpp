@@ -3,15 +3,10 @@
 #include <algorithm>
 #include <utility>
 
-namespace {
+#include "platform/ascii_case.h"
+#include "platform/posix/registry_path.h"
 
-// The part of the registry to lay out for a question: all that has the same parent as the key, so
-// that the keys beside it are there too, but never more than one maker's part.
-std::string TopFor(const std::string& keyPath) {
-  const size_t first = keyPath.find('\\');
-  const size_t last = keyPath.rfind('\\');
-  return first == last ? keyPath : keyPath.substr(0, last);
-}
+namespace {
 
 std::vector<std::string> NamesThatFit(std::vector<std::string> names) {
   constexpr size_t longest = 255;
@@ -32,10 +27,23 @@ RegistryTree& RegistryExport::BranchOf(const std::string& keyPath) {
     }
   }
   if (!Headings) {
-    Headings = std::make_unique<RegistryHeadings>(ReadBytes);
+    Format = ReadFormat(ReadBytes);
+    Headings.emplace(ReadBytes, Format.Encoding);
+    Map = MapRegistry(*Headings, Format.Begin);
   }
-  Branches.push_back(std::make_unique<RegistryTree>(*Headings, TopFor(keyPath)));
+  Branches.push_back(std::make_unique<RegistryTree>(*Headings, Map, TopFor(keyPath)));
   return *Branches.back();
+}
+
+// One key is laid out with what lies below it. With the second key of a parent come all the others
+// of that parent, as they are likely to be asked for one by one.
+std::string RegistryExport::TopFor(const std::string& keyPath) const {
+  const std::string_view parent = ParentOf(keyPath);
+  const bool isSecond = std::any_of(Branches.begin(), Branches.end(),
+                                    [&](const std::unique_ptr<RegistryTree>& branch) {
+                                      return EqualsIgnoringCase(ParentOf(branch->Top()), parent);
+                                    });
+  return isSecond && !parent.empty() ? std::string(parent) : keyPath;
 }
 
 RegistryValues* RegistryExport::ValuesOf(const std::string& keyPath) {
@@ -45,21 +53,21 @@ RegistryValues* RegistryExport::ValuesOf(const std::string& keyPath) {
   }
   if (!key->Values) {
     key->Values = std::make_unique<RegistryValues>();
-    for (const RegistryHeading& heading : key->Headings) {
-      ReadLines(heading, *key->Values);
+    for (const RegistryTree::Lines& lines : key->Places) {
+      ReadLines(lines, *key->Values);
     }
   }
   return key->Values.get();
 }
 
-void RegistryExport::ReadLines(const RegistryHeading& heading, RegistryValues& values) const {
-  const auto size = static_cast<size_t>(heading.End - heading.Begin);
+void RegistryExport::ReadLines(const RegistryTree::Lines& lines, RegistryValues& values) const {
+  const auto size = static_cast<size_t>(lines.End - lines.Begin);
   const auto bytes = std::make_unique_for_overwrite<char[]>(size);
-  const size_t got = ReadBytes(heading.Begin, bytes.get(), size);
+  const size_t got = ReadBytes(lines.Begin, bytes.get(), size);
   std::string text;
-  AppendDecoded(text, {bytes.get(), got}, Headings->Encoding());
+  AppendDecoded(text, {bytes.get(), got}, Format.Encoding);
   const size_t headingEnd = std::min(text.find('\n'), text.size());
-  ReadValueLines(std::string_view(text).substr(headingEnd), Headings->HexForm(), values);
+  ReadValueLines(std::string_view(text).substr(headingEnd), Format.HexForm, values);
 }
 
 RegistryData RegistryExport::Read(const std::string& keyPath, const std::string& valueName,

@@ -1,16 +1,15 @@
 #include "platform/posix/registry_headings.h"
 
 #include <algorithm>
+#include <utility>
 
 #include "platform/ascii_case.h"
 
 namespace {
 
-constexpr std::string_view utf16Mark = "\xFF\xFE";
-constexpr std::string_view utf8Mark = "\xEF\xBB\xBF";
-
 bool TakePrefix(std::string_view& text, std::string_view prefix) {
-  if (!EqualsIgnoringCase(text.substr(0, prefix.size()), prefix)) {
+  // Nearly all are written alike.
+  if (!text.starts_with(prefix) && !EqualsIgnoringCase(text.substr(0, prefix.size()), prefix)) {
     return false;
   }
   text.remove_prefix(prefix.size());
@@ -27,71 +26,70 @@ bool IsFirstInLine(std::string_view bytes, size_t at, size_t width) {
 
 }  // namespace
 
-RegistryHeadings::RegistryHeadings(const ByteReader& read) {
+ExportFormat ReadFormat(const ByteReader& read) {
+  constexpr std::string_view utf16Mark = "\xFF\xFE";
+  constexpr std::string_view utf8Mark = "\xEF\xBB\xBF";
   char begin[64];
   const std::string_view bytes(begin, read(0, begin, sizeof begin));
-  size_t markSize = 0;
+  ExportFormat format;
   if (bytes.starts_with(utf16Mark)) {
-    FileEncoding = ExportEncoding::kUtf16;
-    markSize = utf16Mark.size();
+    format.Encoding = ExportEncoding::kUtf16;
+    format.Begin = utf16Mark.size();
   } else if (bytes.starts_with(utf8Mark)) {
-    markSize = utf8Mark.size();
+    format.Begin = utf8Mark.size();
   }
-  AppendDecoded(DecodedLine, bytes.substr(markSize), FileEncoding);
-  FileHexForm = DecodedLine.starts_with("REGEDIT4") ? HexText::kNarrow : HexText::kUtf16;
-
-  RegistryPieces pieces(read, FileEncoding, markSize);
-  while (pieces.Next()) {
-    const size_t from =
-        pieces.IsLineBegun() ? FindCharacter(pieces.Bytes(), FileEncoding, '\n', 0) : 0;
-    ScanLines(pieces.Bytes(), pieces.Offset(), from);
-  }
-  FileEnd = pieces.Offset();
+  std::string firstLine;
+  AppendDecoded(firstLine, bytes.substr(format.Begin), format.Encoding);
+  format.HexForm = firstLine.starts_with("REGEDIT4") ? HexText::kNarrow : HexText::kUtf16;
+  return format;
 }
 
-RegistryHeading RegistryHeadings::At(size_t index) const {
-  const Place& place = Places[index];
-  const bool isLast = index + 1 == Places.size();
-  const size_t recordEnd = isLast ? Records.size() : Places[index + 1].Record;
-  const std::string_view record(Records.data() + place.Record, recordEnd - place.Record);
-  return {static_cast<HeadingKind>(record.front()), record.substr(1), place.Begin,
-          isLast ? FileEnd : Places[index + 1].Begin};
+RegistryHeadings::RegistryHeadings(ByteReader read, ExportEncoding encoding)
+    : Encoding(encoding), Pieces(std::move(read), encoding) {}
+
+uint64_t RegistryHeadings::Visit(uint64_t begin, uint64_t end, const Visitor& visitor) {
+  Pieces.Start(begin, end);
+  while (Pieces.Next()) {
+    VisitPiece(visitor);
+  }
+  return Pieces.Offset();
 }
 
-void RegistryHeadings::ScanLines(std::string_view bytes, uint64_t offset, size_t from) {
+void RegistryHeadings::VisitPiece(const Visitor& visitor) {
+  const std::string_view bytes = Pieces.Bytes();
   // Only the first bracket of a line can begin a heading, so that no line is looked at twice.
-  size_t at = FindCharacter(bytes, FileEncoding, '[', from);
-  while (at != std::string_view::npos) {
-    const size_t end = std::min(FindCharacter(bytes, FileEncoding, '\n', at), bytes.size());
-    if (IsFirstInLine(bytes, at, CharacterWidth(FileEncoding))) {
-      AddHeading(bytes.substr(at, end - at), offset + at);
+  size_t lineEnd = Pieces.IsLineBegun() ? FindCharacter(bytes, Encoding, '\n', 0) : 0;
+  while (true) {
+    const size_t at = FindCharacter(bytes, Encoding, '[', lineEnd);
+    if (at == std::string_view::npos) {
+      return;
     }
-    at = FindCharacter(bytes, FileEncoding, '[', end);
+    lineEnd = std::min(FindCharacter(bytes, Encoding, '\n', at), bytes.size());
+    if (IsFirstInLine(bytes, at, CharacterWidth(Encoding))) {
+      VisitLine(bytes.substr(at, lineEnd - at), Pieces.Offset() + at, visitor);
+    }
   }
 }
 
-void RegistryHeadings::AddHeading(std::string_view line, uint64_t offset) {
-  DecodedLine.clear();
-  AppendDecoded(DecodedLine, line, FileEncoding);
-  std::string_view text = DecodedLine;
+void RegistryHeadings::VisitLine(std::string_view line, uint64_t offset, const Visitor& visitor) {
+  std::string_view text = line;
+  if (Encoding == ExportEncoding::kUtf16) {
+    DecodedLine.clear();
+    AppendNarrowed(DecodedLine, line);
+    text = DecodedLine;
+  }
   TakePrefix(text, "[");
   const HeadingKind kind = TakePrefix(text, "-") ? HeadingKind::kRemoval : HeadingKind::kKey;
-  // Other lines may begin with a bracket within a text of several lines.
-  if (!EqualsIgnoringCase(text.substr(0, 5), "HKEY_")) {
+  // Within a text of several lines, others may begin with a bracket.
+  if (!TakePrefix(text, "HKEY_")) {
     return;
   }
   const size_t close = text.rfind(']');
   text = text.substr(0, close);
-  if (close == std::string_view::npos || !TakePrefix(text, "HKEY_LOCAL_MACHINE") ||
+  if (close == std::string_view::npos || !TakePrefix(text, "LOCAL_MACHINE") ||
       (!text.empty() && !TakePrefix(text, "\\"))) {
-    AddRecord(HeadingKind::kOther, "", offset);
+    visitor({HeadingKind::kOther, "", offset});
     return;
   }
-  AddRecord(kind, text, offset);
-}
-
-void RegistryHeadings::AddRecord(HeadingKind kind, std::string_view path, uint64_t offset) {
-  Places.push_back({offset, Records.size()});
-  Records += static_cast<char>(kind);
-  Records += path;
+  visitor({kind, text, offset});
 }

@@ -1,54 +1,52 @@
 #pragma once
 
-#include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "platform/posix/registry_lines.h"
 #include "platform/posix/registry_pieces.h"
 #include "platform/posix/registry_text.h"
 
-enum class HeadingKind : char {
-  kKey = '+',      // [HKEY_LOCAL_MACHINE\SOFTWARE\ZEK]
-  kRemoval = '-',  // [-HKEY_LOCAL_MACHINE\SOFTWARE\ZEK]: this key and all below it
-  kOther = '?',    // a key that lies elsewhere, or a heading that breaks off
+// How an export is written, as its first bytes say.
+struct ExportFormat {
+  uint64_t Begin = 0;  // behind the mark
+  ExportEncoding Encoding = ExportEncoding::kUtf8;
+  HexText HexForm = HexText::kUtf16;
+};
+
+ExportFormat ReadFormat(const ByteReader& read);
+
+enum class HeadingKind {
+  kKey,      // [HKEY_LOCAL_MACHINE\SOFTWARE\ZEK]
+  kRemoval,  // [-HKEY_LOCAL_MACHINE\SOFTWARE\ZEK]: this key and all below it
+  kOther,    // a key that lies elsewhere, or a heading that breaks off
 };
 
 struct RegistryHeading {
   HeadingKind Kind = HeadingKind::kOther;
-  std::string_view Path;  // below HKEY_LOCAL_MACHINE, as written; lives as long as the list
+  std::string_view Path;  // below HKEY_LOCAL_MACHINE, as written
   uint64_t Begin = 0;     // of the heading in the file, in bytes
-  uint64_t End = 0;       // of the lines below it
 };
 
-// Every heading of an export, in file order. The export goes by once, and nothing of it is kept but
-// where the headings stand and what paths they name.
+// Finds the headings in stretches of an export.
 class RegistryHeadings {
  public:
-  explicit RegistryHeadings(const ByteReader& read);
+  // The path of a heading is good until the visitor returns.
+  using Visitor = std::function<void(const RegistryHeading&)>;
 
-  size_t Count() const { return Places.size(); }
-  RegistryHeading At(size_t index) const;
+  RegistryHeadings(ByteReader read, ExportEncoding encoding);
 
-  ExportEncoding Encoding() const { return FileEncoding; }
-  HexText HexForm() const { return FileHexForm; }
+  // Shows the visitor each heading of a stretch, which begins with a line. Gives the stretch's end,
+  // or the file's if that comes first.
+  uint64_t Visit(uint64_t begin, uint64_t end, const Visitor& visitor);
 
  private:
-  struct Place {
-    uint64_t Begin;  // in the file
-    size_t Record;   // in Records: one character for the kind, and the path behind it
-  };
+  void VisitPiece(const Visitor& visitor);
+  void VisitLine(std::string_view line, uint64_t offset, const Visitor& visitor);
 
-  void ScanLines(std::string_view bytes, uint64_t offset, size_t from);
-  void AddHeading(std::string_view line, uint64_t offset);
-  void AddRecord(HeadingKind kind, std::string_view path, uint64_t offset);
-
-  ExportEncoding FileEncoding = ExportEncoding::kUtf8;
-  HexText FileHexForm = HexText::kUtf16;
-  uint64_t FileEnd = 0;
-  std::vector<Place> Places;
-  std::string Records;
+  ExportEncoding Encoding;
+  RegistryPieces Pieces;
   std::string DecodedLine;  // one buffer for all of them
 };

@@ -1,6 +1,7 @@
 #include "platform/posix/registry_text.h"
 
 #include <cstdint>
+#include <cstring>
 
 namespace {
 
@@ -11,6 +12,15 @@ bool IsCharacterAt(std::string_view utf16, size_t at) {
 uint32_t UnitAt(std::string_view utf16, size_t at) {
   return static_cast<uint32_t>(static_cast<uint8_t>(utf16[at])) |
          static_cast<uint32_t>(static_cast<uint8_t>(utf16[at + 1])) << 8;
+}
+
+bool StartsWithFourAscii(std::string_view utf16, size_t at) {
+  uint64_t units = 0;
+  if (at + sizeof units > utf16.size()) {
+    return false;
+  }
+  std::memcpy(&units, utf16.data() + at, sizeof units);
+  return (units & 0xFF80FF80FF80FF80) == 0;
 }
 
 bool IsLeading(uint32_t unit) { return unit >= 0xD800 && unit <= 0xDBFF; }
@@ -87,7 +97,15 @@ void AppendNarrowed(std::string& text, std::string_view utf16) {
   char* out = text.data() + before;
   size_t at = 0;
   while (at + 1 < utf16.size()) {
-    out = PutCharacter(out, TakeCharacter(utf16, at));
+    // Nearly all of it is ASCII, and four of its characters go as fast as one.
+    while (StartsWithFourAscii(utf16, at)) {
+      for (const size_t end = at + 8; at < end; at += 2) {
+        *out++ = utf16[at];
+      }
+    }
+    if (at + 1 < utf16.size()) {
+      out = PutCharacter(out, TakeCharacter(utf16, at));
+    }
   }
   text.resize(static_cast<size_t>(out - text.data()));
 }

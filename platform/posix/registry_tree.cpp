@@ -1,49 +1,45 @@
 #include "platform/posix/registry_tree.h"
 
-#include <algorithm>
 #include <utility>
 
-#include "platform/ascii_case.h"
+#include "platform/posix/registry_path.h"
 
-namespace {
-
-// The first name of a path, which is taken off it.
-std::string_view TakeName(std::string_view& path) {
-  const std::string_view name = path.substr(0, path.find('\\'));
-  path.remove_prefix(std::min(name.size() + 1, path.size()));
-  return name;
-}
-
-bool HasEmptyName(std::string_view path) {
-  return path.starts_with('\\') || path.ends_with('\\') ||
-         path.find("\\\\") != std::string_view::npos;
-}
-
-}  // namespace
-
-bool IsAtOrBelow(std::string_view path, std::string_view top) {
-  const bool canBe = top.empty() || path.size() == top.size() ||
-                     (path.size() > top.size() && path[top.size()] == '\\');
-  return canBe && EqualsIgnoringCase(path.substr(0, top.size()), top);
-}
-
-RegistryTree::RegistryTree(const RegistryHeadings& headings, std::string top)
+RegistryTree::RegistryTree(RegistryHeadings& headings, const std::vector<RegistryStretch>& map,
+                           std::string top)
     : TopPath(std::move(top)), Keys(1) {
-  for (size_t i = 0; i < headings.Count(); ++i) {
-    const RegistryHeading heading = headings.At(i);
-    if (heading.Kind == HeadingKind::kKey && IsAtOrBelow(heading.Path, TopPath)) {
-      Add(heading);
-    } else if (heading.Kind == HeadingKind::kRemoval &&
-               (IsAtOrBelow(heading.Path, TopPath) || IsAtOrBelow(TopPath, heading.Path))) {
-      Remove(heading.Path);
+  for (const RegistryStretch& stretch : map) {
+    const bool isRelated = IsAtOrBelow(stretch.Part, TopPath) || IsAtOrBelow(TopPath, stretch.Part);
+    if (stretch.Kind != HeadingKind::kOther && isRelated) {
+      EndLines(headings.Visit(stretch.Begin, stretch.End,
+                              [this](const RegistryHeading& heading) { Take(heading); }));
     }
+  }
+}
+
+// Lines end where the next heading begins, whatever that is of.
+void RegistryTree::EndLines(uint64_t end) {
+  if (OpenLines != nullptr) {
+    OpenLines->End = end;
+    OpenLines = nullptr;
+  }
+}
+
+void RegistryTree::Take(const RegistryHeading& heading) {
+  EndLines(heading.Begin);
+  if (heading.Kind == HeadingKind::kRemoval) {
+    Remove(heading.Path);
+  } else if (heading.Kind == HeadingKind::kKey && IsAtOrBelow(heading.Path, TopPath) &&
+             !HasEmptyName(heading.Path)) {
+    std::vector<Lines>& places = Keys[FindOrAdd(BelowTop(heading.Path))].Places;
+    places.push_back({heading.Begin, heading.Begin});
+    OpenLines = &places.back();
   }
 }
 
 RegistryTree::Key* RegistryTree::Find(std::string_view path) {
   Key* key = &Keys.front();
-  while (!path.empty()) {
-    const size_t* number = key->SubKeys.Find(TakeName(path));
+  for (std::string_view rest = BelowTop(path); !rest.empty();) {
+    const size_t* number = key->SubKeys.Find(TakeFirstName(rest));
     if (number == nullptr) {
       return nullptr;
     }
@@ -52,29 +48,37 @@ RegistryTree::Key* RegistryTree::Find(std::string_view path) {
   return key;
 }
 
-void RegistryTree::Add(const RegistryHeading& heading) {
-  if (HasEmptyName(heading.Path)) {
-    return;
-  }
+std::string_view RegistryTree::BelowTop(std::string_view path) const {
+  const bool isTop = path.size() == TopPath.size();
+  return path.substr(TopPath.size() + (isTop || TopPath.empty() ? 0 : 1));
+}
+
+size_t RegistryTree::FindOrAdd(std::string_view path) {
   size_t key = 0;
-  for (std::string_view rest = heading.Path; !rest.empty();) {
-    size_t& number = Keys[key].SubKeys.FindOrAdd(TakeName(rest));
-    if (number == 0) {
-      number = Keys.size();
+  while (!path.empty()) {
+    size_t& number = Keys[key].SubKeys.FindOrAdd(TakeFirstName(path));
+    if (number != 0) {
       key = number;
-      Keys.emplace_back();
-    } else {
-      key = number;
+      continue;
     }
+    key = Keys.size();
+    number = key;
+    Keys.emplace_back();
   }
-  Keys[key].Headings.push_back(heading);
+  return key;
 }
 
 void RegistryTree::Remove(std::string_view path) {
-  const size_t parentEnd = path.rfind('\\');
-  const bool isTopLevel = parentEnd == std::string_view::npos;
-  Key* parent = Find(isTopLevel ? "" : path.substr(0, parentEnd));
+  if (IsAtOrBelow(TopPath, path)) {
+    Keys.clear();
+    Keys.resize(1);
+    return;
+  }
+  if (!IsAtOrBelow(path, TopPath)) {
+    return;
+  }
+  Key* parent = Find(ParentOf(path));
   if (parent != nullptr) {
-    parent->SubKeys.Remove(isTopLevel ? path : path.substr(parentEnd + 1));
+    parent->SubKeys.Remove(LastNameOf(path));
   }
 }
