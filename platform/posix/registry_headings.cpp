@@ -91,5 +91,8 @@ void RegistryHeadings::VisitLine(std::string_view line, uint64_t offset, const V
     visitor({HeadingKind::kOther, "", offset});
     return;
   }
+  if (text.ends_with('\\')) {  // some exporters end the path of a hive so
+    text.remove_suffix(1);
+  }
   visitor({kind, text, offset});
 }
