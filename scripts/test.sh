@@ -9,3 +9,4 @@ for preset in debug release; do
   scripts/build.sh "$preset"
   ctest --preset "$preset"
 done
+scripts/check-archive.sh build/release/ORXInstallEventLog

@@ -2,11 +2,14 @@
 
 #include <cstdlib>
 
+#include "platform/path.h"
+
 std::string GetFolderPath(int32_t csidl) {
   constexpr int32_t commonAppData = 35;
   if (csidl != commonAppData) {
     return "";
   }
   const char* folder = std::getenv("ORX_COMMON_APPDATA");
-  return folder != nullptr && *folder != '\0' ? folder : "/var/lib";
+  // Absolute, as the paths that the history file keeps must lead to the same place in every run.
+  return AbsolutePath(folder == nullptr ? "" : folder).value_or("/var/lib");
 }

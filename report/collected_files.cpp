@@ -1,0 +1,59 @@
+#include <vector>
+
+#include "app/install_event.h"
+#include "history/locations.h"
+#include "platform/files.h"
+#include "platform/path.h"
+#include "platform/profile_file.h"
+
+namespace {
+
+struct FileKey {
+  std::string (CInstallEvent::*Get)() const;
+  void (CInstallEvent::*Set)(const std::string&);
+};
+
+// In the order of handling: of two files with one name the first is taken.
+constexpr FileKey fileKeys[] = {
+    {&CInstallEvent::GetLogFileName, &CInstallEvent::SetLogFileName},
+    {&CInstallEvent::GetTraceFile, &CInstallEvent::SetTraceFile},
+    {&CInstallEvent::GetResponseFile, &CInstallEvent::SetResponseFile},
+};
+
+struct CollectedFile {
+  FileKey Key;
+  std::string Source;
+  std::string Target;
+};
+
+// The target's name is below the history folder.
+bool CopyIntoHistory(const std::string& source, const std::string& targetName) {
+  const std::string target = JoinPath(GetHistoryDir(), targetName);
+  return FileExists(source) && !FileExists(target) && !LeadsOutOfHistory(targetName) &&
+         CopyToNewFile(source, target);
+}
+
+}  // namespace
+
+void CInstallEvent::CollectFiles() {
+  const std::string copyName = GetCopyName();
+  const std::string folder = copyName.empty() ? EventID : JoinPath(copyName, EventID);
+  std::vector<CollectedFile> collected;
+  for (const FileKey& key : fileKeys) {
+    const std::string source = (this->*key.Get)();
+    const std::string name = JoinPath(folder, source.substr(source.rfind(kPathSeparator) + 1));
+    if (CopyIntoHistory(source, name)) {
+      collected.push_back({key, source, JoinPath(GetHistoryDir(), name)});
+    }
+  }
+  if (collected.empty()) {
+    return;
+  }
+  // No other run waits for the copying above, so one may have named another file in the meantime.
+  const ProfileGuard guard(Ini.Path);
+  for (const CollectedFile& file : collected) {
+    if ((this->*file.Key.Get)() == file.Source) {
+      (this->*file.Key.Set)(file.Target);
+    }
+  }
+}

@@ -1,0 +1,95 @@
+#include <fstream>
+
+#include "app/install_history.h"
+#include "history/locations.h"
+#include "platform/files.h"
+#include "report/copy_events.h"
+
+namespace {
+
+// A stream that stays closed swallows its lines, as one that failed to open does.
+void OpenBelowHistory(std::ofstream& stream, const std::string& name) {
+  const std::string path = JoinPath(GetHistoryDir(), name);
+  // A pipe would hold the report up until somebody reads from it.
+  if (!LeadsOutOfHistory(name) && KindOf(path) != FileKind::kOther) {
+    stream.open(path, std::ios::out | std::ios::trunc);
+  }
+}
+
+void OpenCopySummary(std::ofstream& stream, const std::string& copyName) {
+  const std::string name = JoinPath(copyName, "Summary.txt");
+  // A copy called "." has the overall summary in its folder, which is being written already.
+  const std::string overall = JoinPath(GetHistoryDir(), "Summary.txt");
+  if (!IsSameFile(JoinPath(GetHistoryDir(), name), overall)) {
+    OpenBelowHistory(stream, name);
+  }
+}
+
+void WriteOverallHead(std::ostream& out, size_t copies) {
+  const std::string rule(62, '-');
+  out << rule << std::endl;
+  out << "*         Overall Summary of ORX Installation History        *" << std::endl;
+  out << rule << std::endl;
+  out << std::endl;
+  out << "Total ORX Copies:" << copies << std::endl;
+  out << std::string(127, '-') << std::endl;
+}
+
+void WriteCopyHead(std::ostream& out, const CCopyEvents& copy, const char* countLabel) {
+  out << "ORX Installation Copy:" << copy.Name << std::endl;
+  out << countLabel << copy.Events.size() << std::endl;
+  out << std::string(127, '-') << std::endl;
+}
+
+void WriteEventBlock(std::ostream& out, const CInstallEvent& event) {
+  out << "Event ID        :" << event.GetEventID() << std::endl;
+  out << "Start Time      :" << event.GetStartTime() << std::endl;
+  out << "End Time        :" << event.GetEndTime() << std::endl;
+  out << "Install Type    :" << event.GetType() << std::endl;
+  out << "Product         :" << event.GetProduct() << std::endl;
+  out << "Version         :" << event.GetVersion() << std::endl;
+  out << "Service Level   :" << event.GetServiceLevel() << std::endl;
+  out << "Install Path    :" << event.GetPath() << std::endl;
+  out << "Copy Name       :" << event.GetCopyName() << std::endl;
+  out << "Log File Name   :" << event.GetLogFileName() << std::endl;
+  out << "Trace File Name :" << event.GetTraceFile() << std::endl;
+  out << "Response File   :" << event.GetResponseFile() << std::endl;
+  out << "Event Log File  :" << event.GetEventLogFile() << std::endl;
+  out << "Result          :" << event.GetResult() << std::endl;
+  out << std::string(127, '-') << std::endl;
+}
+
+void WriteCopy(std::ostream& overall, const CCopyEvents& copy) {
+  std::ofstream own;
+  OpenCopySummary(own, copy.Name);
+  WriteCopyHead(overall, copy, "Count of Events      :");
+  WriteCopyHead(own, copy, "Count of Events:");
+  for (CInstallEvent event : copy.Events) {
+    event.CollectFiles();  // first, as it turns keys that are printed below
+    WriteEventBlock(overall, event);
+    overall << std::endl;
+    WriteEventBlock(own, event);
+  }
+  own << std::endl;
+  own << " -------------------- end of sumamry -------------------- ";
+}
+
+}  // namespace
+
+int CInstallHistory::WriteSummary() {
+  if (!HistoryFileExists()) {
+    return 0;
+  }
+  std::ofstream overall;
+  OpenBelowHistory(overall, "Summary.txt");
+  std::vector<std::unique_ptr<CCopyEvents>> groups;
+  GroupEvents(GetEventSections(), groups);
+  WriteOverallHead(overall, groups.size());
+  for (const std::unique_ptr<CCopyEvents>& copy : groups) {
+    WriteCopy(overall, *copy);
+  }
+  overall
+      << "----------------------  end of overall summary ----------------------------------------"
+      << std::endl;
+  return 1;
+}
