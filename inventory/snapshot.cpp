@@ -6,6 +6,7 @@
 #include "inventory/service_list.h"
 #include "inventory/software_list.h"
 #include "inventory/user_list.h"
+#include "products/copy_generation.h"
 #include "products/odbc_drivers.h"
 #include "products/products_list.h"
 

@@ -5,8 +5,10 @@
 #include <fstream>
 #include <iterator>
 #include <random>
+#include <sstream>
 
 #include "app/install_history.h"
+#include "eventlog/logger.h"
 #include "platform/ascii_case.h"
 #include "platform/known_folders.h"
 
@@ -38,9 +40,22 @@ ProgramArguments::ProgramArguments(std::vector<std::string> words) : Words(std::
   }
 }
 
+static void ResetLogFormat() { CLogger::GetInstance().copyfmt(std::ios(nullptr)); }
+
 int RunTool(std::vector<std::string> words) {
+  ResetLogFormat();
   ProgramArguments arguments(std::move(words));
   return CInstallHistory().Run(arguments.Count(), arguments.Vector());
+}
+
+std::string LoggedText(const std::function<void()>& write) {
+  ResetLogFormat();
+  std::stringbuf text;
+  std::ios& log = CLogger::GetInstance();
+  std::streambuf* file = log.rdbuf(&text);
+  write();
+  log.rdbuf(file);
+  return text.str();
 }
 
 std::string FileText(const std::string& path) {

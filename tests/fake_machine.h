@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <map>
 #include <optional>
 #include <string>
@@ -75,8 +76,12 @@ class ProgramArguments {
   std::vector<char*> Pointers;
 };
 
-// One run of the tool in this process, as CInstallHistory::Run; gives its result.
+// One run of the tool in this process, as CInstallHistory::Run; gives its result. Like a process of
+// its own it begins with a stream that nothing has been set at.
 int RunTool(std::vector<std::string> words);
+
+// What is written to the CLogger stream meanwhile, from a stream on that nothing has been set at.
+std::string LoggedText(const std::function<void()>& write);
 
 // All bytes of a file; empty if it cannot be read. Text as it is on disk.
 std::string FileText(const std::string& path);

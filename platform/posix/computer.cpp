@@ -4,19 +4,15 @@
 #include <unistd.h>
 
 #include <cstdlib>
-#include <cstring>
 #include <string_view>
 
+#include "platform/posix/host_name.h"
 #include "platform/posix/text_file.h"
 
 std::optional<std::string> ShortComputerName() {
-  utsname system = {};
-  if (::uname(&system) != 0) {
-    return std::nullopt;
-  }
-  const std::string name(system.nodename, std::strcspn(system.nodename, "."));
+  const std::string name = HostName();
   constexpr size_t longest = 14;
-  return name.size() <= longest ? std::optional(name) : std::nullopt;
+  return !name.empty() && name.size() <= longest ? std::optional(name) : std::nullopt;
 }
 
 std::optional<SystemVersion> QuerySystemVersion(VersionForm form) {

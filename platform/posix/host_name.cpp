@@ -1,0 +1,11 @@
+#include "platform/posix/host_name.h"
+
+#include <sys/utsname.h>
+
+#include <cstring>
+
+std::string HostName() {
+  utsname system = {};
+  ::uname(&system);
+  return std::string(system.nodename, std::strcspn(system.nodename, "."));
+}

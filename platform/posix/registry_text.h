@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+// The two encodings of a registry export. Either way a line ends with a line feed, which a carriage
+// return may precede.
+enum class ExportEncoding {
+  kUtf8,
+  kUtf16,  // lowest byte first
+};
+
+// The bytes of an ASCII character.
+constexpr size_t CharacterWidth(ExportEncoding encoding) {
+  return encoding == ExportEncoding::kUtf16 ? 2 : 1;
+}
+
+// The place of an ASCII character in encoded bytes, from a place on; npos if there is none. Both
+// places count bytes and begin a character.
+size_t FindCharacter(std::string_view bytes, ExportEncoding encoding, char c, size_t from);
+
+// The same from the end of the bytes back.
+size_t FindLastCharacter(std::string_view bytes, ExportEncoding encoding, char c);
+
+// Appends UTF-16 bytes as UTF-8. A surrogate without its other half becomes U+FFFD; a last odd byte
+// is dropped.
+void AppendNarrowed(std::string& text, std::string_view utf16);
+
+// Appends encoded bytes as UTF-8. What is UTF-8 already comes as it is, valid or not.
+void AppendDecoded(std::string& text, std::string_view bytes, ExportEncoding encoding);
