@@ -4,9 +4,11 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "platform/posix/file_calls.h"
+
 std::optional<std::string> ReadAll(const Descriptor& file) {
   struct stat status = {};
-  const bool isSizeKnown = ::fstat(file.Get(), &status) == 0 && status.st_size > 0;
+  const bool isSizeKnown = StatusOf(file, status) && status.st_size > 0;
   // Room behind the end, so that a little text that the caller adds needs no growth.
   constexpr size_t room = 4096;
   std::string text;

@@ -190,6 +190,14 @@ TEST_F(Run, LeavesAHistoryFileThatItCannotRead) {
   EXPECT_TRUE(std::filesystem::is_fifo(path));
 }
 
+TEST_F(Run, WaitsForNoReaderOfALog) {
+  Call({"-start", "1"});
+  const std::string log = History + "/1/ORXInstallEvent.Log";
+  std::filesystem::remove(log);
+  ASSERT_EQ(::mkfifo(log.c_str(), 0600), 0);
+  EXPECT_EQ(Call({"-logmessage", "1", "-message", "into a pipe"}), 0);
+}
+
 TEST_F(Run, FollowsNoLinkOutOfTheHistory) {
   const std::string outside = Root + "/outside";
   std::filesystem::create_directories(History);
@@ -207,8 +215,8 @@ TEST_F(Run, FollowsNoLinkOutOfTheHistory) {
 
 TEST_F(Run, TakesArgumentsOfAnyKind) {
   const std::string big(64 * 1024, 'v');
-  const Words identities = {"]",    "=",  "a=b",     "[x]", "a\nb", "\t", "\xC3\x28\xFF",
-                            "a\\b", ";c", "\x01\x7F"};
+  const Words identities = {"]",    "=",  "a=b",      "[x]",         "a\nb", "\t", "\xC3\x28\xFF",
+                            "a\\b", ";c", "\x01\x7F", ".History.tmp"};
   for (const std::string& id : identities) {
     EXPECT_EQ(Call({"-start", id, "-Command", big, "-Path", "x\n[History]\nCount=99"}), 0);
     EXPECT_EQ(Call({"-logmessage", id, "-message", big}), 0);
