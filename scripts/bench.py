@@ -3,7 +3,7 @@
 
 The commands of one comparison take turns (A B A B ...), so that a change of the machine's speed
 meets all of them. CPU time, of program and system together, decides; elapsed time stands beside
-it. A ratio is that of the medians, the span behind it the lowest and highest ratio of one turn.
+it. A ratio is that of the medians, the span behind it the lowest and highest ratio of one round.
 The exit result tells of nothing but what could not be measured.
 """
 import argparse
@@ -18,8 +18,8 @@ import tempfile
 import time
 
 TOP = pathlib.Path(__file__).resolve().parent.parent
-BUILD = TOP / "build" / "bench"
-TOOL = BUILD / "ORXInstallEventLog"
+PROGRAMS = TOP / "build" / "bench" / "programs"
+TOOL = PROGRAMS / "ORXInstallEventLog"
 HISTORY = pathlib.Path("ZEK", "ORXHistory")
 
 
@@ -58,9 +58,12 @@ def tool(name, root, *arguments, **options):
 
 
 def take_turns(sides, rounds):
-    """One round that does not count, to have all files in memory, and those that do."""
+    """One round that does not count, to have all files in memory, and those that do.
+
+    Every other round goes backwards: what ran before leaves the processor's caches to the next.
+    """
     for turn in range(rounds + 1):
-        for side in sides:
+        for side in sides if turn % 2 == 0 else reversed(sides):
             side.take_turn(turn > 0)
 
 
@@ -73,25 +76,23 @@ def together(name, sides):
 
 
 def heading():
-    print("| work | ours | beside | CPU ratio (span) | to reach | | elapsed ratio (span) |")
+    print("| work | ours | beside | CPU ratio (span) | to reach | | elapsed ratio |")
     print("|---|---|---|---|---|---|---|")
 
 
 def ratio(ours, beside):
-    turns = [a / b for a, b in zip(ours, beside)]
-    middle = statistics.median(ours) / statistics.median(beside)
-    return middle, "%.2f (%.2f-%.2f)" % (middle, min(turns), max(turns))
+    return statistics.median(ours) / statistics.median(beside)
 
 
 def show(work, ours, beside, limit):
     def figure(side):
         return "%s %.3g ms" % (side.name, 1000 * statistics.median(side.cpu))
 
-    cpu, cpu_text = ratio(ours.cpu, beside.cpu)
-    wall_text = ratio(ours.wall, beside.wall)[1]
-    verdict = "met" if cpu <= limit else "missed"
-    print("| %s | %s | %s | %s | %.2f | %s | %s |" %
-          (work, figure(ours), figure(beside), cpu_text, limit, verdict, wall_text), flush=True)
+    cpu = ratio(ours.cpu, beside.cpu)
+    turns = [a / b for a, b in zip(ours.cpu, beside.cpu)]
+    print("| %s | %s | %s | %.3g (%.3g-%.3g) | %.3g | %s | %.3g |" %
+          (work, figure(ours), figure(beside), cpu, min(turns), max(turns), limit,
+           "met" if cpu <= limit else "missed", ratio(ours.wall, beside.wall)), flush=True)
 
 
 def make_history(root, events, *options):
@@ -117,8 +118,8 @@ def bench_message(folder, short):
     subprocess.run([TOOL, "-start", "1"], check=True, stdout=subprocess.DEVNULL,
                    env=dict(os.environ, ORX_COMMON_APPDATA=str(folder)))
     ours = tool("-logmessage", folder, "-logmessage", "1", "-message", "Copying files")
-    empty = Side("empty program", BUILD / "bench" / "empty")
-    streams = Side("empty program with iostream", BUILD / "bench" / "empty_iostream")
+    empty = Side("empty program", PROGRAMS / "empty")
+    streams = Side("empty program with iostream", PROGRAMS / "empty_iostream")
     take_turns([ours, empty, streams], 40 if short else 400)
     show("process start", ours, empty, 1.5)
     show("process start", ours, streams, 1.5)
@@ -137,16 +138,16 @@ def bench_key(folder, short):
             words = [own if word == "FILE" else word for word in command]
             return Side(name, *words, *end, prepare=lambda: copy_to_disk(source, own))
 
-        ours = side("set_key", BUILD / "bench" / "set_key", "FILE")
+        ours = side("set_key", PROGRAMS / "set_key", "FILE")
         others = [side("git config -f", "git", "config", "-f", "FILE",
                        end=(section + ".Result", "Failed")),
-                  side("GKeyFile", BUILD / "bench" / "set_key_glib", "FILE")]
+                  side("GKeyFile", PROGRAMS / "set_key_glib", "FILE")]
         take_turns([ours, *others], 10 if short else 60)
         for other in others:
             show("one key of %d events" % events, ours, other, 1)
         # Takes seconds at its largest, so that it gets fewer turns.
         slow = side("crudini --set", "crudini", "--set", "FILE")
-        ours = side("set_key", BUILD / "bench" / "set_key", "FILE")
+        ours = side("set_key", PROGRAMS / "set_key", "FILE")
         take_turns([ours, slow], 3 if short or events > 1000 else 20)
         show("one key of %d events" % events, ours, slow, 1)
 
@@ -207,7 +208,7 @@ def bench_registry(folder, short):
                         code, export], check=True)
         os.sync()
         whole = tool("a whole -start", root, "-start", "bench")
-        alone = Side("registry_questions", BUILD / "bench" / "registry_questions",
+        alone = Side("its questions alone", PROGRAMS / "registry_questions",
                      ORX_COMMON_APPDATA=str(root))
         cat = Side("cat", "cat", export)
         take_turns([whole, alone, cat], 5 if short else 20)
