@@ -1,3 +1,5 @@
+#include "report/collected_files.h"
+
 #include <vector>
 
 #include "app/install_event.h"
@@ -21,6 +23,7 @@ constexpr FileKey fileKeys[] = {
 };
 
 struct CollectedFile {
+  CInstallEvent& Event;
   FileKey Key;
   std::string Source;
   std::string Target;
@@ -33,27 +36,35 @@ bool CopyIntoHistory(const std::string& source, const std::string& targetName) {
          CopyToNewFile(source, target);
 }
 
-}  // namespace
-
-void CInstallEvent::CollectFiles() {
-  const std::string copyName = GetCopyName();
-  const std::string folder = copyName.empty() ? EventID : JoinPath(copyName, EventID);
-  std::vector<CollectedFile> collected;
+void CopyFilesOf(CInstallEvent& event, std::vector<CollectedFile>& collected) {
+  const std::string copyName = event.GetCopyName();
+  const std::string folder = copyName.empty() ? event.EventID : JoinPath(copyName, event.EventID);
   for (const FileKey& key : fileKeys) {
-    const std::string source = (this->*key.Get)();
+    const std::string source = (event.*key.Get)();
     const std::string name = JoinPath(folder, source.substr(source.rfind(kPathSeparator) + 1));
     if (CopyIntoHistory(source, name)) {
-      collected.push_back({key, source, JoinPath(GetHistoryDir(), name)});
+      collected.push_back({event, key, source, JoinPath(GetHistoryDir(), name)});
     }
+  }
+}
+
+}  // namespace
+
+void CInstallEvent::CollectFiles() { ::CollectFiles({this, 1}); }
+
+void CollectFiles(std::span<CInstallEvent> events) {
+  std::vector<CollectedFile> collected;
+  for (CInstallEvent& event : events) {
+    CopyFilesOf(event, collected);
   }
   if (collected.empty()) {
     return;
   }
   // No other run waits for the copying above, so one may have named another file in the meantime.
-  const ProfileGuard guard(Ini.Path);
+  const ProfileGuard guard(GetHistoryFilePath());
   for (const CollectedFile& file : collected) {
-    if ((this->*file.Key.Get)() == file.Source) {
-      (this->*file.Key.Set)(file.Target);
+    if ((file.Event.*file.Key.Get)() == file.Source) {
+      (file.Event.*file.Key.Set)(file.Target);
     }
   }
 }

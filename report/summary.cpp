@@ -1,8 +1,12 @@
+#include <algorithm>
 #include <fstream>
+#include <span>
+#include <vector>
 
 #include "app/install_history.h"
 #include "history/locations.h"
 #include "platform/files.h"
+#include "report/collected_files.h"
 #include "report/copy_events.h"
 
 namespace {
@@ -64,11 +68,18 @@ void WriteCopy(std::ostream& overall, const CCopyEvents& copy) {
   OpenCopySummary(own, copy.Name);
   WriteCopyHead(overall, copy, "Count of Events      :");
   WriteCopyHead(own, copy, "Count of Events:");
-  for (CInstallEvent event : copy.Events) {
-    event.CollectFiles();  // first, as it turns keys that are printed below
-    WriteEventBlock(overall, event);
-    overall << std::endl;
-    WriteEventBlock(own, event);
+  // A run that is killed between the copying of files and the turning of their keys leaves keys
+  // that no later run turns: those of at most so many events.
+  constexpr size_t most = 64;
+  std::vector<CInstallEvent> events = copy.Events;
+  for (size_t begin = 0; begin < events.size(); begin += most) {
+    const auto some = std::span(events).subspan(begin, std::min(most, events.size() - begin));
+    CollectFiles(some);  // first, as it turns keys that are printed below
+    for (const CInstallEvent& event : some) {
+      WriteEventBlock(overall, event);
+      overall << std::endl;
+      WriteEventBlock(own, event);
+    }
   }
   own << std::endl;
   own << " -------------------- end of sumamry -------------------- ";
