@@ -3,9 +3,11 @@
 #include "app/install_history.h"
 #include "history/locations.h"
 #include "platform/files.h"
+#include "platform/memory.h"
 #include "report/zipper.h"
 
 int CInstallHistory::Report(const std::string& archiveName) {
+  KeepFreedMemory();  // each file is packed with a quarter of a megabyte of its own
   WriteSummary();
   return CreateArchive(archiveName);
 }

@@ -8,6 +8,7 @@ The exit result tells of nothing but what could not be measured.
 """
 import argparse
 import contextlib
+import itertools
 import os
 import pathlib
 import shutil
@@ -108,12 +109,6 @@ def copy_to_disk(source, target):
         os.fsync(copy.fileno())
 
 
-def fresh_tree(source, target):
-    shutil.rmtree(target, ignore_errors=True)
-    shutil.copytree(source, target)
-    os.sync()
-
-
 def bench_message(folder, short):
     subprocess.run([TOOL, "-start", "1"], check=True, stdout=subprocess.DEVNULL,
                    env=dict(os.environ, ORX_COMMON_APPDATA=str(folder)))
@@ -166,19 +161,38 @@ def bench_start(folder, short):
         show("a whole -start", side, sides[0], 3)
 
 
+def first_report(folder, events):
+    """A report over a new copy of a history each time, whose files have not been collected.
+
+    The copies stay until the end: a file system that has just removed thousands of files is slow to
+    make new ones.
+    """
+    source = make_history(folder / ("source-%d" % events), events, "--collect")
+    roots = (folder / ("%d-%d" % (events, turn)) for turn in itertools.count())
+
+    def prepare():
+        root = next(roots)
+        shutil.copytree(source, root)
+        os.sync()
+        side.environment["ORX_COMMON_APPDATA"] = str(root)
+
+    side = tool("%d events, each" % events, "", "-report", folder / "history.zip", share=events,
+                prepare=prepare)
+    return side
+
+
+def repeated_report(folder, events):
+    """A report over a history of which there was one."""
+    return tool("%d events, each" % events, folder / ("%d-0" % events), "-report",
+                folder / "history.zip", share=events)
+
+
 def bench_report(folder, short):
-    firsts = []
-    repeats = []
-    for events in (100, 500) if short else (100, 1000, 2000):
-        source = make_history(folder / ("source-%d" % events), events, "--collect")
-        root = folder / ("run-%d" % events)
-        archive = folder / ("%d.zip" % events)
-        firsts.append(tool("%d events, each" % events, root, "-report", archive, share=events,
-                           prepare=lambda s=source, r=root: fresh_tree(s, r)))
-        repeats.append(tool("%d events, each" % events, root, "-report", archive, share=events))
-    take_turns(firsts, 2 if short else 5)
-    take_turns(repeats, 3 if short else 10)
-    for sides, work in (firsts, "a first report, collecting"), (repeats, "a repeated report"):
+    sizes = (100, 500) if short else (100, 1000, 2000)
+    for work, make, rounds in (("a first report, collecting", first_report, 2 if short else 5),
+                               ("a repeated report", repeated_report, 3 if short else 10)):
+        sides = [make(folder, events) for events in sizes]
+        take_turns(sides, rounds)
         for side in sides[1:]:
             show(work, side, sides[0], 1.25)
 

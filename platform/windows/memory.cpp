@@ -1,0 +1,3 @@
+#include "platform/memory.h"
+
+void KeepFreedMemory() {}
