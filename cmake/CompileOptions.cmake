@@ -2,6 +2,7 @@
 add_library(orx_options INTERFACE)
 
 option(ORX_SANITIZE "Address and undefined-behaviour sanitizers" OFF)
+option(ORX_FUZZ "Fuzz targets; needs clang" OFF)
 
 if(NOT MSVC)
   target_compile_options(orx_options INTERFACE -Wall -Wextra -Wpedantic -Wshadow -Wconversion
@@ -17,6 +18,9 @@ if(NOT MSVC)
   elseif(NOT WIN32)
     target_compile_options(orx_options INTERFACE
       -fstack-protector-strong -U_FORTIFY_SOURCE $<$<CONFIG:Release>:-D_FORTIFY_SOURCE=2>)
+  endif()
+  if(ORX_FUZZ)
+    target_compile_options(orx_options INTERFACE -fsanitize=fuzzer-no-link)
   endif()
   if(NOT WIN32)
     set(CMAKE_POSITION_INDEPENDENT_CODE ON)

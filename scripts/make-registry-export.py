@@ -28,7 +28,8 @@ def component(root):
     path = "%s\\%s" % (root, guid())
     rows = (",".join(["a0"] * 25) for _ in range(random.randint(1, 8)))
     return key(path, '@="Component of the machine"') + key(
-        path + "\\InprocServer32", '@="C:\\\\Windows\\\\System32\\\\module%d.dll"' % random.randint(1, 9999),
+        path + "\\InprocServer32",
+        '@="C:\\\\Windows\\\\System32\\\\module%d.dll"' % random.randint(1, 9999),
         '"ThreadingModel"="Both"', '"Flags"=dword:%08x' % random.getrandbits(32),
         '"Bin"=hex:' + ",\\\n  ".join(rows))
 

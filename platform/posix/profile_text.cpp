@@ -40,11 +40,12 @@ ProfileText::ProfileText(std::string text) : Text(std::move(text)) {
     const size_t begin = LineBegin(all, bracket);
     const size_t next = NextLine(all, bracket);
     const bool isFirst = TrimBlanks(all.substr(begin, bracket - begin)).empty();
-    const size_t close = isFirst ? all.substr(0, next).rfind(']') : none;
-    if (close != none && close > bracket) {
-      const std::string_view name = TrimBlanks(all.substr(bracket + 1, close - bracket - 1));
-      const size_t nameBegin = name.empty() ? close : static_cast<size_t>(name.data() - all.data());
-      Sections.push_back({begin, next, nameBegin, name.size()});
+    const std::string_view header = all.substr(bracket, next - bracket);
+    const size_t close = isFirst ? header.rfind(']') : none;
+    if (close != none) {
+      const std::string_view name = TrimBlanks(header.substr(1, close - 1));
+      const size_t nameBegin = static_cast<size_t>(name.data() - all.data());
+      Sections.push_back({begin, next, name.empty() ? begin : nameBegin, name.size()});
     }
     bracket = all.find('[', next);
   }

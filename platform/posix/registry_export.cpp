@@ -36,14 +36,14 @@ RegistryTree& RegistryExport::BranchOf(const std::string& keyPath) {
 }
 
 // One key is laid out with what lies below it. With the second key of a parent come all the others
-// of that parent, as they are likely to be asked for one by one.
+// of that parent, as they are likely to be asked for one by one; but never a whole hive.
 std::string RegistryExport::TopFor(const std::string& keyPath) const {
   const std::string_view parent = ParentOf(keyPath);
   const bool isSecond = std::any_of(Branches.begin(), Branches.end(),
                                     [&](const std::unique_ptr<RegistryTree>& branch) {
                                       return EqualsIgnoringCase(ParentOf(branch->Top()), parent);
                                     });
-  return isSecond && !parent.empty() ? std::string(parent) : keyPath;
+  return isSecond && !ParentOf(parent).empty() ? std::string(parent) : keyPath;
 }
 
 RegistryValues* RegistryExport::ValuesOf(const std::string& keyPath) {
@@ -64,10 +64,10 @@ void RegistryExport::ReadLines(const RegistryTree::Lines& lines, RegistryValues&
   const auto size = static_cast<size_t>(lines.End - lines.Begin);
   const auto bytes = std::make_unique_for_overwrite<char[]>(size);
   const size_t got = ReadBytes(lines.Begin, bytes.get(), size);
-  std::string text;
-  AppendDecoded(text, {bytes.get(), got}, Format.Encoding);
+  std::string buffer;
+  const std::string_view text = Decoded({bytes.get(), got}, Format.Encoding, buffer);
   const size_t headingEnd = std::min(text.find('\n'), text.size());
-  ReadValueLines(std::string_view(text).substr(headingEnd), Format.HexForm, values);
+  ReadValueLines(text.substr(headingEnd), Format.HexForm, values);
 }
 
 RegistryData RegistryExport::Read(const std::string& keyPath, const std::string& valueName,

@@ -17,11 +17,13 @@ bool TakePrefix(std::string_view& text, std::string_view prefix) {
 }
 
 // Whether only blanks stand between the begin of the line and a place in it.
-bool IsFirstInLine(std::string_view bytes, size_t at, size_t width) {
-  while (at >= width && (bytes[at - width] == ' ' || bytes[at - width] == '\t')) {
+bool IsFirstInLine(std::string_view bytes, ExportEncoding encoding, size_t at) {
+  const size_t width = CharacterWidth(encoding);
+  const auto isBehind = [&](char c) { return HasCharacterAt(bytes, encoding, at - width, c); };
+  while (at > 0 && (isBehind(' ') || isBehind('\t'))) {
     at -= width;
   }
-  return at < width || bytes[at - width] == '\n';
+  return at == 0 || isBehind('\n');
 }
 
 }  // namespace
@@ -38,9 +40,9 @@ ExportFormat ReadFormat(const ByteReader& read) {
   } else if (bytes.starts_with(utf8Mark)) {
     format.Begin = utf8Mark.size();
   }
-  std::string firstLine;
-  AppendDecoded(firstLine, bytes.substr(format.Begin), format.Encoding);
-  format.HexForm = firstLine.starts_with("REGEDIT4") ? HexText::kNarrow : HexText::kUtf16;
+  std::string buffer;
+  const std::string_view text = Decoded(bytes.substr(format.Begin), format.Encoding, buffer);
+  format.HexForm = text.starts_with("REGEDIT4") ? HexText::kNarrow : HexText::kUtf16;
   return format;
 }
 
@@ -65,19 +67,14 @@ void RegistryHeadings::VisitPiece(const Visitor& visitor) {
       return;
     }
     lineEnd = std::min(FindCharacter(bytes, Encoding, '\n', at), bytes.size());
-    if (IsFirstInLine(bytes, at, CharacterWidth(Encoding))) {
+    if (IsFirstInLine(bytes, Encoding, at)) {
       VisitLine(bytes.substr(at, lineEnd - at), Pieces.Offset() + at, visitor);
     }
   }
 }
 
 void RegistryHeadings::VisitLine(std::string_view line, uint64_t offset, const Visitor& visitor) {
-  std::string_view text = line;
-  if (Encoding == ExportEncoding::kUtf16) {
-    DecodedLine.clear();
-    AppendNarrowed(DecodedLine, line);
-    text = DecodedLine;
-  }
+  std::string_view text = Decoded(line, Encoding, LineBuffer);
   TakePrefix(text, "[");
   const HeadingKind kind = TakePrefix(text, "-") ? HeadingKind::kRemoval : HeadingKind::kKey;
   // Within a text of several lines, others may begin with a bracket.

@@ -48,5 +48,5 @@ class RegistryHeadings {
 
   ExportEncoding Encoding;
   RegistryPieces Pieces;
-  std::string DecodedLine;  // one buffer for all of them
+  std::string LineBuffer;  // one buffer for all of them
 };

@@ -5,7 +5,7 @@
 #include <utility>
 
 static constexpr size_t pieceSize = size_t{1} << 18;
-static constexpr size_t longestLine = size_t{1} << 22;
+static constexpr size_t longestLine = size_t{1} << 20;
 
 RegistryPieces::RegistryPieces(ByteReader read, ExportEncoding encoding)
     : Read(std::move(read)),

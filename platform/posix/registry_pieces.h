@@ -13,7 +13,7 @@
 using ByteReader = std::function<size_t(uint64_t offset, char* buffer, size_t size)>;
 
 // Goes through stretches of encoded text, in pieces of whole lines that are small enough to stay in
-// the processor's cache. Only a line of 4 MiB or more comes in several pieces.
+// the processor's cache. Only a line of 1 MiB or more comes in several pieces.
 class RegistryPieces {
  public:
   RegistryPieces(ByteReader read, ExportEncoding encoding);

@@ -5,8 +5,9 @@
 
 namespace {
 
-bool IsCharacterAt(std::string_view utf16, size_t at) {
-  return at % 2 == 0 && at + 1 < utf16.size() && utf16[at + 1] == '\0';
+// The same for any place: a byte may also be the second half of a character.
+bool IsWholeCharacter(std::string_view bytes, ExportEncoding encoding, size_t at, char c) {
+  return at % CharacterWidth(encoding) == 0 && HasCharacterAt(bytes, encoding, at, c);
 }
 
 uint32_t UnitAt(std::string_view utf16, size_t at) {
@@ -71,22 +72,23 @@ char* PutCharacter(char* out, uint32_t character) {
 
 }  // namespace
 
+bool HasCharacterAt(std::string_view bytes, ExportEncoding encoding, size_t at, char c) {
+  return bytes[at] == c &&
+         (encoding == ExportEncoding::kUtf8 || (at + 1 < bytes.size() && bytes[at + 1] == '\0'));
+}
+
 size_t FindCharacter(std::string_view bytes, ExportEncoding encoding, char c, size_t from) {
   size_t at = bytes.find(c, from);
-  if (encoding == ExportEncoding::kUtf16) {
-    while (at != std::string_view::npos && !IsCharacterAt(bytes, at)) {
-      at = bytes.find(c, at + 1);
-    }
+  while (at != std::string_view::npos && !IsWholeCharacter(bytes, encoding, at, c)) {
+    at = bytes.find(c, at + 1);
   }
   return at;
 }
 
 size_t FindLastCharacter(std::string_view bytes, ExportEncoding encoding, char c) {
   size_t at = bytes.rfind(c);
-  if (encoding == ExportEncoding::kUtf16) {
-    while (at != std::string_view::npos && !IsCharacterAt(bytes, at)) {
-      at = at == 0 ? std::string_view::npos : bytes.rfind(c, at - 1);
-    }
+  while (at != std::string_view::npos && !IsWholeCharacter(bytes, encoding, at, c)) {
+    at = at == 0 ? std::string_view::npos : bytes.rfind(c, at - 1);
   }
   return at;
 }
@@ -110,10 +112,11 @@ void AppendNarrowed(std::string& text, std::string_view utf16) {
   text.resize(static_cast<size_t>(out - text.data()));
 }
 
-void AppendDecoded(std::string& text, std::string_view bytes, ExportEncoding encoding) {
-  if (encoding == ExportEncoding::kUtf16) {
-    AppendNarrowed(text, bytes);
-  } else {
-    text += bytes;
+std::string_view Decoded(std::string_view bytes, ExportEncoding encoding, std::string& buffer) {
+  if (encoding == ExportEncoding::kUtf8) {
+    return bytes;
   }
+  buffer.clear();
+  AppendNarrowed(buffer, bytes);
+  return buffer;
 }

@@ -16,6 +16,9 @@ constexpr size_t CharacterWidth(ExportEncoding encoding) {
   return encoding == ExportEncoding::kUtf16 ? 2 : 1;
 }
 
+// Whether an ASCII character stands at a place, which begins a character.
+bool HasCharacterAt(std::string_view bytes, ExportEncoding encoding, size_t at, char c);
+
 // The place of an ASCII character in encoded bytes, from a place on; npos if there is none. Both
 // places count bytes and begin a character.
 size_t FindCharacter(std::string_view bytes, ExportEncoding encoding, char c, size_t from);
@@ -27,5 +30,6 @@ size_t FindLastCharacter(std::string_view bytes, ExportEncoding encoding, char c
 // is dropped.
 void AppendNarrowed(std::string& text, std::string_view utf16);
 
-// Appends encoded bytes as UTF-8. What is UTF-8 already comes as it is, valid or not.
-void AppendDecoded(std::string& text, std::string_view bytes, ExportEncoding encoding);
+// Encoded bytes as UTF-8: the bytes themselves, valid or not, or what it makes of them in the
+// buffer.
+std::string_view Decoded(std::string_view bytes, ExportEncoding encoding, std::string& buffer);

@@ -76,6 +76,7 @@ const std::string wholeExport = header + R"(; a comment
 "Text"="C:\\Dir\\ with \"marks\" [x]" ; a comment
   "Na\"me\\"  =  "größe 漢字 😀"
 "Empty"=""
+"Trap"="上[HKEY_LOCAL_MACHINE\\TRAP]"
 "Two Lines"="one
 [section]
 two"
@@ -114,6 +115,7 @@ const std::string wholeTree = R"([]
 Text=1:later<0>
 Na"me\=1:größe 漢字 😀<0>
 Empty=1:<0>
+Trap=1:上[HKEY_LOCAL_MACHINE\TRAP]<0>
 Two Lines=1:one<10>[section]<10>two<0>
 Escaped=1:one<13><10>two\x<0>
 Number=4:<15><0><0>)"

@@ -1,0 +1,15 @@
+# Gives a program its manifest (the systems that it knows, and that it runs with its caller's rights)
+# and the resource that names its version.
+enable_language(RC)
+
+function(orx_add_windows_resources target)
+  set(folder ${CMAKE_CURRENT_BINARY_DIR}/resources)
+  configure_file(platform/windows/program.manifest.in ${folder}/program.manifest @ONLY)
+  configure_file(platform/windows/program.rc.in ${folder}/program.rc @ONLY)
+  target_sources(${target} PRIVATE ${folder}/program.rc)
+  set_source_files_properties(${folder}/program.rc PROPERTIES
+    OBJECT_DEPENDS ${folder}/program.manifest INCLUDE_DIRECTORIES ${folder})
+  if(MSVC)
+    target_link_options(${target} PRIVATE /MANIFEST:NO)  # else the linker adds a second one
+  endif()
+endfunction()

@@ -1,0 +1,37 @@
+#include "platform/folder_listing.h"
+
+#include "platform/windows/file_entry.h"
+#include "platform/windows/system.h"
+
+std::vector<FolderEntry> ListFolder(const std::string& path) {
+  std::vector<FolderEntry> entries;
+  WIN32_FIND_DATAA entry = {};
+  const HANDLE first = ::FindFirstFileA((path + "\\*.*").c_str(), &entry);
+  if (first == INVALID_HANDLE_VALUE) {
+    return entries;
+  }
+  const UniqueSearch search(first);
+  do {
+    if (!IsLink(entry)) {
+      entries.push_back({entry.cFileName, entry.dwFileAttributes});
+    }
+  } while (::FindNextFileA(search.get(), &entry) != FALSE);
+  return entries;
+}
+
+std::optional<uint32_t> FileAttributes(const std::string& path) {
+  const DWORD attributes = ::GetFileAttributesA(path.c_str());
+  return attributes == INVALID_FILE_ATTRIBUTES ? std::nullopt : std::optional<uint32_t>(attributes);
+}
+
+std::optional<CalendarTime> LastWriteTime(const std::string& path) {
+  const std::optional<WIN32_FIND_DATAA> entry = FindEntry(path);
+  FILETIME local = {};
+  SYSTEMTIME fields = {};
+  if (!entry || ::FileTimeToLocalFileTime(&entry->ftLastWriteTime, &local) == FALSE ||
+      ::FileTimeToSystemTime(&local, &fields) == FALSE) {
+    return std::nullopt;
+  }
+  return CalendarTime{fields.wYear, fields.wMonth,  fields.wDay,
+                      fields.wHour, fields.wMinute, fields.wSecond};
+}

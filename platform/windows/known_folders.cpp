@@ -1,0 +1,16 @@
+#include "platform/known_folders.h"
+
+#include "platform/windows/system.h"
+
+std::string GetFolderPath(int32_t csidl) {
+  using Function = HRESULT(WINAPI*)(HWND, int, HANDLE, DWORD, LPSTR);
+  constexpr DWORD defaultPath = 1;  // SHGFP_TYPE_DEFAULT
+  const Library library("shfolder.dll");
+  const auto getFolderPath = library.Find<Function>("SHGetFolderPathA");
+  if (getFolderPath == nullptr) {
+    return "";
+  }
+  char path[MAX_PATH] = {};
+  getFolderPath(/*hwnd=*/nullptr, csidl, /*hToken=*/nullptr, defaultPath, path);
+  return path;
+}

@@ -1,0 +1,28 @@
+#!/bin/sh
+# Unpacks the system's minizip source package, with its distributor's corrections, as the folder
+# "minizip" below the named one. The package lists of sources are fetched into that folder too: the
+# machine's own package sources are read, and nothing of its set-up is changed.
+set -eu
+mkdir -p "$1"
+cd "$1"
+folder=$PWD
+
+mkdir -p sources lists/partial cache/archives/partial
+for list in /etc/apt/sources.list /etc/apt/sources.list.d/debian.sources; do
+  if [ -e "$list" ]; then
+    sed -E 's/^deb /deb-src /; s/^Types:.*/Types: deb-src/' "$list" > "sources/$(basename "$list")"
+  fi
+done
+# A sources.list is only read as one of the parts with this ending.
+if [ -e sources/sources.list ]; then
+  mv sources/sources.list sources/machine.list
+fi
+
+apt() {
+  apt-get -q -o Dir::Etc::sourcelist=/dev/null -o Dir::Etc::sourceparts="$folder/sources" \
+    -o Dir::State::lists="$folder/lists" -o Dir::Cache="$folder/cache" -o APT::Sandbox::User=root "$@"
+}
+apt update
+apt source --download-only minizip
+rm -rf minizip
+dpkg-source --no-check --extract minizip_*.dsc minizip
