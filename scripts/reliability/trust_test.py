@@ -340,7 +340,8 @@ def main():
     for case in planted:
         if options.seconds and outcome.seconds() - began > options.seconds:
             break
-        outcome.attempt(", ".join(map(str, case)), lambda c=case: check_planted(options.program, *c))
+        outcome.attempt(", ".join(map(str, case)),
+                        lambda case=case: check_planted(options.program, *case))
         done += 1
     print(f"{done} of {len(planted)} things planted, {outcome.seconds():.0f} s")
     outcome.end()
