@@ -8,7 +8,8 @@ cd "$1"
 folder=$PWD
 
 mkdir -p sources lists/partial cache/archives/partial
-for list in /etc/apt/sources.list /etc/apt/sources.list.d/*.list /etc/apt/sources.list.d/*.sources; do
+lists=/etc/apt/sources.list
+for list in $lists $lists.d/*.list $lists.d/*.sources; do
   if [ -e "$list" ]; then
     # The first one is only read among the others if it ends as they do.
     name=$(basename "$list" | sed 's/^sources.list$/machine.list/')
@@ -18,7 +19,8 @@ done
 
 apt() {
   apt-get -q -o Dir::Etc::sourcelist=/dev/null -o Dir::Etc::sourceparts="$folder/sources" \
-    -o Dir::State::lists="$folder/lists" -o Dir::Cache="$folder/cache" -o APT::Sandbox::User=root "$@"
+    -o Dir::State::lists="$folder/lists" -o Dir::Cache="$folder/cache" \
+    -o APT::Sandbox::User=root "$@"
 }
 apt update
 apt source --download-only minizip
