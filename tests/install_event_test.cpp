@@ -121,9 +121,8 @@ TEST(InstallEvent, StaysInTheHistoryFolder) {
   RunTool({});
   const std::string outside = JoinPath(scratch.Root, "outside");
   std::filesystem::create_directory(outside);
-  for (const std::string& hostile :
-       std::vector<std::string>{"..", "../../outside", "../outside", "x/../../outside", ".. ",
-                                outside, "nowhere/1"}) {
+  for (const std::string& hostile : std::vector<std::string>{
+           "..", "../../outside", "../outside", "x/../../outside", ".. ", outside, "nowhere/1"}) {
     testing::internal::CaptureStdout();
     EXPECT_EQ(RunTool({"-start", hostile}), 0);
     EXPECT_EQ(testing::internal::GetCapturedStdout(),
