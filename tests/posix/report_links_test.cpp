@@ -49,7 +49,7 @@ TEST(ReportLinks, AreNeitherFollowedNorPacked) {
   EXPECT_EQ(CInstallHistory().Report(root + "/a.zip"), 1);
   ::alarm(0);
   EXPECT_EQ(
-      ArchiveNames(root + "/a.zip"),
+      ArchiveTree(root + "/a.zip"),
       std::vector<std::string>({"C2", "C2/7", "C2/7/Summary.txt", "C2/7.log", "History.ini"}));
   EXPECT_EQ(fs::file_size(root + "/outside/Summary.txt"), 9U);
   EXPECT_FALSE(fs::exists(root + "/outside/new.log"));
