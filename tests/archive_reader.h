@@ -32,17 +32,15 @@ inline ArchiveEntry ReadEntry(unzFile archive) {
 
 // Everything in the archive, in its order.
 inline std::vector<ArchiveEntry> ReadArchive(const std::string& path) {
-  std::vector<ArchiveEntry> entries;
   constexpr size_t endRecord = 22;  // alone, minizip's reader takes it for no archive
-  if (std::filesystem::file_size(path) > endRecord) {
-    const unzFile archive = unzOpen(path.c_str());
-    EXPECT_NE(archive, nullptr) << path;
-    for (int found = unzGoToFirstFile(archive); found == UNZ_OK;) {
-      entries.push_back(ReadEntry(archive));
-      found = unzGoToNextFile(archive);
-    }
-    unzClose(archive);
+  const bool isEmpty = std::filesystem::file_size(path) == endRecord;
+  const unzFile archive = isEmpty ? nullptr : unzOpen(path.c_str());
+  EXPECT_EQ(archive == nullptr, isEmpty) << path;
+  std::vector<ArchiveEntry> entries;
+  for (int found = unzGoToFirstFile(archive); found == UNZ_OK; found = unzGoToNextFile(archive)) {
+    entries.push_back(ReadEntry(archive));
   }
+  unzClose(archive);
   return entries;
 }
 

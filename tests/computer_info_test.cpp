@@ -4,6 +4,7 @@
 
 #include <sstream>
 
+#include "inventory/process_list.h"
 #include "tests/fake_machine.h"
 
 namespace {
@@ -32,7 +33,7 @@ std::string SystemNames(const std::string& line) {
   CComputerInfo computer;
   EXPECT_EQ(computer.Collect(), 0);
   EXPECT_EQ(computer.IsDomainController, computer.Type == "Domain Controller") << line;
-  return '|' + computer.OSName + '|' + computer.Type + '|';
+  return '|' + computer.OSName + '|' + computer.Type + (IsWindowsNTFamily() ? "|NT|" : "|95|");
 }
 
 std::string ProcessorName(const std::string& line) {

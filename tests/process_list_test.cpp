@@ -6,14 +6,6 @@
 
 namespace {
 
-void SetSystem(uint32_t platform, uint32_t major, uint32_t minor) {
-  SystemVersion version;
-  version.PlatformID = platform;
-  version.MajorVersion = major;
-  version.MinorVersion = minor;
-  Machine().ExtendedVersion = version;
-}
-
 // The result and, behind it, what was found.
 std::string Collected(CProcessList& list) {
   std::string text = std::to_string(list.Collect());
@@ -21,22 +13,6 @@ std::string Collected(CProcessList& list) {
     text += ' ' + std::to_string(process.ProcessID) + ':' + process.Name;
   }
   return text;
-}
-
-TEST(ProcessList, TellsTheSystemFamilies) {
-  struct {
-    uint32_t Platform, Major, Minor;
-    bool IsNT;
-  } const cases[] = {
-      {1, 4, 0, false}, {2, 4, 0, true}, {1, 4, 10, false}, {2, 4, 90, false},
-      {1, 4, 3, true},  {1, 3, 0, true}, {2, 10, 0, true},
-  };
-  for (const auto& [platform, major, minor, isNT] : cases) {
-    SetSystem(platform, major, minor);
-    EXPECT_EQ(IsWindowsNTFamily(), isNT) << platform << ' ' << minor;
-  }
-  Machine().ExtendedVersion.reset();
-  EXPECT_TRUE(IsWindowsNTFamily());
 }
 
 TEST(ProcessList, LeavesOutItselfAndProcessZeroOnNT) {
@@ -53,7 +29,9 @@ TEST(ProcessList, LeavesOutItselfAndProcessZeroOnNT) {
 
 TEST(ProcessList, WalksTheSnapshotOnWindows95) {
   Machine() = FakeMachine();
-  SetSystem(1, 4, 10);
+  Machine().ExtendedVersion = SystemVersion();
+  Machine().ExtendedVersion->MajorVersion = 4;
+  Machine().ExtendedVersion->MinorVersion = 10;
   Machine().OwnProcess = 7;
   CProcessList list;
   EXPECT_EQ(Collected(list), "1");
