@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 #include "tests/fake_machine.h"
 
 namespace {
@@ -28,23 +30,20 @@ TEST(IniFile, KeepsEveryValueOnOneLine) {
 
 TEST(IniFile, ListsSectionsAsFarAsTheyFit) {
   const ScratchHistory scratch;
+  const CIniFile file(scratch.In("a.ini"));
+  EXPECT_TRUE(file.GetSectionNames().empty());
   // 10 names of 1000 bytes with their ends, and one that ends at, before or behind the limit.
   for (const size_t last : {227, 228, 229, 900}) {
-    CIniFile file(scratch.In(std::to_string(last)));
     std::vector<std::string> names;
-    for (char c = 'a'; c < 'k'; ++c) {
-      names.emplace_back(1000, c);
+    std::string text;
+    for (char c = 'a'; c <= 'k'; ++c) {
+      names.emplace_back(c < 'k' ? 1000 : last, c);
+      text += '[' + names.back() + "]\n";
     }
-    names.emplace_back(last, 'z');
-    names.emplace_back("behind");
-    for (const std::string& name : names) {
-      file.WriteString(name, "Key", "");
-    }
-    names.pop_back();
+    WriteFileText(file.Path, text + "[behind]\n");
     names.back().resize(std::min<size_t>(last, 228));
     EXPECT_EQ(file.GetSectionNames(), names);
   }
-  EXPECT_TRUE(CIniFile(scratch.In("none.ini")).GetSectionNames().empty());
 }
 
 }  // namespace

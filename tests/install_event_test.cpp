@@ -16,26 +16,26 @@ namespace {
 
 using Words = std::vector<std::string>;
 
-// What a command line, split at its blanks, says: kind, identity, and the fields of some options.
+// What a command line, split at its blanks, says: kind, identity, -l, -u, -Type, -message.
 std::string Parsed(const std::string& commandLine) {
   std::istringstream words(commandLine);
   ProgramArguments arguments({std::istream_iterator<std::string>(words), {}});
   const CInstallEvent event(arguments.Count(), arguments.Vector());
   EXPECT_EQ(event.Valid, !event.Mode.empty()) << commandLine;
-  return event.Mode + ',' + event.EventID + ",l=" + event.LogFile + ",u=" + event.ResponseFile +
-         ",type=" + event.Type + ",message=" + event.Message;
+  return event.Mode + ',' + event.EventID + ',' + event.LogFile + ',' + event.ResponseFile + ',' +
+         event.Type + ',' + event.Message;
 }
 
 TEST(InstallEvent, TakesOptionsFromTheCommandLine) {
   const ScratchHistory scratch;
   const std::pair<const char*, const char*> cases[] = {
-      {"", ",,l=,u=,type=,message="},
-      {"-end", ",,l=,u=,type=,message="},
-      {"-l -end 7", ",,l=-end,u=,type=,message="},
-      {"-LOGMESSAGE 7 -MESSAGE -l", "-logmessage,7,l=,u=,type=,message=-l"},
-      {"-InstallType GUI -end 7 -type", "-end,7,l=,u=,type=,message="},
-      {"-start 7 -end 8 -x -L a", "-end,8,l=a,u=,type=,message="},
-      {"x -end 7 -u one -U two", "-end,7,l=,u=two,type=,message="},
+      {"", ",,,,,"},
+      {"-end", ",,,,,"},
+      {"-l -end 7", ",,-end,,,"},
+      {"-LOGMESSAGE 7 -MESSAGE -l", "-logmessage,7,,,,-l"},
+      {"-InstallType GUI -end 7 -type", "-end,7,,,,"},
+      {"-start 7 -end 8 -x -L a", "-end,8,a,,,"},
+      {"x -end 7 -u one -U two", "-end,7,,two,,"},
   };
   for (const auto& [commandLine, parsed] : cases) {
     EXPECT_EQ(Parsed(commandLine), parsed);

@@ -67,6 +67,8 @@ TEST(Report, NeedsAHistoryFolderForItsArchiveAndAHistoryFileForItsSummary) {
   EXPECT_EQ(CInstallHistory().WriteSummary(), 0);
 
   RunTool({});
+  EXPECT_TRUE(FileExists('"' + GetHistoryFilePath() + '"'));
+  EXPECT_TRUE(DirExists('"' + GetHistoryDir() + '"'));
   EXPECT_EQ(CInstallHistory().WriteSummary(), 1);
   EXPECT_EQ(scratch.Neutral(FileText(InHistory("Summary.txt"))), Golden("summary_empty.txt"));
 }

@@ -41,17 +41,16 @@ class Run : public testing::Test {
   }
   void TearDown() override { fs::remove_all(Root); }
 
-  // The result of a command line for the shell. It finds the program as $ORX, and what it runs
-  // cannot wait for ever, as for the other end of a pipe.
-  static int Shell(const std::string& command) {
-    const int status = std::system(("ORX='timeout 60 " ORX_PROGRAM "'; " + command).c_str());
+  // The result of a script, which runs in the scratch folder and ends at the first failure. It
+  // finds the program as $ORX, which cannot wait for ever, as for the other end of a pipe.
+  int Shell(const std::string& script) const {
+    const std::string head = "set -e; cd " + Root + "; ORX='timeout 60 " ORX_PROGRAM "'; ";
+    const int status = std::system((head + script).c_str());
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
   }
 
   // The program's result; its output goes to the file "output".
-  int Call(const std::string& arguments) const {
-    return Shell("$ORX " + arguments + " >" + Root + "/output");
-  }
+  int Call(const std::string& arguments) const { return Shell("$ORX " + arguments + " >output"); }
 
   ProfileText HistoryFile() const { return ProfileText(Text(History + "History.ini")); }
 
@@ -97,18 +96,16 @@ TEST_F(Run, OverlappingStartsAllCount) {
 
 TEST_F(Run, OverlappingMessagesStayWhole) {
   Call("-start 7");
-  const std::string log = History + "7/ORXInstallEvent.Log";
-  fs::resize_file(log, 0);
-  std::string command;
-  std::string expected;
+  std::string messages;
   for (char c = 'a'; c <= 'z'; ++c) {
-    const std::string message(20000, c);
-    command += "$ORX -logmessage 7 -message " + message + " & ";
-    expected += message + '\n';
+    messages += std::string(20000, c) + '\n';
   }
-  Write(Root + "/messages", command + "wait\n");
-  EXPECT_EQ(Shell(". " + Root + "/messages; sort -o " + log + ' ' + log), 0);
-  EXPECT_EQ(Text(log), expected);
+  Write(Root + "/messages", messages);
+  EXPECT_EQ(Shell("cd ZEK/ORXHistory/7; : >ORXInstallEvent.Log;"
+                  "xargs -P 16 -n 1 -a ../../../messages $ORX -logmessage 7 -message;"
+                  "sort -o ORXInstallEvent.Log ORXInstallEvent.Log"),
+            0);
+  EXPECT_EQ(Text(History + "7/ORXInstallEvent.Log"), messages);
 }
 
 TEST_F(Run, SurvivesHistoryFilesOfAnyKind) {
@@ -142,47 +139,37 @@ TEST_F(Run, SurvivesHistoryFilesOfAnyKind) {
 }
 
 TEST_F(Run, LeavesAHistoryFileThatItCannotRead) {
-  const std::string path = History + "History.ini";
-  Write(Root + "/other.ini", "[Other]\nKey=1\n");
-  fs::create_directories(path + "/inside");
-  EXPECT_EQ(Call("-start 1"), 0);
-  EXPECT_EQ(fs::remove_all(path), 2U);
-  fs::create_symlink(Root + "/other.ini", path);
-  EXPECT_EQ(Call("-start 1"), 0);
-  EXPECT_TRUE(fs::is_symlink(path));
-  EXPECT_EQ(Text(path), "[Other]\nKey=1\n");
-  fs::remove(path);
-  ASSERT_EQ(::mkfifo(path.c_str(), 0600), 0);
-  EXPECT_EQ(Call("-start 1"), 0);
-  EXPECT_TRUE(fs::is_fifo(path));
+  const char* cases[][2] = {{"mkdir -p History.ini/inside", "test -d History.ini/inside"},
+                            {"echo '[Other]' >other; ln -s other History.ini",
+                             "test -h History.ini -a $(cat other) = '[Other]'"},
+                            {"mkfifo History.ini", "test -p History.ini"}};
+  for (const auto& [before, after] : cases) {
+    EXPECT_EQ(Shell("cd ZEK/ORXHistory; rm -rf *; " + std::string(before)), 0);
+    EXPECT_EQ(Call("-start 1"), 0);
+    EXPECT_EQ(Shell("cd ZEK/ORXHistory; " + std::string(after)), 0) << after;
+  }
 }
 
 TEST_F(Run, NeitherFollowsNorPacksLinksAndPipes) {
-  const std::string outside = Root + "/outside";
-  for (const std::string& folder : {outside + "/7", History + "C2/7", History + "C2/7.log"}) {
-    fs::create_directories(folder);
-  }
-  Write(outside + "/Summary.txt", "untouched");
-  Write(Root + "/setup.log", "log");
-  fs::create_symlink(outside, History + "C1");
-  fs::create_symlink(outside + "/Summary.txt", History + "Summary.txt");
-  fs::create_symlink(outside + "/new.log", History + "C2/7.log/setup.log");
-  fs::create_symlink(outside + "/new.log", History + "C2/ORXInstallEvent.Log");
-  fs::create_symlink(History + "C2", History + "loop");
-  ASSERT_EQ(::mkfifo((History + "C2/Summary.txt").c_str(), 0600), 0);
-  ASSERT_EQ(::mkfifo((History + "pipe").c_str(), 0600), 0);
+  ASSERT_EQ(
+      Shell("mkdir outside outside/7; echo untouched >outside/Summary.txt; echo log >setup.log;"
+            "cd ZEK/ORXHistory; mkdir C2 C2/7 C2/7.log; mkfifo pipe C2/Summary.txt;"
+            "ln -s ../../outside C1; ln -s ../../outside/Summary.txt .; ln -s C2 loop;"
+            "ln -s ../../../../outside/new.log C2/7.log/setup.log;"
+            "ln -s ../../../outside/new.log C2/ORXInstallEvent.Log"),
+      0);
   ASSERT_EQ(::mknod((History + "socket").c_str(), S_IFSOCK | 0600, 0), 0);
   const std::string log = "Log_File_Name=" + Root + "/setup.log\n";
   Write(History + "History.ini", "[7]\nCopy_Name=C1\n" + log + "[8]\nCopy_Name=C2/7\n" + log +
                                      "[7.log]\nCopy_Name=C2\n" + log);
-  for (const std::string arguments : {"-start C1", "-start C2", "-start 9", "-end 9 -CopyName C1",
-                                      "-report $ORX_COMMON_APPDATA/a.zip"}) {
+  for (const std::string arguments :
+       {"-start C1", "-start C2", "-start 9", "-end 9 -CopyName C1", "-report a.zip"}) {
     EXPECT_EQ(Call(arguments), 0);
   }
   EXPECT_EQ(ArchiveTree(Root + "/a.zip"),
             "9/\n9/ORXInstallEvent.Log\nC2/\nC2/7/\nC2/7/Summary.txt\nC2/7.log/\nHistory.ini\n");
-  EXPECT_EQ(Text(outside + "/Summary.txt"), "untouched");
-  EXPECT_EQ(fs::remove_all(outside), 3U);  // itself and what is made above, nothing new
+  EXPECT_EQ(Text(Root + "/outside/Summary.txt"), "untouched\n");
+  EXPECT_EQ(fs::remove_all(Root + "/outside"), 3U);  // itself and what is made above
 }
 
 TEST_F(Run, TakesArgumentsOfAnyKind) {
