@@ -4,7 +4,7 @@
 set -eu
 cd "$(dirname "$0")/.."
 
-scripts/install-packages.sh dbus libnss-wrapper unzip zip
+scripts/install-packages.sh libnss-wrapper unzip zip
 for preset in debug release; do
   scripts/build.sh "$preset"
   ctest --preset "$preset"
