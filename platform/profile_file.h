@@ -16,13 +16,13 @@
 // The value of a key, at most size - 1 bytes of it, without the blanks around it and without one
 // pair of quotation marks, double or single, that encloses it. Without the file, the section or
 // the key: the fallback, cut in the same way. Windows: GetPrivateProfileStringA.
-std::string ReadProfileString(const std::string& path, const std::string& section,
-                              const std::string& key, const std::string& fallback, uint32_t size);
+std::string ReadProfileValue(const std::string& path, const std::string& section,
+                             const std::string& key, const std::string& fallback, uint32_t size);
 
 // Sets a key, making file, section and key where they are missing; never a folder. False if the
 // file cannot be read or written, and then it is as it was. Windows: WritePrivateProfileStringA.
-bool WriteProfileString(const std::string& path, const std::string& section, const std::string& key,
-                        const std::string& value);
+bool WriteProfileValue(const std::string& path, const std::string& section, const std::string& key,
+                       const std::string& value);
 
 // The decimal digits, with a minus sign or none, at the start of a key's value; 0 for other text.
 // Without the file, the section or the key: the fallback. Windows: GetPrivateProfileIntA.

@@ -70,7 +70,7 @@ class Platform : public testing::Test {
     std::istringstream stream(values);
     std::string text;
     for (std::string value; std::getline(stream, value, '|');) {
-      EXPECT_TRUE(WriteProfileString(Ini, "S", "Key", value)) << value;
+      EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", value)) << value;
       text += read() + '|';
     }
     return text;
@@ -224,18 +224,18 @@ TEST(Path, IsMadeAbsolute) {
 }
 
 TEST_F(ProfileFile, CutsValuesAtTheBuffersEnd) {
-  EXPECT_TRUE(WriteProfileString(Ini, "S", "Key", "0123456789"));
+  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "0123456789"));
   for (const uint32_t size : {1U, 2U, 10U, 11U, 12U, 256U}) {
     const std::string expected = "0123456789"s.substr(0, size - 1);
-    EXPECT_EQ(ReadProfileString(Ini, "S", "Key", "", size), expected) << size;
-    EXPECT_EQ(ReadProfileString(Ini, "S", "None", "0123456789", size), expected) << size;
-    EXPECT_EQ(ReadProfileString(In("none"), "S", "Key", "0123456789", size), expected) << size;
+    EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", size), expected) << size;
+    EXPECT_EQ(ReadProfileValue(Ini, "S", "None", "0123456789", size), expected) << size;
+    EXPECT_EQ(ReadProfileValue(In("none"), "S", "Key", "0123456789", size), expected) << size;
   }
   EXPECT_EQ(Names(Root), "a.ini ");
 }
 
 TEST_F(ProfileFile, TakesBlanksAndOnePairOfQuotesOffAValue) {
-  const auto readText = [this] { return ReadProfileString(Ini, "S", "Key", "none", 256); };
+  const auto readText = [this] { return ReadProfileValue(Ini, "S", "Key", "none", 256); };
   EXPECT_EQ(ReadEach(R"("a"|'a'|""a""|" a "|"a|a"|"a'|"a" "b"|"|""|  a b  | "a" |a=b;c|[x]||  |)",
                      readText),
             R"(a|a|"a"| a |"a|a"|"a'|a" "b|"||a b|a|a=b;c|[x]|||)");
@@ -250,13 +250,13 @@ TEST_F(ProfileFile, KeepsOrderAndCase) {
   const char* const writes[][3] = {{"One", "B", "1"}, {"Two", "K", "2"},  {"One", "A", "3"},
                                    {"ONE", "b", "4"}, {"two", "New", ""}, {"Two", "K", ""}};
   for (const auto& [section, key, value] : writes) {
-    EXPECT_TRUE(WriteProfileString(Ini, section, key, value));
+    EXPECT_TRUE(WriteProfileValue(Ini, section, key, value));
   }
   // Line ends are the system's, which may also set a blank line between sections.
   const std::string text = std::regex_replace(Text(Ini), std::regex("[\r\n]+"), "\n");
   EXPECT_EQ(text, "[One]\nB=4\nA=3\n[Two]\nK=\nNew=\n");
-  EXPECT_EQ(ReadProfileString(Ini, "TWO", "new", "none", 256), "");
-  EXPECT_EQ(ReadProfileString(Ini, "oNE", "a", "none", 256), "3");
+  EXPECT_EQ(ReadProfileValue(Ini, "TWO", "new", "none", 256), "");
+  EXPECT_EQ(ReadProfileValue(Ini, "oNE", "a", "none", 256), "3");
 }
 
 TEST_F(ProfileFile, ListsSectionsAsFarAsTheyFit) {
@@ -264,8 +264,8 @@ TEST_F(ProfileFile, ListsSectionsAsFarAsTheyFit) {
     return names.substr(0, names.find("\0\0"s));
   };
   EXPECT_EQ(ReadProfileSectionNames(Ini, 100).substr(0, 2), "\0\0"s);
-  WriteProfileString(Ini, "ab", "Key", "");
-  WriteProfileString(Ini, "cde", "Key", "");
+  WriteProfileValue(Ini, "ab", "Key", "");
+  WriteProfileValue(Ini, "cde", "Key", "");
   for (const uint32_t size : {2, 3, 5, 6, 7, 8, 9, 100}) {
     const std::string names = ReadProfileSectionNames(Ini, size);
     EXPECT_LE(names.size(), size);
@@ -275,27 +275,27 @@ TEST_F(ProfileFile, ListsSectionsAsFarAsTheyFit) {
 
 TEST_F(ProfileFile, IsNotMadeWhereItCannotBe) {
   fs::create_directory(In("folder"));
-  EXPECT_FALSE(WriteProfileString(In("folder"), "S", "Key", "v"));
-  EXPECT_FALSE(WriteProfileString(In("none/a.ini"), "S", "Key", "v"));
-  EXPECT_EQ(ReadProfileString(In("folder"), "S", "Key", "none", 256), "none");
+  EXPECT_FALSE(WriteProfileValue(In("folder"), "S", "Key", "v"));
+  EXPECT_FALSE(WriteProfileValue(In("none/a.ini"), "S", "Key", "v"));
+  EXPECT_EQ(ReadProfileValue(In("folder"), "S", "Key", "none", 256), "none");
   EXPECT_EQ(Names(Root), "folder ");
 }
 
 TEST_F(ProfileFile, ChangesAtOnceWhenTheOutermostGuardEnds) {
-  WriteProfileString(Ini, "S", "Key", "old");
+  WriteProfileValue(Ini, "S", "Key", "old");
   const std::string before = Text(Ini);
   {
     const ProfileGuard guard(Ini);
     {
       const ProfileGuard inner(Ini);
-      EXPECT_TRUE(WriteProfileString(Ini, "S", "Key", "new"));
-      EXPECT_TRUE(WriteProfileString(Ini, "T", "Key", "more"));
+      EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "new"));
+      EXPECT_TRUE(WriteProfileValue(Ini, "T", "Key", "more"));
     }
-    EXPECT_EQ(ReadProfileString(Ini, "S", "Key", "", 256), "new");
-    EXPECT_EQ(ReadProfileString(Ini, "T", "Key", "", 256), "more");
+    EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", 256), "new");
+    EXPECT_EQ(ReadProfileValue(Ini, "T", "Key", "", 256), "more");
     EXPECT_EQ(Text(Ini), before);
   }
-  EXPECT_EQ(ReadProfileString(Ini, "S", "Key", "", 256), "new");
+  EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", 256), "new");
   EXPECT_NE(Text(Ini), before);
   EXPECT_EQ(Names(Root), "a.ini ");
 }
