@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <string_view>
 
+#include "platform/ascii_case.h"
 #include "platform/files.h"
 #include "platform/known_folders.h"
 #include "platform/path.h"
@@ -29,13 +30,20 @@ static bool LeadsUp(std::string_view part) {
          part.find_first_not_of(". ") == std::string_view::npos;
 }
 
+// The history file grows under that name before it replaces the old one; a folder in its place
+// would keep every later change from the file.
+static bool IsHistoryFileGrowing(std::string_view part) {
+  return EqualsIgnoringCase(part.substr(0, part.find_last_not_of(". ") + 1), ".History.tmp");
+}
+
 bool LeadsOutOfHistory(const std::string& name) {
   if (IsRootedPath(name)) {
     return true;
   }
   for (size_t begin = 0; begin <= name.size();) {
     const size_t end = std::min(name.find_first_of(kPathSeparators, begin), name.size());
-    if (LeadsUp(std::string_view(name).substr(begin, end - begin)) ||
+    const std::string_view part = std::string_view(name).substr(begin, end - begin);
+    if (LeadsUp(part) || IsHistoryFileGrowing(part) ||
         IsSymbolicLink(JoinPath(GetHistoryDir(), name.substr(0, end)))) {
       return true;
     }
