@@ -3,6 +3,7 @@
 #include "history/locations.h"
 #include "history/timestamp.h"
 #include "inventory/computer_info.h"
+#include "platform/files.h"
 #include "platform/profile_file.h"
 
 static void WriteComputerInfo() {
@@ -39,7 +40,16 @@ void CInstallEvent::OpenEventLog() const {
   if (LeadsOutOfHistory(JoinPath(EventID, "ORXInstallEvent.Log"))) {
     return;  // a logger that was never opened drops all text, as one that failed to open does
   }
-  CLogger::GetInstance().Open(EventLogPath, Mode == "-start" ? std::ios::out : std::ios::app);
+  if (KindOf(EventLogPath) == FileKind::kOther) {
+    return;  // a pipe would hold the run up until somebody reads from it
+  }
+  CLogger& log = CLogger::GetInstance();
+  if (Mode == "-start") {
+    log.Open(EventLogPath, std::ios::out);
+  }
+  // A start appends as well, to the log that it has emptied: a message that another run sends in
+  // the meantime is not written over.
+  log.Open(EventLogPath, std::ios::app);
 }
 
 void CInstallEvent::RecordStart() {

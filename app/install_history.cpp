@@ -33,7 +33,9 @@ bool CInstallHistory::InitHistoryStore() {
   }
   // Unguarded, a run beside this one could count its event before the reset below undoes it.
   const ProfileGuard guard(GetHistoryFilePath());
-  if (!FileExists(GetHistoryFilePath())) {
+  // A file that is there but could not be looked at must keep its count.
+  const CIniFile history(GetHistoryFilePath());
+  if (!FileExists(history.Path) && history.ReadString("History", "Count", "", 2).empty()) {
     ResetCount();
   }
   return true;

@@ -5,7 +5,7 @@
 #include "platform/registry.h"
 
 // Asks the machine's registry what a snapshot asks, and prints how many questions that were. Timed
-// as a whole process by scripts/bench-registry.sh.
+// as a whole process by scripts/bench.sh.
 
 namespace {
 

@@ -1,5 +1,7 @@
 #include "eventlog/logger.h"
 
+#include <cerrno>
+
 CLogger& CLogger::GetInstance() {
   static CLogger instance;
   return instance;
@@ -7,7 +9,10 @@ CLogger& CLogger::GetInstance() {
 
 void CLogger::Open(const std::string& fileName, std::ios_base::openmode mode) {
   Close();
-  open(fileName, mode | std::ios::out);
+  do {
+    errno = 0;  // a failure need not set it
+    open(fileName, mode | std::ios::out);
+  } while (!is_open() && errno == EINTR);
 }
 
 void CLogger::Close() {

@@ -17,19 +17,23 @@ static int32_t ParseNumber(const std::string& text) {
   return static_cast<int32_t>(std::clamp<long long>(number, Limits::min(), Limits::max()));
 }
 
+static CProductInfo ReadProduct(const std::string& root, const std::string& name) {
+  const std::string keyPath = root + "\\" + name + "\\InstallProperties";
+  CProductInfo product;
+  product.DisplayName = ReadRegistryValue(keyPath, "DisplayName");
+  product.DisplayVersion = ReadRegistryValue(keyPath, "DisplayVersion");
+  product.InstallDate = ReadRegistryValue(keyPath, "InstallDate");
+  product.InstallLocation = ReadRegistryValue(keyPath, "InstallLocation");
+  product.Language = ParseNumber(ReadRegistryValue(keyPath, "Language"));
+  product.Publisher = ReadRegistryValue(keyPath, "Publisher");
+  return product;
+}
+
 int32_t CProductsList::Collect() {
   const std::string root =
       "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Installer\\UserData\\S-1-5-18\\Products";
   for (const std::string& name : EnumRegistrySubKeys(root)) {
-    const std::string keyPath = root + "\\" + name + "\\InstallProperties";
-    CProductInfo product;
-    product.DisplayName = ReadRegistryValue(keyPath, "DisplayName");
-    product.DisplayVersion = ReadRegistryValue(keyPath, "DisplayVersion");
-    product.InstallDate = ReadRegistryValue(keyPath, "InstallDate");
-    product.InstallLocation = ReadRegistryValue(keyPath, "InstallLocation");
-    product.Language = ParseNumber(ReadRegistryValue(keyPath, "Language"));
-    product.Publisher = ReadRegistryValue(keyPath, "Publisher");
-    Products.push_back(product);
+    Products.push_back(ReadProduct(root, name));
   }
   return 0;
 }

@@ -5,7 +5,8 @@
 #include <vector>
 
 // Users and groups. A server is named with two leading backslashes; an empty name is the machine
-// itself. A name that needs more than 128 bytes with its terminator comes as an empty text.
+// itself. The name of a group, of a member or of a user without a domain that needs more than 128
+// bytes with its terminator comes as an empty text.
 
 // The user that runs the tool, as domain, backslash, name; nothing if the system cannot tell.
 // Windows: GetUserNameExA. POSIX: getpwuid of the effective user, the host name as the domain.

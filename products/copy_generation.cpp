@@ -10,6 +10,6 @@ std::string GetCopiesRootKey() {
   return copyGeneration == 0 ? "SOFTWARE\\ZEK" : "SOFTWARE\\ZEK\\ORX\\InstalledCopies";
 }
 
-bool IsCopyKey(std::string name) { return copyGeneration != 0 || name == "ORX"; }
+bool IsCopyKey(std::string_view name) { return copyGeneration != 0 || name == "ORX"; }
 
-bool IsProductKey(std::string name) { return name.starts_with("ORX "); }
+bool IsProductKey(std::string_view name) { return name.starts_with("ORX "); }

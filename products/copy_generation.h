@@ -2,6 +2,7 @@
 
 #include <cstdint>
 #include <string>
+#include <string_view>
 
 // Which of the product family's two registry layouts is looked at: 0 for the one before version 9,
 // with a single copy right below the maker's key, and 1 for the one since, with any number of
@@ -15,7 +16,7 @@ std::string GetCopiesRootKey();
 
 // True if a subkey of that name is a copy: before version 9 only "ORX" itself, in this case and
 // with nothing behind it; since then every name.
-bool IsCopyKey(std::string name);
+bool IsCopyKey(std::string_view name);
 
 // True if a copy's subkey of that name is a product: one that begins with "ORX" and a blank.
-bool IsProductKey(std::string name);
+bool IsProductKey(std::string_view name);

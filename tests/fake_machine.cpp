@@ -4,13 +4,18 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <numeric>
 #include <random>
+#include <regex>
+#include <set>
 #include <sstream>
 
 #include "app/install_history.h"
 #include "eventlog/logger.h"
+#include "history/locations.h"
 #include "platform/ascii_case.h"
 #include "platform/known_folders.h"
+#include "platform/path.h"
 
 static std::string commonFolder;
 
@@ -32,6 +37,50 @@ ScratchHistory::~ScratchHistory() {
   std::filesystem::remove_all(Root, ignored);
   commonFolder.clear();
 }
+
+std::string ScratchHistory::In(const std::string& path) const { return Native("@/" + path); }
+
+void ScratchHistory::Make(const std::string& path) const {
+  if (path.ends_with('/')) {
+    std::filesystem::create_directories(In(path));
+    return;
+  }
+  std::filesystem::create_directories(std::filesystem::path(In(path)).parent_path());
+  WriteFileText(In(path), path);
+}
+
+std::string ScratchHistory::Tree() const {
+  std::set<std::string> lines;
+  for (const auto& entry : std::filesystem::recursive_directory_iterator(Root)) {
+    const std::string path = entry.path().string().substr(Root.size() + 1);
+    lines.insert(Neutral(path) + (entry.is_directory() ? "/\n" : "\n"));
+  }
+  return std::accumulate(lines.begin(), lines.end(), std::string());
+}
+
+static std::string Replaced(std::string text, const std::string& old, const std::string& by) {
+  for (size_t place = 0; (place = text.find(old, place)) != std::string::npos;) {
+    text.replace(place, old.size(), by);
+    place += by.size();
+  }
+  return text;
+}
+
+std::string ScratchHistory::Neutral(std::string text) const {
+  std::erase(text, '\r');
+  text = Replaced(Replaced(text, Root, "@"), {kPathSeparator}, "/");
+  return std::regex_replace(text, std::regex("[0-9]{8} [0-9]{2}:[0-9]{2}:[0-9]{2}"), "<time>");
+}
+
+std::string ScratchHistory::Native(const std::string& text) const {
+  return Replaced(Replaced(text, "/", {kPathSeparator}), "@", Root);
+}
+
+std::string InHistory(const std::string& path) {
+  return JoinPath(GetHistoryDir(), Replaced(path, "/", {kPathSeparator}));
+}
+
+std::string Golden(const std::string& name) { return FileText(JoinPath(ORX_GOLDEN_FOLDER, name)); }
 
 ProgramArguments::ProgramArguments(std::vector<std::string> words) : Words(std::move(words)) {
   Words.insert(Words.begin(), "ORXInstallEventLog");

@@ -61,8 +61,28 @@ class ScratchHistory {
   ScratchHistory(const ScratchHistory&) = delete;
   ScratchHistory& operator=(const ScratchHistory&) = delete;
 
+  // Paths are given with slashes, whatever the platform's separator.
+  std::string In(const std::string& path) const;
+
+  // Makes a file that holds its own path as given, or a folder if that ends in a slash; the folders
+  // above it too.
+  void Make(const std::string& path) const;
+
+  // Every file and folder, a line each, a folder's with a slash at its end.
+  std::string Tree() const;
+
+  // A text with "@" for the root, "<time>" for a time stamp, slashes and plain line ends: the same
+  // on every machine, as the golden texts are. And from such a text the one for this machine.
+  std::string Neutral(std::string text) const;
+  std::string Native(const std::string& text) const;
+
   std::string Root;
 };
+
+// A path below the history folder.
+std::string InHistory(const std::string& path);
+
+std::string Golden(const std::string& name);
 
 // An argument vector as the system hands it to main, the program's name in front.
 class ProgramArguments {

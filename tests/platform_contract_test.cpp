@@ -24,6 +24,7 @@ namespace fs = std::filesystem;
 using namespace std::string_literals;
 
 const bool isWindows = kPathSeparator == '\\';
+const std::string device = isWindows ? "NUL" : "/dev/null";
 
 class Platform : public testing::Test {
  protected:
@@ -82,6 +83,8 @@ TEST_F(Files, HaveAKind) {
     EXPECT_EQ(KindOf(path), kind) << path;
     EXPECT_FALSE(IsSymbolicLink(path)) << path;
   }
+  EXPECT_NE(KindOf(device), FileKind::kFile);
+  EXPECT_NE(KindOf(device), FileKind::kFolder);
 }
 
 TEST_F(Files, AreTheSameUnderAnySpelling) {
@@ -209,7 +212,6 @@ TEST_F(Files, AreReadExclusively) {
     EXPECT_EQ(ExclusiveFile(path).IsOpen(), !isWindows);
   }
   EXPECT_TRUE(ExclusiveFile(path).IsOpen());
-  const std::string device = isWindows ? "NUL" : "/dev/null";
   for (const std::string& other : {Root, In("none"), device}) {
     ExclusiveFile file(other);
     char byte = 0;

@@ -51,27 +51,4 @@ TEST(UserList, AsksNoServerButTheMachineItself) {
   EXPECT_EQ(unnamed.GlobalMembers.size(), 2U);
 }
 
-TEST(UserList, PrintsEmptyTablesWithTheGlobalPartOnADomainController) {
-  const std::string frame(83, '=');
-  const std::string groupRule(35, '-');
-  const std::string userRule(74, '-');
-  const auto groupHead = groupRule + "\nGroup Name \n" + groupRule + "\n";
-  const auto userHead =
-      userRule + "\nGroup                                   user   \n" + userRule + "\n";
-  const std::string local = "\nLogged on User:\n" + frame + "\n\nLocal Group List:\n" + groupHead +
-                            groupRule + "\n\nLocal User List:\n" + userHead + userRule + "\n\n";
-  const std::string global = "Global Group List:\n" + groupHead + userRule +
-                             "\nGlobal User List:\n" + userHead + userRule + "\n";
-  Machine() = FakeMachine();
-  CUsersList list;
-  const auto printed = [&list] { return LoggedText([&list] { list.Print(); }); };
-  EXPECT_EQ(printed(), local + frame + "\n");
-
-  SystemVersion controller;
-  controller.PlatformID = 2;
-  controller.ProductType = 2;
-  Machine().ExtendedVersion = controller;
-  EXPECT_EQ(printed(), local + global + frame + "\n");
-}
-
 }  // namespace

@@ -35,11 +35,15 @@ class Descriptor {
   int Number;
 };
 
-// Repeats a system call as long as a signal interrupts it.
+inline bool HasFailed(const void* result) { return result == nullptr; }
+inline bool HasFailed(ssize_t result) { return result == -1; }
+
+// Repeats a system call as long as a signal interrupts it: on a network or user-space file system
+// that can be any call with a path or descriptor.
 template <typename Call>
 auto RetryOnInterrupt(Call call) {
   auto result = call();
-  while (result == -1 && errno == EINTR) {
+  while (HasFailed(result) && errno == EINTR) {
     result = call();
   }
   return result;

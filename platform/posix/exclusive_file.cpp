@@ -4,13 +4,13 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include "platform/posix/descriptor.h"
+#include "platform/posix/file_calls.h"
 
 ExclusiveFile::ExclusiveFile(const std::string& path) {
   Descriptor file(RetryOnInterrupt(
       [&] { return ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC); }));
   struct stat status = {};
-  if (file.IsOpen() && ::fstat(file.Get(), &status) == 0 && S_ISREG(status.st_mode)) {
+  if (file.IsOpen() && StatusOf(file, status) && S_ISREG(status.st_mode)) {
     Handle = file.Release();
   }
 }

@@ -8,10 +8,11 @@
 #include <cstdio>
 
 #include "platform/posix/descriptor.h"
+#include "platform/posix/file_calls.h"
 
 FileKind KindOf(const std::string& path) {
   struct stat status = {};
-  if (::stat(path.c_str(), &status) != 0) {
+  if (!StatusOf(path, Links::kFollow, status)) {
     return FileKind::kNone;
   }
   return S_ISREG(status.st_mode)   ? FileKind::kFile
@@ -21,21 +22,26 @@ FileKind KindOf(const std::string& path) {
 
 bool IsSymbolicLink(const std::string& path) {
   struct stat status = {};
-  return ::lstat(path.c_str(), &status) == 0 && S_ISLNK(status.st_mode);
+  return StatusOf(path, Links::kTell, status) && S_ISLNK(status.st_mode);
 }
 
 bool IsSameFile(const std::string& first, const std::string& second) {
   struct stat a = {};
   struct stat b = {};
-  return ::stat(first.c_str(), &a) == 0 && ::stat(second.c_str(), &b) == 0 &&
+  return StatusOf(first, Links::kFollow, a) && StatusOf(second, Links::kFollow, b) &&
          a.st_dev == b.st_dev && a.st_ino == b.st_ino;
 }
 
-bool CreateFolder(const std::string& path) { return ::mkdir(path.c_str(), 0777) == 0; }
+bool CreateFolder(const std::string& path) {
+  return RetryOnInterrupt([&] { return ::mkdir(path.c_str(), 0777); }) == 0;
+}
 
 // Renames only to a name that nothing has.
 static bool RenameToNew(const std::string& source, const std::string& target) {
-  if (::renameat2(AT_FDCWD, source.c_str(), AT_FDCWD, target.c_str(), RENAME_NOREPLACE) == 0) {
+  const int result = RetryOnInterrupt([&] {
+    return ::renameat2(AT_FDCWD, source.c_str(), AT_FDCWD, target.c_str(), RENAME_NOREPLACE);
+  });
+  if (result == 0) {
     return true;
   }
   if (errno != EINVAL && errno != ENOSYS) {
@@ -44,13 +50,12 @@ static bool RenameToNew(const std::string& source, const std::string& target) {
   // A file system without that flag: what comes into being between the look and the renaming can
   // be lost if it is an empty folder or a file.
   struct stat status = {};
-  return ::lstat(target.c_str(), &status) != 0 && errno == ENOENT &&
-         ::rename(source.c_str(), target.c_str()) == 0;
+  return !StatusOf(target, Links::kTell, status) && errno == ENOENT && RenameOver(source, target);
 }
 
 bool MoveFolder(const std::string& source, const std::string& target) {
   struct stat status = {};
-  return ::lstat(source.c_str(), &status) == 0 && S_ISDIR(status.st_mode) &&
+  return StatusOf(source, Links::kTell, status) && S_ISDIR(status.st_mode) &&
          RenameToNew(source, target);
 }
 
@@ -69,7 +74,8 @@ static bool CopyContents(const Descriptor& source, const Descriptor& target,
     }
   }
   const timespec times[] = {status.st_atim, status.st_mtim};
-  return ::fchmod(target.Get(), status.st_mode & 0777) == 0 && ::futimens(target.Get(), times) == 0;
+  return RetryOnInterrupt([&] { return ::fchmod(target.Get(), status.st_mode & 0777); }) == 0 &&
+         RetryOnInterrupt([&] { return ::futimens(target.Get(), times); }) == 0;
 }
 
 bool CopyToNewFile(const std::string& source, const std::string& target) {
@@ -77,12 +83,12 @@ bool CopyToNewFile(const std::string& source, const std::string& target) {
   const Descriptor from(
       RetryOnInterrupt([&] { return ::open(source.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC); }));
   struct stat status = {};
-  if (!from.IsOpen() || ::fstat(from.Get(), &status) != 0 || !S_ISREG(status.st_mode)) {
+  if (!from.IsOpen() || !StatusOf(from, status) || !S_ISREG(status.st_mode)) {
     return false;
   }
   const std::string folder = target.substr(0, target.rfind('/') + 1);
   const std::string growing = folder + ".copy-" + std::to_string(::getpid()) + ".tmp";
-  ::unlink(growing.c_str());  // of a killed process that had the same ID
+  RemoveFile(growing);  // of a killed process that had the same ID
   const Descriptor to(RetryOnInterrupt(
       [&] { return ::open(growing.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600); }));
   if (!to.IsOpen()) {
@@ -91,6 +97,6 @@ bool CopyToNewFile(const std::string& source, const std::string& target) {
   if (CopyContents(from, to, status) && RenameToNew(growing, target)) {
     return true;
   }
-  ::unlink(growing.c_str());
+  RemoveFile(growing);
   return false;
 }

@@ -8,6 +8,8 @@
 #include <ctime>
 #include <memory>
 
+#include "platform/posix/file_calls.h"
+
 static uint32_t AttributesFromMode(mode_t mode) {
   constexpr uint32_t readOnly = 0x1;
   constexpr uint32_t plain = 0x80;
@@ -18,16 +20,27 @@ static uint32_t AttributesFromMode(mode_t mode) {
   return (mode & anyWrite) == 0 ? readOnly : plain;
 }
 
+// Null behind the last one, and without a folder.
+static const dirent* NextEntry(DIR* folder) {
+  return folder == nullptr ? nullptr : RetryOnInterrupt([folder] {
+    errno = 0;  // the end is told by a null and no error
+    return ::readdir(folder);
+  });
+}
+
 std::vector<FolderEntry> ListFolder(const std::string& path) {
   struct Closer {
     void operator()(DIR* folder) const { ::closedir(folder); }
   };
-  const std::unique_ptr<DIR, Closer> folder(::opendir(path.c_str()));
+  const std::unique_ptr<DIR, Closer> folder(
+      RetryOnInterrupt([&] { return ::opendir(path.c_str()); }));
   std::vector<FolderEntry> entries;
-  while (const dirent* entry = folder ? ::readdir(folder.get()) : nullptr) {
+  while (const dirent* entry = NextEntry(folder.get())) {
     struct stat status = {};
-    if (::fstatat(::dirfd(folder.get()), entry->d_name, &status, AT_SYMLINK_NOFOLLOW) == 0 &&
-        (S_ISREG(status.st_mode) || S_ISDIR(status.st_mode))) {
+    const int result = RetryOnInterrupt([&] {
+      return ::fstatat(::dirfd(folder.get()), entry->d_name, &status, AT_SYMLINK_NOFOLLOW);
+    });
+    if (result == 0 && (S_ISREG(status.st_mode) || S_ISDIR(status.st_mode))) {
       entries.push_back({entry->d_name, AttributesFromMode(status.st_mode)});
     }
   }
@@ -38,14 +51,14 @@ std::vector<FolderEntry> ListFolder(const std::string& path) {
 
 std::optional<uint32_t> FileAttributes(const std::string& path) {
   struct stat status = {};
-  return ::lstat(path.c_str(), &status) == 0 ? std::optional(AttributesFromMode(status.st_mode))
-                                             : std::nullopt;
+  return StatusOf(path, Links::kTell, status) ? std::optional(AttributesFromMode(status.st_mode))
+                                              : std::nullopt;
 }
 
 std::optional<CalendarTime> LastWriteTime(const std::string& path) {
   struct stat status = {};
   tm local = {};
-  if (::lstat(path.c_str(), &status) != 0 ||
+  if (!StatusOf(path, Links::kTell, status) ||
       ::localtime_r(&status.st_mtim.tv_sec, &local) == nullptr) {
     return std::nullopt;
   }

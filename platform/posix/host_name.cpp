@@ -7,5 +7,5 @@
 std::string HostName() {
   utsname system = {};
   ::uname(&system);
-  return std::string(system.nodename, std::strcspn(system.nodename, "."));
+  return {system.nodename, std::strcspn(system.nodename, ".")};
 }

@@ -4,9 +4,9 @@
 #include <sys/file.h>
 #include <unistd.h>
 
-#include <cstdio>
 #include <utility>
 
+#include "platform/posix/file_calls.h"
 #include "platform/posix/text_file.h"
 
 ProfileStore& ProfileStore::GetInstance() {
@@ -18,9 +18,9 @@ static std::string FolderOf(const std::string& path) { return path.substr(0, pat
 
 bool ProfileStore::IsCurrent(const std::string& path) const {
   struct stat now = {};
-  return Text && path == Path && ::stat(path.c_str(), &now) == 0 && now.st_dev == Status.st_dev &&
-         now.st_ino == Status.st_ino && now.st_size == Status.st_size &&
-         now.st_ctim.tv_sec == Status.st_ctim.tv_sec &&
+  return Text && path == Path && StatusOf(path, Links::kFollow, now) &&
+         now.st_dev == Status.st_dev && now.st_ino == Status.st_ino &&
+         now.st_size == Status.st_size && now.st_ctim.tv_sec == Status.st_ctim.tv_sec &&
          now.st_ctim.tv_nsec == Status.st_ctim.tv_nsec;
 }
 
@@ -52,7 +52,7 @@ ProfileText* ProfileStore::Load(const std::string& path) {
 
 void ProfileStore::Keep(Descriptor file) {
   File = std::move(file);
-  if (::fstat(File.Get(), &Status) != 0) {
+  if (!StatusOf(File, Status)) {
     Status = {};
   }
 }
@@ -64,8 +64,8 @@ void ProfileStore::Lock(const std::string& path) {
   const std::string folder = FolderOf(path);
   Folder.Reset(
       RetryOnInterrupt([&] { return ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC); }));
-  if (Folder.IsOpen()) {
-    RetryOnInterrupt([&] { return ::flock(Folder.Get(), LOCK_EX); });
+  if (Folder.IsOpen() && RetryOnInterrupt([&] { return ::flock(Folder.Get(), LOCK_EX); }) != 0) {
+    Folder.Reset(-1);
   }
 }
 
@@ -82,26 +82,37 @@ bool ProfileStore::Unlock() {
   return isStored;
 }
 
-// Writes the text beside the file and renames it over. The name beside it is free: only the holder
-// of the lock writes one, and what stands there is of a run that was killed.
-bool ProfileStore::Store() {
-  const std::string growing = FolderOf(Path) + ".History.tmp";
-  ::unlink(growing.c_str());
-  Descriptor file(RetryOnInterrupt([&] {
-    return ::open(growing.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0666);
+// Anew, after removing a file of that name.
+static Descriptor OpenAnew(const std::string& path) {
+  RemoveFile(path);
+  return Descriptor(RetryOnInterrupt([&] {
+    return ::open(path.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0666);
   }));
+}
+
+// Writes the text beside the file and renames it over.
+bool ProfileStore::Store() {
+  // Only the holder of the lock writes here, and what stands here is of a run that was killed.
+  std::string growing = FolderOf(Path) + ".History.tmp";
+  Descriptor file = Folder.IsOpen() ? OpenAnew(growing) : Descriptor();
+  if (!file.IsOpen()) {
+    // There is no lock to be had, or a folder of that name: an event can be called anything.
+    growing = FolderOf(Path) + ".History-" + std::to_string(::getpid()) + ".tmp";
+    file = OpenAnew(growing);
+  }
   if (!file.IsOpen()) {
     return false;
   }
   const bool isReplacement = Status.st_mode != 0;
   if (isReplacement) {
     // The owner first, as a change of it can clear bits of the mode; not everyone may give away.
-    static_cast<void>(::fchown(file.Get(), Status.st_uid, Status.st_gid) == 0);
-    static_cast<void>(::fchmod(file.Get(), Status.st_mode & 07777) == 0);
+    RetryOnInterrupt([&] { return ::fchown(file.Get(), Status.st_uid, Status.st_gid); });
+    RetryOnInterrupt([&] { return ::fchmod(file.Get(), Status.st_mode & 07777); });
   }
-  if (!WriteAll(file, Text->Get()) || ::fdatasync(file.Get()) != 0 ||
-      ::rename(growing.c_str(), Path.c_str()) != 0) {
-    ::unlink(growing.c_str());
+  if (!WriteAll(file, Text->Get()) ||
+      RetryOnInterrupt([&] { return ::fdatasync(file.Get()); }) != 0 ||
+      !RenameOver(growing, Path)) {
+    RemoveFile(growing);
     return false;
   }
   Keep(std::move(file));

@@ -22,7 +22,9 @@ class ProfileStore {
   // Good until the next call.
   ProfileText* Load(const std::string& path);
 
-  // Takes the lock, waiting for whoever has it. Calls nest; the first one's path counts.
+  // Takes the lock, waiting for whoever has it. Calls nest; the first one's path counts. On a file
+  // system without locks runs go on without: one may undo the change of another, but each leaves
+  // a whole file.
   void Lock(const std::string& path);
 
   // The text that Load gave was changed, under the lock, and is to be written.

@@ -4,28 +4,25 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "platform/posix/file_calls.h"
+
 std::optional<std::string> ReadAll(const Descriptor& file) {
   struct stat status = {};
-  const bool isSizeKnown = ::fstat(file.Get(), &status) == 0 && status.st_size > 0;
-  constexpr size_t step = 65536;
-  // Room behind the end, so that the read that finds the end needs no growth, nor does a little
-  // text that the caller appends.
-  std::string text((isSizeKnown ? static_cast<size_t>(status.st_size) : 0) + step, '\0');
-  size_t length = 0;
+  const bool isSizeKnown = StatusOf(file, status) && status.st_size > 0;
+  // Room behind the end, so that a little text that the caller adds needs no growth.
+  constexpr size_t room = 4096;
+  std::string text;
+  text.reserve((isSizeKnown ? static_cast<size_t>(status.st_size) : 0) + room);
+  char piece[65536];
   for (;;) {
-    if (length == text.size()) {
-      text.resize(length + step);
-    }
-    const ssize_t count = RetryOnInterrupt(
-        [&] { return ::read(file.Get(), text.data() + length, text.size() - length); });
+    const ssize_t count = RetryOnInterrupt([&] { return ::read(file.Get(), piece, sizeof piece); });
     if (count < 0) {
       return std::nullopt;
     }
     if (count == 0) {
-      text.resize(length);
       return text;
     }
-    length += static_cast<size_t>(count);
+    text.append(piece, static_cast<size_t>(count));
   }
 }
 

@@ -1,0 +1,20 @@
+#!/bin/sh
+# Measures whole runs of the program beside what one would otherwise use; see docs/performance.md.
+# usage: bench.sh [--short] [WORK...]
+set -eu
+cd "$(dirname "$0")/.."
+
+scripts/install-packages.sh g++ cmake ninja-build pkg-config zlib1g-dev libminizip-dev \
+  libsystemd-dev libbenchmark-dev libglib2.0-dev crudini git zip minizip libnss-wrapper procps python3
+cmake --preset bench > /dev/null
+cmake --build --preset bench > /dev/null
+# Copies, as an installed program is one: what the linker has just written lies in memory in smaller
+# pieces, and its pages cost more to map.
+programs=build/bench/programs
+rm -rf "$programs"
+mkdir "$programs"
+for name in ORXInstallEventLog bench/set_key bench/set_key_glib bench/registry_questions \
+  bench/empty bench/empty_iostream; do
+  cp "build/bench/$name" "$programs"
+done
+exec python3 scripts/bench.py "$@"

@@ -1,0 +1,397 @@
+"""Breaks the program off at every writing system call, and makes every call on its files fail.
+
+Each kind of run is traced once. Then it is run again for each of its calls, from the same history,
+and that call either kills it or returns an error. A limit on the size of files does the same in
+the middle of a write. After each such run the history must be one of those that the interface
+allows, nothing of other events may have changed, and the next runs must work.
+"""
+
+import collections
+import itertools
+import os
+import queue
+import random
+import re
+import resource
+import shutil
+import signal
+import threading
+
+import common
+from common import Fault, check
+
+# By their names on all processors. A call that only reads is of interest where it fails.
+WRITING = {"open", "openat", "creat", "write", "writev", "pwrite64", "pwritev", "rename",
+           "renameat", "renameat2", "mkdir", "mkdirat", "rmdir", "unlink", "unlinkat", "link",
+           "linkat", "symlink", "symlinkat", "fsync", "fdatasync", "fchmod", "chmod", "fchmodat",
+           "fchown", "chown", "fchownat", "truncate", "ftruncate", "fallocate", "sendfile",
+           "copy_file_range", "utimensat", "flock", "exit_group"}
+READING = {"open", "openat", "read", "pread64", "lseek", "stat", "lstat", "fstat", "newfstatat",
+           "statx", "access", "faccessat", "faccessat2", "getdents64"}
+OPENING = {"open", "openat"}
+
+# What an interrupted call on these loses is not held against the program: the first two are opened
+# and written by libraries that do not repeat a call; without the third a list is shorter.
+NOT_REPEATED = ("/Summary.txt", "/history.zip")
+
+Call = collections.namedtuple("Call", "name number text")  # the number counts calls of that name
+Point = collections.namedtuple("Point", "scenario call fault")  # or a size instead of a call
+
+
+class Scenario:
+    """One kind of run: from which history, and which changes of the history file it makes, each
+    of them whole or not at all. A change is a list of parts that belong together as long as
+    nothing fails."""
+
+    def __init__(self, name, base, words, event, changes):
+        self.name, self.base, self.words = name, base, words
+        self.event, self.changes = event, changes
+        self.calls = []
+        self.reference = None
+
+    def killed_states(self, old):
+        """After a run that was killed: the first changes are made, whole."""
+        return [apply(old, sum(self.changes[:count], []))
+                for count in range(len(self.changes) + 1)]
+
+    def failed_states(self, old):
+        """After a run that met an error: any part may be missing."""
+        parts = sum(self.changes, [])
+        return [apply(old, way) for count in range(len(parts) + 1)
+                for way in itertools.combinations(parts, count)]
+
+
+def apply(sections, changes):
+    result = {name: dict(keys) for name, keys in sections.items()}
+    for change in changes:
+        change(result)
+    return result
+
+
+def reset_count(sections):
+    sections.setdefault("History", {"Count": "0"})
+
+
+class Bench:
+    """A machine with the histories from which the runs start."""
+
+    def __init__(self, program):
+        self.machine = common.Machine(program)
+        self.files = self.machine.scratch / "files"
+        self.archive = self.machine.scratch / "history.zip"
+        self.trace = self.machine.scratch / "trace"
+        self.files.mkdir()
+        for kind in ("log", "trc", "rsp"):
+            (self.files / f"setup.{kind}").write_text(f"{kind} line\n" * 500)
+        self.make_histories()
+        self.scenarios = self.make_scenarios()
+
+    def make_histories(self):
+        machine = self.machine
+        (machine.root / "ZEK").mkdir()
+        shutil.copy(common.REPOSITORY / "scripts/sample-machine/Registry.reg",
+                    machine.root / "ZEK")
+        machine.save("empty")
+        own = [word for option, kind in (("-l", "log"), ("-t", "trc"), ("-u", "rsp"))
+               for word in (option, str(self.files / f"setup.{kind}"))]
+        machine.must("-start", "done1", "-Product", "P1", *own)
+        machine.must("-end", "done1", "-CopyName", "C1", "-Result", "good")
+        machine.must("-start", "done2", "-Product", "P2", *own[:2])
+        machine.must("-end", "done2", "-Result", "bad")
+        machine.must("-start", "open", "-Product", "P3", *own)
+        machine.must("-logmessage", "open", "-message", "first")
+        machine.save("full")
+
+    def make_scenarios(self):
+        def start(identity):
+            keys = dict.fromkeys(("End_Time", "Action", "Type", "Version", "Service_Level", "Path",
+                                  "Log_File_Name", "Trace_File", "Response_File"), "")
+            keys.update(Start_Time="TIME", Product="P4", Command_Line="run",
+                        Copy_Name="(Unknown)", Complete_Flag="FALSE")
+            return [[lambda s: self.count(s, identity)],
+                    [lambda s: s.setdefault(identity, {}).update(keys)]]
+        words = ("-Product", "P4", "-Command", "run")
+        target = self.machine.history / "C2/open/ORXInstallEvent.Log"
+        return [
+            Scenario("first start", "empty", ("-start", "new", *words), "new",
+                     [[reset_count], *start("new")]),
+            Scenario("start", "full", ("-start", "new", *words), "new", start("new")),
+            Scenario("restart", "full", ("-start", "open", *words), "open", start("open")),
+            Scenario("logmessage", "full", ("-logmessage", "open", "-message", "second"), "open",
+                     []),
+            Scenario("end", "full", ("-end", "open", "-CopyName", "C2", "-Result", "fine"), "open",
+                     [[lambda s: s["open"].update(End_Time="TIME", Copy_Name="C2", Result="fine",
+                                                  Complete_Flag="TRUE")],
+                      [lambda s: s["open"].update(Event_Log_File=str(target))]]),
+            Scenario("report", "full", ("-report", str(self.archive)), None,
+                     [[lambda s, key=key: self.collect(s["done1"], key, "C1/done1")
+                       for key in ("Log_File_Name", "Trace_File", "Response_File")],
+                      [lambda s: self.collect(s["done2"], "Log_File_Name", "done2")]]),
+        ]
+
+    def count(self, sections, identity):
+        history = sections.setdefault("History", {"Count": "0"})
+        history["Count"] = str(int(history["Count"]) + 1)
+        log = self.machine.history / identity / "ORXInstallEvent.Log"
+        values = dict.fromkeys(common.EVENT_KEYS, "")
+        values.update(Event_ID=identity, Copy_Name="(Unknown)", Complete_Flag="FALSE",
+                      Log_File_Name="(none)", Trace_File="(none)", Response_File="(none)",
+                      Event_Log_File=str(log))
+        sections[identity] = values
+
+    def collect(self, section, key, folder):
+        name = section[key].rpartition("/")[2]
+        section[key] = str(self.machine.history / folder / name)
+
+    def state(self):
+        if not self.machine.ini.exists():
+            return {}
+        return common.without_times(self.machine.sections())
+
+    def begin(self, scenario):
+        self.machine.restore(scenario.base)
+        self.archive.unlink(missing_ok=True)
+
+    def traced(self, scenario, *options):
+        return self.machine.run(*scenario.words, before=("strace", "-f", "-y", "-s", "0", "-o",
+                                                         str(self.trace), *options))
+
+    def trace_calls(self, scenario):
+        """Notes the calls of an undisturbed run from its first access to the history on."""
+        self.begin(scenario)
+        check(self.traced(scenario)[0] == 0, "the undisturbed run failed")
+        scenario.reference = self.picture()
+        numbers = collections.Counter()
+        has_begun = False
+        for line in self.trace.read_text(errors="replace").splitlines():
+            match = re.match(r"\d+\s+(\w+)\(", line)
+            if not match or match[1] == "execve":
+                continue
+            numbers[match[1]] += 1
+            has_begun = has_begun or str(self.machine.root) in line
+            if has_begun:
+                scenario.calls.append(Call(match[1], numbers[match[1]], line))
+
+    def points(self, scenario):
+        for call in scenario.calls:
+            creates = "O_CREAT" in call.text or "O_TRUNC" in call.text
+            writes = call.name in WRITING and (call.name not in OPENING or creates)
+            is_ours = str(self.machine.scratch) in call.text
+            if writes:
+                yield Point(scenario, call, "kill")
+            if is_ours and call.name != "exit_group" and (writes or call.name in READING):
+                for error in ("EIO", "EINTR", *(["ENOSPC"] if writes else [])):
+                    yield Point(scenario, call, error)
+        history = len((self.machine.scratch / scenario.base / "ZEK/ORXHistory/History.ini")
+                      .read_bytes()) if scenario.base == "full" else 0
+        for size in sorted({0, 1, 17, *range(100, history + 1500, 150)}):
+            yield Point(scenario, size, "kill")
+            yield Point(scenario, size, "EFBIG")
+
+    def disturb(self, point):
+        """Runs the scenario with the point's fault; gives the result, or None if killed."""
+        if isinstance(point.call, int):
+            return self.limit_size(point)
+        name, number, _ = point.call
+        fault = "signal=SIGKILL" if point.fault == "kill" else f"error={point.fault}"
+        result, output = self.traced(point.scenario, "--seccomp-bpf", "-e", f"trace={name}", "-e",
+                                     f"inject={name}:{fault}:when={number}")
+        return (None if result == -signal.SIGKILL else result), output
+
+    def limit_size(self, point):
+        """No file grows beyond the size: the write up to it is done, the next one fails or
+        kills."""
+        def set_limit():
+            resource.setrlimit(resource.RLIMIT_CORE, (0, 0))
+            resource.setrlimit(resource.RLIMIT_FSIZE, (point.call, point.call))
+            kills = point.fault == "kill"
+            signal.signal(signal.SIGXFSZ, signal.SIG_DFL if kills else signal.SIG_IGN)
+        # The handling of this signal that Python sets is not the one that a program gets.
+        result, output = self.machine.run(*point.scenario.words, preexec_fn=set_limit,
+                                          restore_signals=False)
+        return (None if result == -signal.SIGXFSZ else result), output
+
+    def check_point(self, point):
+        scenario = point.scenario
+        self.begin(scenario)
+        old = self.state()
+        result, output = self.disturb(point)
+        self.check_result(point, result, output)
+        new = self.state()
+        allowed = scenario.killed_states if point.fault == "kill" else scenario.failed_states
+        check(new in allowed(old), f"history {difference(old, new)}")
+        self.check_others(scenario)
+        self.check_own_log(scenario)
+        if point.fault == "EINTR" and not any(name in point.call.text for name in NOT_REPEATED):
+            check(self.picture() == scenario.reference,
+                  f"lost: {difference(scenario.reference, self.picture())}")
+        self.check_next_runs(scenario, new)
+
+    def check_result(self, point, result, output):
+        if result is None:
+            check(point.fault == "kill", "died")
+        elif point.scenario.name == "report":
+            check(result in (0, 3), f"result {result}")
+            check((b"is created successfully" in output) == (result == 0), f"said {output}")
+            check(result == 3 or self.archive.exists(), "no archive")
+        else:
+            is_set_up = b"Initialiation Failed:" not in output
+            check(result == (0 if is_set_up else 1), f"result {result}, said {output}")
+            check(is_set_up or point.scenario.base == "empty", "set-up failed")
+
+    def check_others(self, scenario):
+        """All that is not of the run's event, or a report's to write, is as it was."""
+        base = self.machine.scratch / scenario.base
+        for file in base.rglob("*"):
+            name = file.relative_to(base)
+            if file.is_dir() or name.name == "History.ini" or scenario.event in name.parts:
+                continue
+            check((self.machine.root / name).is_file(), f"lost: {name}")
+            check((self.machine.root / name).read_bytes() == file.read_bytes(), f"changed: {name}")
+        for file in self.machine.history.rglob("setup.*"):
+            check(file.read_bytes() == (self.files / file.name).read_bytes(), f"part of {file}")
+
+    def check_own_log(self, scenario):
+        if scenario.name not in ("logmessage", "end"):
+            return
+        places = [folder / "open/ORXInstallEvent.Log"
+                  for folder in (self.machine.history, self.machine.history / "C2")]
+        logs = [place.read_bytes() for place in places if place.exists()]
+        check(len(logs) == 1, f"{len(logs)} logs")
+        before = (self.machine.scratch / "full/ZEK/ORXHistory/open/ORXInstallEvent.Log")
+        check(logs[0].startswith(before.read_bytes()), "log lost its beginning")
+
+    def check_next_runs(self, scenario, old):
+        self.machine.must(*scenario.words)
+        new = self.state()
+        if scenario.name == "report":
+            # What was copied before the keys could be written is not copied again.
+            allowed = scenario.failed_states(old)
+        elif scenario.name == "end":
+            # What was moved before the key could be written is not moved again.
+            allowed = scenario.killed_states(old)[1:]
+        else:
+            allowed = scenario.killed_states(old)[-1:]
+        check(new in allowed, f"next run {difference(old, new)}")
+        if "start" in scenario.name:
+            log = self.machine.history / scenario.event / "ORXInstallEvent.Log"
+            check(log.read_bytes().endswith(b" Starts  \n" + 94 * b"*" + b"\n"), "next log broken")
+        check(not (self.machine.history / ".History.tmp").exists() or not scenario.changes
+              or scenario.name == "report", "litter")
+        self.machine.must("-report", str(self.archive))
+        entries = common.check_archive(self.archive)
+        found = {str(path.relative_to(self.machine.history)): path
+                 for path in self.machine.history.rglob("[!.]*")}
+        check(set(entries) == set(found), f"archive holds {set(entries) ^ set(found)}")
+        for name, path in found.items():
+            check(path.is_dir() or entries[name] == path.read_bytes(), f"entry {name}")
+
+    def picture(self):
+        """The whole history and the archive, without what differs from run to run."""
+        names = {}
+        for path in sorted(self.machine.history.rglob("*")):
+            names[str(path.relative_to(self.machine.history))] = (
+                settled(path.read_bytes()) if path.is_file() else b"")
+        if self.archive.exists():
+            entries = common.check_archive(self.archive)
+            names.update((f"archive {name}", settled(data)) for name, data in entries.items())
+        return names
+
+
+def settled(text):
+    """The text without time stamps and the list of processes."""
+    text = re.sub(rb"\d{8} \d\d:\d\d:\d\d", b"TIME", text)
+    return re.sub(rb"\n3\) Current.*?\n4\) ", b"\n", text, flags=re.DOTALL)
+
+
+def difference(old, new):
+    """The names that differ, each with the first lines that do."""
+    def lines(value):
+        text = value.decode(errors="replace") if isinstance(value, bytes) else str(value)
+        return text.splitlines() or [""]
+    parts = []
+    for name in sorted({*old, *new}):
+        if old.get(name) != new.get(name):
+            pairs = itertools.zip_longest(lines(old.get(name)), lines(new.get(name)))
+            pair = next((pair for pair in pairs if pair[0] != pair[1]), ("", ""))
+            parts.append(f"{name}: {pair[0]!s:.300} | {pair[1]!s:.300}")
+    return "; ".join(parts)
+
+
+def in_order(points, is_sample):
+    """All points; for a sample the rarer ones first: one for each fault of each call of each kind
+    of run, then the others in no order."""
+    if not is_sample:
+        return points
+    random.Random(1).shuffle(points)
+    seen = collections.Counter()
+    ranked = []
+    for point in points:
+        name = point.call if isinstance(point.call, int) else point.call.name
+        kind = (point.scenario.name, "size" if isinstance(name, int) else name, point.fault)
+        seen[kind] += 1
+        ranked.append((min(seen[kind], 2), len(ranked), point))
+    return [point for _, _, point in sorted(ranked, key=lambda item: item[:2])]
+
+
+def work(bench, points, outcome, done, limit):
+    scenarios = {scenario.name: scenario for scenario in bench.scenarios}
+    while not limit or outcome.seconds() < limit:
+        try:
+            point = points.get_nowait()
+        except queue.Empty:
+            return
+        # The texts of the calls and the histories are those of the other bench, by name the same.
+        own = Point(scenarios[point.scenario.name], point.call, point.fault)
+        where = "size" if isinstance(point.call, int) else point.call.name
+        number = point.call if isinstance(point.call, int) else point.call.number
+        outcome.attempt(f"{point.scenario.name}, {where} {number}, {point.fault}",
+                        lambda own=own: bench.check_point(own))
+        done[(point.scenario.name, where, point.fault)] += 1
+
+
+def print_table(done, total):
+    faults = ("kill", "ENOSPC", "EIO", "EINTR", "EFBIG")
+    print(f"{'run':12}{'call':14}" + "".join(f"{fault:>8}" for fault in faults))
+    for run, call in sorted({key[:2] for key in total}):
+        cells = (f"{done[run, call, fault]}/{total[run, call, fault]}"
+                 if total[run, call, fault] else "" for fault in faults)
+        print(f"{run:12}{call:14}" + "".join(f"{cell:>8}" for cell in cells))
+
+
+def main():
+    parser = common.arguments(__doc__, "take a sample of about that many seconds")
+    options = parser.parse_args()
+    outcome = common.Outcome()
+    benches = [Bench(options.program) for _ in range(os.cpu_count() or 1)]
+    try:
+        for bench in benches:
+            for scenario in bench.scenarios:
+                bench.trace_calls(scenario)
+        bench = benches[0]
+        points = [point for scenario in bench.scenarios for point in bench.points(scenario)]
+        name = lambda p: "size" if isinstance(p.call, int) else p.call.name
+        total = collections.Counter((p.scenario.name, name(p), p.fault) for p in points)
+        done = collections.Counter()
+        waiting = queue.Queue()
+        for point in in_order(points, options.seconds > 0):
+            waiting.put(point)
+        workers = [threading.Thread(target=work, args=(bench, waiting, outcome, done,
+                                                       options.seconds)) for bench in benches]
+        for worker in workers:
+            worker.start()
+        for worker in workers:
+            worker.join()
+        print_table(done, total)
+    except Fault as fault:
+        outcome.faults.append(("set-up", fault))
+        print(f"FAULT {fault}")
+    finally:
+        for bench in benches:
+            bench.machine.remove()
+    print(f"{outcome.seconds():.0f} s")
+    outcome.end()
+
+
+if __name__ == "__main__":
+    main()
