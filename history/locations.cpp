@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <string_view>
 
-#include "platform/ascii_case.h"
 #include "platform/files.h"
 #include "platform/known_folders.h"
 #include "platform/path.h"
@@ -30,12 +29,6 @@ static bool LeadsUp(std::string_view part) {
          part.find_first_not_of(". ") == std::string_view::npos;
 }
 
-// The history file grows under that name before it replaces the old one; a folder in its place
-// would keep every later change from the file.
-static bool IsHistoryFileGrowing(std::string_view part) {
-  return EqualsIgnoringCase(part.substr(0, part.find_last_not_of(". ") + 1), ".History.tmp");
-}
-
 bool LeadsOutOfHistory(const std::string& name) {
   if (IsRootedPath(name)) {
     return true;
@@ -44,7 +37,7 @@ bool LeadsOutOfHistory(const std::string& name) {
   for (size_t begin = 0; begin <= name.size();) {
     const size_t end = std::min(name.find_first_of(kPathSeparators, begin), name.size());
     const std::string_view part = std::string_view(name).substr(begin, end - begin);
-    if (LeadsUp(part) || IsHistoryFileGrowing(part)) {
+    if (LeadsUp(part)) {
       return true;
     }
     if (exists) {

@@ -18,9 +18,8 @@ std::string GetHistoryFilePath();
 std::string JoinPath(const std::string& folder, const std::string& name);
 
 // True if a name, put below the history folder, would lead out of it: a rooted path, one with a
-// part "..", or one with a part that is a symbolic link there; or into the history file's place, by
-// a part ".History.tmp". Such a name is treated as a folder that cannot be made and a file that
-// cannot be opened.
+// part "..", or one with a part that is a symbolic link there. Such a name is treated as a folder
+// that cannot be made and a file that cannot be opened.
 bool LeadsOutOfHistory(const std::string& name);
 
 // Whether a regular file, or a folder, of that name exists. The path may stand in double quotation
