@@ -4,7 +4,7 @@
 set -eu
 cd "$(dirname "$0")/.."
 
-scripts/install-packages.sh dbus libnss-wrapper unzip zip python3
+scripts/install-packages.sh libnss-wrapper unzip zip python3
 scripts/build.sh debug
 ctest --preset debug
 scripts/build.sh release

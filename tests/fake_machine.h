@@ -29,24 +29,24 @@ struct FakeMachine {
 
   ServiceListing Services;
 
-  using Members = std::vector<std::string>;
+  // The groups are told to those who ask this machine by its name, if it has one.
+  using Groups = std::vector<std::pair<std::string, std::vector<std::string>>>;
   std::optional<std::string> DomainUser;
   std::optional<std::string> WorkstationUser;
-  std::vector<std::pair<std::string, Members>> LocalGroups;
-  std::vector<std::pair<std::string, Members>> GlobalGroups;
-  std::vector<std::string> ServersAsked;  // by the account calls, in their order
+  Groups LocalGroups;
+  Groups GlobalGroups;
 
-  // A key exists if it or a key below it is set. Order is that of the insertion.
-  void SetKey(const std::string& keyPath);
-  void SetText(const std::string& keyPath, const std::string& name, const std::string& text);
-  void SetNumber(const std::string& keyPath, const std::string& name, uint32_t number);
-  void SetData(const std::string& keyPath, const std::string& name, RegistryData data);
-
-  struct Key {
-    std::string Path;
-    std::vector<std::pair<std::string, RegistryData>> Values;
+  // The registry in its order. A key exists if it or a key below it is named here.
+  struct RegistryEntry {
+    std::string KeyPath;
+    std::string ValueName;  // empty: the key alone
+    RegistryData Data;
   };
-  std::vector<Key> Registry;
+  std::vector<RegistryEntry> Registry;
+  void SetText(const std::string& keyPath, const std::string& name, const std::string& text);
+
+  // Adds what a text says, line by line: [key] and below it name=text or name=dword:fffffffe.
+  void Load(const std::string& text);
 };
 
 // The one machine; assign FakeMachine() to begin anew.
