@@ -92,7 +92,7 @@ void ReadKeyOfFile(benchmark::State& state) {
   const std::string file = folder.Make("History.ini", HistoryText(state.range(0)));
   const std::string name = EventName(state.range(0) / 2);
   for (auto _ : state) {
-    benchmark::DoNotOptimize(ReadProfileString(file, name, "Result", "", 256));
+    benchmark::DoNotOptimize(ReadProfileValue(file, name, "Result", "", 256));
   }
 }
 

@@ -2,5 +2,5 @@
 #include "platform/profile_file.h"
 
 int main(int argc, char** argv) {
-  return argc == 5 && WriteProfileString(argv[1], argv[2], argv[3], argv[4]) ? 0 : 1;
+  return argc == 5 && WriteProfileValue(argv[1], argv[2], argv[3], argv[4]) ? 0 : 1;
 }

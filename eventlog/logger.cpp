@@ -10,6 +10,7 @@ CLogger& CLogger::GetInstance() {
 void CLogger::Open(const std::string& fileName, std::ios_base::openmode mode) {
   Close();
   do {
+    errno = 0;  // a failure need not set it
     open(fileName, mode | std::ios::out);
   } while (!is_open() && errno == EINTR);
 }

@@ -1,51 +1,73 @@
 #include <cstdint>
-#include <cstdlib>
+#include <iterator>
 #include <string>
 #include <string_view>
 #include <vector>
 
+#include "fuzz/profile_model.h"
+#include "fuzz/require.h"
 #include "platform/posix/profile_text.h"
 
-// Any bytes as a profile file, into which keys are then written: what was written reads back, what
-// else the file holds stays, and the places kept through the changes are those of a fresh reading.
+// The first line of the input is a program, the rest is a profile file. Three characters of the
+// program are a change: a section, a key and a value, by their numbers in the tables below, to
+// which the names of the file's own sections are added. Before and after each change ProfileText is
+// what the model is, byte for byte, and reads as the model reads.
 
 namespace {
 
-void Require(bool condition) {
-  if (!condition) {
-    std::abort();
-  }
+struct Change {
+  std::string Section;
+  std::string Key;
+  std::string Value;
+};
+
+size_t NumberOf(char character, size_t count) {
+  return static_cast<uint8_t>(character - '0') % count;
 }
 
-void WriteAndCheck(ProfileText& text, std::string_view section, std::string_view key,
-                   std::string_view value) {
-  text.Set(section, key, value);
-  Require(text.Find(section, key) == TrimBlanks(value));
-  const ProfileText again(text.Get());
-  Require(again.SectionNames() == text.SectionNames());
-  Require(again.Find(section, key) == text.Find(section, key));
-  // A second time, nothing is there to be changed.
-  const std::string once = text.Get();
-  text.Set(section, key, value);
-  Require(text.Get() == once);
+std::vector<Change> ReadProgram(std::string_view program, const ProfileModel& file) {
+  constexpr const char* keys[] = {"Count", "RESULT", " count\t", "a[b]", "", "]"};
+  constexpr const char* values[] = {"1", "", " blanks around ", "\"quoted\"", "a=b", "[History]"};
+  constexpr size_t mostChanges = 8;
+  std::vector<std::string> sections = {"History", " 42", "history", "", "]", "[", "\xEF\xBB\xBF[x"};
+  for (const std::string_view name : file.SectionNames()) {
+    sections.emplace_back(name);
+  }
+  std::vector<Change> changes;
+  for (size_t i = 0; i + 2 < program.size() && changes.size() < mostChanges; i += 3) {
+    changes.push_back({sections[NumberOf(program[i], sections.size())],
+                       keys[NumberOf(program[i + 1], std::size(keys))],
+                       values[NumberOf(program[i + 2], std::size(values))]});
+  }
+  return changes;
+}
+
+void CompareAnswers(const ProfileText& text, const ProfileModel& model,
+                    const std::vector<Change>& changes) {
+  Require(text.SectionNames() == model.SectionNames());
+  for (const Change& change : changes) {
+    Require(text.Find(change.Section, change.Key) == model.Find(change.Section, change.Key));
+  }
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  ProfileText text(std::string(data, data + size));
-  const std::vector<std::string_view> found = text.SectionNames();
-  const std::vector<std::string> names(found.begin(), found.end());
-  for (const std::string& name : names) {
-    text.Find(name, "Count");
+  const std::string input(data, data + size);
+  const size_t programEnd = std::min(input.find('\n'), size);
+  const std::string file = input.substr(std::min(programEnd + 1, size));
+  ProfileModel model(file);
+  ProfileText text(file);
+  const std::vector<Change> changes = ReadProgram(input.substr(0, programEnd), model);
+  CompareAnswers(text, model, changes);
+  for (const Change& change : changes) {
+    text.Set(change.Section, change.Key, change.Value);
+    model.Set(change.Section, change.Key, change.Value);
+    Require(text.Get() == model.Text());
+    Require(text.Find(change.Section, change.Key) == ProfileModel::Trim(change.Value));
   }
-  WriteAndCheck(text, "History", "Count", "1");
-  WriteAndCheck(text, "42", "Result", " blanks around ");
-  WriteAndCheck(text, "History", "Count", "");
-  for (const std::string& name : names) {
-    if (name.find('\r') == std::string::npos) {  // no caller has a line break in a name
-      WriteAndCheck(text, name, "Count", "2");
-    }
-  }
+  CompareAnswers(text, model, changes);
+  // The places that were kept through the changes are those of a fresh reading.
+  CompareAnswers(ProfileText(text.Get()), model, changes);
   return 0;
 }

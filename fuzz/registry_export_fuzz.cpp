@@ -1,21 +1,15 @@
 #include <algorithm>
 #include <cstdint>
-#include <cstdlib>
 #include <string>
 #include <vector>
 
+#include "fuzz/require.h"
 #include "platform/posix/registry_export.h"
 
 // Any bytes as the registry export of the machine: every key and value is asked for, the limits of
 // the answers hold, and text reads alike in both encodings.
 
 namespace {
-
-void Require(bool condition) {
-  if (!condition) {
-    std::abort();
-  }
-}
 
 ByteReader ReaderOf(const std::string& bytes) {
   return [&bytes](uint64_t offset, char* buffer, size_t size) {

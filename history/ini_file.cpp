@@ -20,13 +20,13 @@ CIniFile::CIniFile(const std::string& path) : Path(path) {}
 
 std::string CIniFile::ReadString(const std::string& section, const std::string& key,
                                  const std::string& fallback, uint32_t size) const {
-  const std::string value = ReadProfileString(Path, OnOneLine(section), key, fallback, size);
+  const std::string value = ReadProfileValue(Path, OnOneLine(section), key, fallback, size);
   return value.substr(0, value.find('\0'));
 }
 
 int CIniFile::WriteString(const std::string& section, const std::string& key,
                           const std::string& value) {
-  WriteProfileString(Path, OnOneLine(section), key, OnOneLine(value));
+  WriteProfileValue(Path, OnOneLine(section), key, OnOneLine(value));
   return 0;
 }
 
@@ -36,7 +36,7 @@ int32_t CIniFile::ReadInt(const std::string& section, const std::string& key,
 }
 
 bool CIniFile::WriteInt(const std::string& section, const std::string& key, int32_t value) {
-  return WriteProfileString(Path, OnOneLine(section), key, std::to_string(value));
+  return WriteProfileValue(Path, OnOneLine(section), key, std::to_string(value));
 }
 
 std::vector<std::string> CIniFile::GetSectionNames() const {

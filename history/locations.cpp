@@ -33,11 +33,19 @@ bool LeadsOutOfHistory(const std::string& name) {
   if (IsRootedPath(name)) {
     return true;
   }
+  bool exists = true;  // what stands before the part; below what does not, nothing is a link
   for (size_t begin = 0; begin <= name.size();) {
     const size_t end = std::min(name.find_first_of(kPathSeparators, begin), name.size());
-    if (LeadsUp(std::string_view(name).substr(begin, end - begin)) ||
-        IsSymbolicLink(JoinPath(GetHistoryDir(), name.substr(0, end)))) {
+    const std::string_view part = std::string_view(name).substr(begin, end - begin);
+    if (LeadsUp(part)) {
       return true;
+    }
+    if (exists) {
+      const std::string place = JoinPath(GetHistoryDir(), name.substr(0, end));
+      if (IsSymbolicLink(place)) {
+        return true;
+      }
+      exists = KindOf(place) != FileKind::kNone;
     }
     begin = end + 1;
   }

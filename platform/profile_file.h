@@ -8,19 +8,21 @@
 //
 // Every operation is one complete access to the named file: what one process writes, the next read
 // of any process sees. No argument may hold a line break or a NUL.
-// Windows: the system's profile calls. POSIX: our own reader and writer, which parses a file once
-// for each change of it; a write replaces the whole file in one step.
+// A write replaces the whole file in one step, so that no reader meets half of it.
+// Windows: the system's profile calls, on a copy of the file while they write, as they write in
+// place; a program that keeps the file open and does not share its deletion makes a write fail.
+// POSIX: our own reader and writer, which parses a file once for each change of it.
 
 // The value of a key, at most size - 1 bytes of it, without the blanks around it and without one
 // pair of quotation marks, double or single, that encloses it. Without the file, the section or
 // the key: the fallback, cut in the same way. Windows: GetPrivateProfileStringA.
-std::string ReadProfileString(const std::string& path, const std::string& section,
-                              const std::string& key, const std::string& fallback, uint32_t size);
+std::string ReadProfileValue(const std::string& path, const std::string& section,
+                             const std::string& key, const std::string& fallback, uint32_t size);
 
 // Sets a key, making file, section and key where they are missing; never a folder. False if the
 // file cannot be read or written, and then it is as it was. Windows: WritePrivateProfileStringA.
-bool WriteProfileString(const std::string& path, const std::string& section, const std::string& key,
-                        const std::string& value);
+bool WriteProfileValue(const std::string& path, const std::string& section, const std::string& key,
+                       const std::string& value);
 
 // The decimal digits, with a minus sign or none, at the start of a key's value; 0 for other text.
 // Without the file, the section or the key: the fallback. Windows: GetPrivateProfileIntA.
@@ -37,9 +39,10 @@ std::string ReadProfileSectionNames(const std::string& path, uint32_t size);
 // one process nest. The system frees the guard of a process that dies.
 //
 // Writes under a guard are seen by reads at once; in the file they all stand when the outermost
-// guard has ended (POSIX: in one replacement of the file, or, if that fails, none of them).
+// guard has ended, in one replacement of the file, or, if that fails, none of them.
 // Without the file's folder there is nothing to guard, and the object does nothing.
-// Windows: a named mutex. POSIX: flock on the file's folder.
+// Windows: a named mutex of the whole machine, which reads take as well. POSIX: flock on the
+// file's folder.
 class ProfileGuard {
  public:
   explicit ProfileGuard(const std::string& path);

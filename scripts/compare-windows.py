@@ -286,13 +286,18 @@ def run_section_names(side):
 
 
 def run_overlapping(side):
-    """Starts at once; which one comes first is the system's."""
+    """Starts at once, then messages for one event at once, in the order that the system likes."""
     side.reset()
-    processes = [side.start(["-start", str(i), "-Product", "P%d" % i]) for i in range(12)]
-    results = [str((process.communicate()[0], process.returncode)) for process in processes]
-    rest = [part for item in side.tree() for part in
-            (sorted(item.split("\n[")) if item.startswith("History.ini") else [item])]
-    return "\n".join(results + rest)
+    results = []
+    for call in (lambda i: ["-start", str(i), "-Product", "P%d" % i],
+                 lambda i: ["-logmessage", "0", "-message", ("message %d " % i) * 1000]):
+        processes = [side.start(call(i)) for i in range(12)]
+        results += [str((process.communicate()[0], process.returncode)) for process in processes]
+    separators = {"History.ini": "\n[", "0/ORXInstallEvent.Log": "\n"}
+    for item in side.tree():
+        name = item.split(":\n", 1)[0]
+        results += sorted(item.split(separators[name])) if name in separators else [item]
+    return "\n".join(results)
 
 
 def run_killed(side):

@@ -8,19 +8,19 @@ cd "$1"
 folder=$PWD
 
 mkdir -p sources lists/partial cache/archives/partial
-for list in /etc/apt/sources.list /etc/apt/sources.list.d/debian.sources; do
+lists=/etc/apt/sources.list
+for list in $lists $lists.d/*.list $lists.d/*.sources; do
   if [ -e "$list" ]; then
-    sed -E 's/^deb /deb-src /; s/^Types:.*/Types: deb-src/' "$list" > "sources/$(basename "$list")"
+    # The first one is only read among the others if it ends as they do.
+    name=$(basename "$list" | sed 's/^sources.list$/machine.list/')
+    sed -E 's/^deb /deb-src /; s/^Types:.*/Types: deb-src/' "$list" > "sources/$name"
   fi
 done
-# A sources.list is only read as one of the parts with this ending.
-if [ -e sources/sources.list ]; then
-  mv sources/sources.list sources/machine.list
-fi
 
 apt() {
   apt-get -q -o Dir::Etc::sourcelist=/dev/null -o Dir::Etc::sourceparts="$folder/sources" \
-    -o Dir::State::lists="$folder/lists" -o Dir::Cache="$folder/cache" -o APT::Sandbox::User=root "$@"
+    -o Dir::State::lists="$folder/lists" -o Dir::Cache="$folder/cache" \
+    -o APT::Sandbox::User=root "$@"
 }
 apt update
 apt source --download-only minizip

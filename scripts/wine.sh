@@ -3,6 +3,7 @@
 # and without the questions of a first start.
 set -eu
 export WINEPREFIX="${WINEPREFIX:-$(cd "$(dirname "$0")/.." && pwd)/build/wine}"
-export WINEARCH=win64 LC_ALL=C.UTF-8 WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml,winemenubuilder.exe="
+export WINEARCH=win64 WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml,winemenubuilder.exe="
+export LC_ALL=C.UTF-8  # for the code page of Western Europe
 unset DISPLAY
 exec wine "$@"

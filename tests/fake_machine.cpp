@@ -4,13 +4,18 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <numeric>
 #include <random>
+#include <regex>
+#include <set>
 #include <sstream>
 
 #include "app/install_history.h"
 #include "eventlog/logger.h"
+#include "history/locations.h"
 #include "platform/ascii_case.h"
 #include "platform/known_folders.h"
+#include "platform/path.h"
 
 static std::string commonFolder;
 
@@ -32,6 +37,50 @@ ScratchHistory::~ScratchHistory() {
   std::filesystem::remove_all(Root, ignored);
   commonFolder.clear();
 }
+
+std::string ScratchHistory::In(const std::string& path) const { return Native("@/" + path); }
+
+void ScratchHistory::Make(const std::string& path) const {
+  if (path.ends_with('/')) {
+    std::filesystem::create_directories(In(path));
+    return;
+  }
+  std::filesystem::create_directories(std::filesystem::path(In(path)).parent_path());
+  WriteFileText(In(path), path);
+}
+
+std::string ScratchHistory::Tree() const {
+  std::set<std::string> lines;
+  for (const auto& entry : std::filesystem::recursive_directory_iterator(Root)) {
+    const std::string path = entry.path().string().substr(Root.size() + 1);
+    lines.insert(Neutral(path) + (entry.is_directory() ? "/\n" : "\n"));
+  }
+  return std::accumulate(lines.begin(), lines.end(), std::string());
+}
+
+static std::string Replaced(std::string text, const std::string& old, const std::string& by) {
+  for (size_t place = 0; (place = text.find(old, place)) != std::string::npos;) {
+    text.replace(place, old.size(), by);
+    place += by.size();
+  }
+  return text;
+}
+
+std::string ScratchHistory::Neutral(std::string text) const {
+  std::erase(text, '\r');
+  text = Replaced(Replaced(text, Root, "@"), {kPathSeparator}, "/");
+  return std::regex_replace(text, std::regex("[0-9]{8} [0-9]{2}:[0-9]{2}:[0-9]{2}"), "<time>");
+}
+
+std::string ScratchHistory::Native(const std::string& text) const {
+  return Replaced(Replaced(text, "/", {kPathSeparator}), "@", Root);
+}
+
+std::string InHistory(const std::string& path) {
+  return JoinPath(GetHistoryDir(), Replaced(path, "/", {kPathSeparator}));
+}
+
+std::string Golden(const std::string& name) { return FileText(JoinPath(ORX_GOLDEN_FOLDER, name)); }
 
 ProgramArguments::ProgramArguments(std::vector<std::string> words) : Words(std::move(words)) {
   Words.insert(Words.begin(), "ORXInstallEventLog");
@@ -67,36 +116,35 @@ void WriteFileText(const std::string& path, const std::string& text) {
   std::ofstream(path, std::ios::binary) << text;
 }
 
-static FakeMachine::Key* FindKey(const std::string& path) {
-  auto& keys = Machine().Registry;
-  const auto found = std::find_if(keys.begin(), keys.end(), [&](const FakeMachine::Key& key) {
-    return EqualsIgnoringCase(key.Path, path);
-  });
-  return found == keys.end() ? nullptr : &*found;
-}
-
-void FakeMachine::SetKey(const std::string& keyPath) {
-  if (FindKey(keyPath) == nullptr) {
-    Registry.push_back({keyPath, {}});
+static RegistryData DataOf(const std::string& text) {
+  if (!text.starts_with("dword:")) {
+    return {kRegistryText, text + '\0'};
   }
-}
-
-void FakeMachine::SetData(const std::string& keyPath, const std::string& name, RegistryData data) {
-  SetKey(keyPath);
-  FindKey(keyPath)->Values.emplace_back(name, std::move(data));
+  const unsigned long number = std::stoul(text.substr(text.find(':') + 1), nullptr, 16);
+  RegistryData data{kRegistryNumber, ""};
+  for (int shift = 0; shift < 32; shift += 8) {
+    data.Bytes += static_cast<char>(number >> shift & 0xFF);
+  }
+  return data;
 }
 
 void FakeMachine::SetText(const std::string& keyPath, const std::string& name,
                           const std::string& text) {
-  SetData(keyPath, name, {kRegistryText, text + '\0'});
+  Registry.push_back({keyPath, name, DataOf(text)});
 }
 
-void FakeMachine::SetNumber(const std::string& keyPath, const std::string& name, uint32_t number) {
-  std::string bytes;
-  for (int shift = 0; shift < 32; shift += 8) {
-    bytes += static_cast<char>(number >> shift & 0xFF);
+void FakeMachine::Load(const std::string& text) {
+  std::istringstream lines(text);
+  std::string keyPath;
+  for (std::string line; std::getline(lines, line);) {
+    const size_t sign = line.find('=');
+    if (line.starts_with('[')) {
+      keyPath = line.substr(1, line.size() - 2);
+      Registry.push_back({keyPath, "", {}});
+    } else if (sign != std::string::npos) {
+      SetText(keyPath, line.substr(0, sign), line.substr(sign + 1));
+    }
   }
-  SetData(keyPath, name, {kRegistryNumber, bytes});
 }
 
 std::string GetFolderPath(int32_t csidl) { return csidl == 35 ? commonFolder : ""; }
@@ -124,12 +172,8 @@ ServiceListing ListServices() { return Machine().Services; }
 
 RegistryData ReadRegistryData(const std::string& keyPath, const std::string& valueName,
                               size_t limit, RegistryAccess) {
-  const FakeMachine::Key* key = FindKey(keyPath);
-  if (key == nullptr) {
-    return {};
-  }
-  for (const auto& [name, data] : key->Values) {
-    if (EqualsIgnoringCase(name, valueName)) {
+  for (const auto& [path, name, data] : Machine().Registry) {
+    if (EqualsIgnoringCase(path, keyPath) && EqualsIgnoringCase(name, valueName)) {
       return data.Bytes.size() <= limit ? data : RegistryData{data.Type, ""};
     }
   }
@@ -138,8 +182,8 @@ RegistryData ReadRegistryData(const std::string& keyPath, const std::string& val
 
 std::vector<std::string> EnumRegistryValueNames(const std::string& keyPath) {
   std::vector<std::string> names;
-  if (const FakeMachine::Key* key = FindKey(keyPath)) {
-    for (const auto& [name, data] : key->Values) {
+  for (const auto& [path, name, data] : Machine().Registry) {
+    if (EqualsIgnoringCase(path, keyPath) && !name.empty()) {
       names.push_back(name);
     }
   }
@@ -149,14 +193,13 @@ std::vector<std::string> EnumRegistryValueNames(const std::string& keyPath) {
 std::vector<std::string> EnumRegistrySubKeys(const std::string& keyPath) {
   std::vector<std::string> names;
   const std::string prefix = keyPath + '\\';
-  for (const FakeMachine::Key& key : Machine().Registry) {
-    if (!EqualsIgnoringCase(key.Path.substr(0, prefix.size()), prefix)) {
-      continue;
-    }
-    const std::string name =
-        key.Path.substr(prefix.size(), key.Path.find('\\', prefix.size()) - prefix.size());
-    if (std::find(names.begin(), names.end(), name) == names.end()) {
-      names.push_back(name);
+  for (const auto& entry : Machine().Registry) {
+    if (EqualsIgnoringCase(entry.KeyPath.substr(0, prefix.size()), prefix)) {
+      const std::string below = entry.KeyPath.substr(prefix.size());
+      const std::string name = below.substr(0, below.find('\\'));
+      if (std::find(names.begin(), names.end(), name) == names.end()) {
+        names.push_back(name);
+      }
     }
   }
   return names;
@@ -166,22 +209,28 @@ std::optional<std::string> DomainUserName() { return Machine().DomainUser; }
 
 std::optional<std::string> WorkstationUserName() { return Machine().WorkstationUser; }
 
-using Groups = std::vector<std::pair<std::string, FakeMachine::Members>>;
+using Groups = FakeMachine::Groups;
+
+static bool IsOwnName(const std::string& server) {
+  return server == (Machine().ComputerName ? "\\\\" + *Machine().ComputerName : "");
+}
 
 static std::vector<std::string> NamesOf(const Groups& groups, const std::string& server) {
-  Machine().ServersAsked.push_back(server);
   std::vector<std::string> names;
-  std::transform(groups.begin(), groups.end(), std::back_inserter(names),
-                 [](const auto& group) { return group.first; });
-  return names;
+  for (const auto& [name, members] : groups) {
+    names.push_back(name);
+  }
+  return IsOwnName(server) ? names : std::vector<std::string>();
 }
 
 static std::vector<std::string> MembersOf(const Groups& groups, const std::string& server,
-                                          const std::string& name) {
-  Machine().ServersAsked.push_back(server);
-  const auto found = std::find_if(groups.begin(), groups.end(),
-                                  [&](const auto& group) { return group.first == name; });
-  return found == groups.end() ? FakeMachine::Members() : found->second;
+                                          const std::string& group) {
+  for (const auto& [name, members] : groups) {
+    if (name == group && IsOwnName(server)) {
+      return members;
+    }
+  }
+  return {};
 }
 
 std::vector<std::string> ListLocalGroups(const std::string& server) {

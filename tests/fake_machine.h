@@ -29,24 +29,24 @@ struct FakeMachine {
 
   ServiceListing Services;
 
-  using Members = std::vector<std::string>;
+  // The groups are told to those who ask this machine by its name, if it has one.
+  using Groups = std::vector<std::pair<std::string, std::vector<std::string>>>;
   std::optional<std::string> DomainUser;
   std::optional<std::string> WorkstationUser;
-  std::vector<std::pair<std::string, Members>> LocalGroups;
-  std::vector<std::pair<std::string, Members>> GlobalGroups;
-  std::vector<std::string> ServersAsked;  // by the account calls, in their order
+  Groups LocalGroups;
+  Groups GlobalGroups;
 
-  // A key exists if it or a key below it is set. Order is that of the insertion.
-  void SetKey(const std::string& keyPath);
-  void SetText(const std::string& keyPath, const std::string& name, const std::string& text);
-  void SetNumber(const std::string& keyPath, const std::string& name, uint32_t number);
-  void SetData(const std::string& keyPath, const std::string& name, RegistryData data);
-
-  struct Key {
-    std::string Path;
-    std::vector<std::pair<std::string, RegistryData>> Values;
+  // The registry in its order. A key exists if it or a key below it is named here.
+  struct RegistryEntry {
+    std::string KeyPath;
+    std::string ValueName;  // empty: the key alone
+    RegistryData Data;
   };
-  std::vector<Key> Registry;
+  std::vector<RegistryEntry> Registry;
+  void SetText(const std::string& keyPath, const std::string& name, const std::string& text);
+
+  // Adds what a text says, line by line: [key] and below it name=text or name=dword:fffffffe.
+  void Load(const std::string& text);
 };
 
 // The one machine; assign FakeMachine() to begin anew.
@@ -61,8 +61,28 @@ class ScratchHistory {
   ScratchHistory(const ScratchHistory&) = delete;
   ScratchHistory& operator=(const ScratchHistory&) = delete;
 
+  // Paths are given with slashes, whatever the platform's separator.
+  std::string In(const std::string& path) const;
+
+  // Makes a file that holds its own path as given, or a folder if that ends in a slash; the folders
+  // above it too.
+  void Make(const std::string& path) const;
+
+  // Every file and folder, a line each, a folder's with a slash at its end.
+  std::string Tree() const;
+
+  // A text with "@" for the root, "<time>" for a time stamp, slashes and plain line ends: the same
+  // on every machine, as the golden texts are. And from such a text the one for this machine.
+  std::string Neutral(std::string text) const;
+  std::string Native(const std::string& text) const;
+
   std::string Root;
 };
+
+// A path below the history folder.
+std::string InHistory(const std::string& path);
+
+std::string Golden(const std::string& name);
 
 // An argument vector as the system hands it to main, the program's name in front.
 class ProgramArguments {

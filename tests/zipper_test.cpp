@@ -15,91 +15,72 @@
 namespace {
 
 namespace fs = std::filesystem;
-using Names = std::vector<std::string>;
 
-// The path with the platform's separators in place of its slashes.
-std::string Native(std::string path) {
-  std::replace(path.begin(), path.end(), '/', kPathSeparator);
-  return path;
-}
-
-// A tree in the folder "Tree" to pack, and an archive beside it.
+// A folder "Tree" to pack, and an archive beside it.
 class Zipper : public testing::Test {
  protected:
   void SetUp() override {
-    fs::create_directories(In("Tree/sub/empty"));
-    fs::create_directories(In("Tree/.hidden"));
-    WriteFileText(In("Tree/a.txt"), "a");
-    WriteFileText(In("a.txt"), "outside");
-    WriteFileText(In("Tree/sub/b.txt"), "bb");
-    WriteFileText(In("Tree/.hidden/c.txt"), "ccc");
-    WriteFileText(In("Tree/sub/.d"), "dddd");
+    for (const char* path : {"a.txt", "Tree/a.txt", "Tree/sub/b.txt", "Tree/sub/empty/",
+                             "Tree/sub/.d", "Tree/.hidden/c.txt"}) {
+      Scratch.Make(path);
+    }
   }
-  void TearDown() override { fs::permissions(In("Tree/a.txt"), fs::perms::owner_all); }
-
-  std::string In(const std::string& path) const { return JoinPath(Scratch.Root, Native(path)); }
 
   const ScratchHistory Scratch;
-  const std::string Root = In("Tree");
-  const std::string Archive = In("out.zip");
+  const std::string Root = Scratch.In("Tree");
+  const std::string Archive = Scratch.In("out.zip");
+  const std::string File = Scratch.In("Tree/sub/b.txt");
 };
 
-bool IsTimeOf(const std::string& path, const tm_unz& date) {
+// As an archive packs it: to two seconds.
+unsigned long DateOf(const std::string& path) {
   const CalendarTime time = LastWriteTime(path).value_or(CalendarTime());
-  const auto equals = [](auto field, int value) { return static_cast<int>(field) == value; };
-  return equals(date.tm_year, time.Year) && equals(date.tm_mon, time.Month - 1) &&
-         equals(date.tm_mday, time.Day) && equals(date.tm_hour, time.Hour) &&
-         equals(date.tm_min, time.Minute) && equals(date.tm_sec, time.Second / 2 * 2);
+  const int date = (time.Year - 1980) << 9 | time.Month << 5 | time.Day;
+  return static_cast<unsigned long>(date) << 16 |
+         static_cast<unsigned long>(time.Hour << 11 | time.Minute << 5 | time.Second / 2);
 }
 
-TEST_F(Zipper, PacksAFolderWithAllItContains) {
-  fs::permissions(In("Tree/a.txt"), fs::perms::owner_read);
-  CZipper zipper(Archive.c_str(), Root.c_str());
+TEST_F(Zipper, PacksAFolderWithAllItContainsButItself) {
+  fs::permissions(Scratch.In("Tree/a.txt"), fs::perms::owner_read);
+  Scratch.Make("Tree/sub/self.zip");
+  fs::create_hard_link(Scratch.In("Tree/sub/self.zip"), Scratch.In("Tree/other name"));
+  const std::string archive = Scratch.In("Tree/sub/../sub/self.zip");
+  CZipper zipper(archive.c_str(), Root.c_str());
+  EXPECT_FALSE(zipper.AddFile(Scratch.Native("sub/self.zip")));
   EXPECT_TRUE(zipper.AddFolder(Root));
   ZipFileInfo info;
   zipper.GetFileInfo(info);
   EXPECT_EQ(info.FileCount, 2U);
   EXPECT_EQ(info.FolderCount, 3U);
-  EXPECT_EQ(info.UncompressedSize, 3U);
+  EXPECT_EQ(info.UncompressedSize, 24U);
   EXPECT_TRUE(zipper.Close());
-
-  const auto entries = ReadArchive(Archive);
-  EXPECT_EQ(ArchiveNames(Archive), Names({"a.txt", "sub", "sub/b.txt", "sub/empty"}));
-  for (const ArchiveEntry& entry : entries) {
-    const std::string path = JoinPath(Root, Native(entry.Name));
+  EXPECT_EQ(ArchiveTree(archive), "a.txt\nsub/\nsub/b.txt\nsub/empty/\n");
+  for (const ArchiveEntry& entry : ReadArchive(archive)) {
+    const std::string path = Scratch.In("Tree/" + entry.Name);
     EXPECT_EQ(entry.Contents, FileExists(path) ? FileText(path) : "");
     EXPECT_EQ(entry.Attributes, *FileAttributes(path) & ~1U) << entry.Name;
-    EXPECT_TRUE(IsTimeOf(path, entry.Date)) << entry.Name;
+    EXPECT_EQ(entry.Date, DateOf(path)) << entry.Name;
   }
+  fs::permissions(Scratch.In("Tree/a.txt"), fs::perms::owner_all);
 }
 
 TEST_F(Zipper, NamesEntriesByTheirPaths) {
-  std::string otherCase = Root;
-  otherCase.replace(otherCase.size() - 4, 4, "tREE");
-  const std::string outside = In("a.txt");
-  struct {
-    std::string Path;
-    bool IgnorePath;
-    bool Result;
-    std::string Name;
-  } const cases[] = {
-      {"a.txt", false, true, "a.txt"},
-      {"./sub/b.txt", false, true, "sub/b.txt"},
-      {"sub/b.txt", true, true, "b.txt"},
-      {"../Tree/a.txt", false, false, ""},
-      {"../Tree/a.txt", true, true, "a.txt"},
-      {Root + "/sub/b.txt", false, true, "sub/b.txt"},
-      {Root + "//sub/b.txt", false, true, "sub/b.txt"},
-      {outside, false, false, ""},
-      {outside, true, true, "a.txt"},
-      {"none.txt", false, false, ""},
-      {"sub", false, false, ""},
-  };
-  for (const auto& test : cases) {
-    CZipper zipper(Archive.c_str(), (Root + kPathSeparator).c_str());
-    EXPECT_EQ(zipper.AddFile(Native(test.Path), test.IgnorePath), test.Result) << test.Path;
-    zipper.Close();
-    EXPECT_EQ(ArchiveNames(Archive), test.Result ? Names{test.Name} : Names()) << test.Path;
+  // The path, its entry's name, and that with the path ignored; no name if it is not added.
+  const char* cases[][3] = {{"a.txt", "a.txt", "a.txt"},
+                            {"./sub/b.txt", "sub/b.txt", "b.txt"},
+                            {"../Tree/a.txt", "", "a.txt"},
+                            {"@/Tree//sub/b.txt", "sub/b.txt", "b.txt"},
+                            {"@/a.txt", "", "a.txt"},
+                            {"none.txt", "", ""},
+                            {"sub", "", ""}};
+  for (const auto& [path, fullName, lastPart] : cases) {
+    for (const bool ignorePath : {false, true}) {
+      const std::string name = ignorePath ? lastPart : fullName;
+      CZipper zipper(Archive.c_str(), (Root + kPathSeparator).c_str());
+      EXPECT_EQ(zipper.AddFile(Scratch.Native(path), ignorePath), !name.empty()) << path;
+      zipper.Close();
+      EXPECT_EQ(ArchiveTree(Archive), name.empty() ? "" : name + '\n') << path;
+    }
   }
 }
 
@@ -114,90 +95,62 @@ TEST_F(Zipper, TrimsBlanksBeforeSeparatorsAtBothEnds) {
       {"", "", ""},
   };
   for (const auto& [text, withoutTail, withoutHead] : cases) {
-    EXPECT_EQ(TrimTail(Native(text)), Native(withoutTail));
-    EXPECT_EQ(TrimHead(Native(text)), Native(withoutHead));
+    EXPECT_EQ(TrimTail(Scratch.Native(text)), Scratch.Native(withoutTail));
+    EXPECT_EQ(TrimHead(Scratch.Native(text)), Scratch.Native(withoutHead));
   }
   EXPECT_EQ(CutFolder("C:X/aBc.d", "c:x/Ab"), "c.d");
   EXPECT_EQ(CutFolder("ab", "abc"), std::nullopt);
 }
 
-TEST_F(Zipper, AddsFilesElsewhereAndMemory) {
+TEST_F(Zipper, AddsToAnArchiveReplacesItAndCloses) {
   const std::string memory(5000, 'm');
-  CZipper zipper(Archive.c_str(), Root.c_str());
-  EXPECT_TRUE(zipper.AddFileWithFolder(In("Tree/sub/b.txt"), Native("to/here")));
-  EXPECT_TRUE(zipper.AddBuffer(memory.data(), 5000, Native("to/memory")));
+  CZipper zipper(Archive.c_str(), Root.c_str(), /*append=*/true);
+  EXPECT_TRUE(zipper.AddBuffer(memory.data(), 5000, Scratch.Native("to/memory")));
   EXPECT_TRUE(zipper.AddBuffer(nullptr, 0, "nothing"));
-  EXPECT_FALSE(zipper.AddFileWithFolder(In("Tree/a.txt"), Root));
-  EXPECT_FALSE(zipper.AddBuffer(memory.data(), 1, In("x")));
-  EXPECT_EQ(zipper.Counters.FileCount, 3U);
-  EXPECT_EQ(zipper.Counters.UncompressedSize, 5002U);
-  zipper.Close();
-
-  const auto entries = ReadArchive(Archive);
-  ASSERT_EQ(ArchiveNames(Archive), Names({"to/here/b.txt", "to/memory", "nothing"}));
-  EXPECT_EQ(entries[1].Contents, memory);
-  EXPECT_EQ(entries[1].Attributes, 128U);
-  const std::time_t now = std::time(nullptr);
-  EXPECT_EQ(static_cast<int>(entries[1].Date.tm_year), std::gmtime(&now)->tm_year + 1900);
-}
-
-TEST_F(Zipper, IsIdleWithoutAnArchive) {
-  CZipper zipper;
-  EXPECT_FALSE(zipper.Open(nullptr));
-  EXPECT_FALSE(zipper.Open(""));
-  EXPECT_FALSE(zipper.Open(In("none/out.zip").c_str()));
-  EXPECT_FALSE(zipper.Open(Root.c_str(), Root.c_str()));
-  EXPECT_EQ(zipper.RootFolder, "");
-  EXPECT_FALSE(zipper.AddFile(In("Tree/a.txt")));
-  EXPECT_FALSE(zipper.AddFolder(Root));
-  EXPECT_FALSE(zipper.AddFileWithFolder(In("Tree/a.txt"), "x"));
-  EXPECT_FALSE(zipper.AddBuffer("x", 1, "x"));
+  EXPECT_FALSE(zipper.AddBuffer(memory.data(), 1, Archive));
+  EXPECT_EQ(zipper.Counters.FileCount, 2U);
+  EXPECT_EQ(zipper.Counters.UncompressedSize, 5000U);
+  EXPECT_TRUE(zipper.Open(Archive.c_str(), Root.c_str(), /*append=*/true));
+  EXPECT_TRUE(zipper.AddFileWithFolder(File, Scratch.Native("to/here")));
+  EXPECT_FALSE(zipper.AddFileWithFolder(File, Root));
+  EXPECT_EQ(zipper.Counters.FileCount, 1U);
   EXPECT_TRUE(zipper.Close());
-  EXPECT_EQ(zipper.Counters.FolderCount, 0U);
-}
+  EXPECT_EQ(ArchiveTree(Archive), "to/memory\nnothing\nto/here/b.txt\n");
+  const ArchiveEntry entry = ReadArchive(Archive).at(0);
+  EXPECT_EQ(entry.Contents, memory);
+  EXPECT_EQ(entry.Attributes, 128U);
+  const std::time_t now = std::time(nullptr);
+  EXPECT_EQ(static_cast<int>(entry.Date >> 25) + 80, std::gmtime(&now)->tm_year);
 
-TEST_F(Zipper, ReplacesAnArchiveOrAddsToIt) {
-  const auto add = [this](bool append, const std::string& path) {
-    CZipper zipper;
-    EXPECT_TRUE(zipper.Open(Archive.c_str(), nullptr, append));  // its root is the archive's folder
-    EXPECT_EQ(zipper.RootFolder, Scratch.Root);
-    EXPECT_TRUE(zipper.AddFile(Native(path)));
-  };
-  add(true, "Tree/a.txt");
-  add(true, "Tree/sub/b.txt");
-  EXPECT_EQ(ArchiveNames(Archive), Names({"Tree/a.txt", "Tree/sub/b.txt"}));
-  add(false, "Tree/sub/b.txt");
-  EXPECT_EQ(ArchiveNames(Archive), Names({"Tree/sub/b.txt"}));
+  EXPECT_TRUE(zipper.Open(Archive.c_str()));  // its root is the archive's folder
+  EXPECT_TRUE(zipper.AddFile(Scratch.Native("Tree/a.txt")));
+  EXPECT_TRUE(zipper.Close());
+  EXPECT_EQ(ArchiveTree(Archive), "Tree/a.txt\n");
+  for (const char* path : {static_cast<const char*>(nullptr), "", Root.c_str()}) {
+    EXPECT_FALSE(zipper.Open(path, Root.c_str()));
+  }
+  EXPECT_EQ(zipper.RootFolder, "");
+  EXPECT_FALSE(zipper.AddFile(File) || zipper.AddFileWithFolder(File, "x"));
+  EXPECT_FALSE(zipper.AddFolder(Root) || zipper.AddBuffer("x", 1, "x"));
+  EXPECT_EQ(zipper.Counters.FolderCount, 0U);
+  EXPECT_TRUE(zipper.Close());
 }
 
 TEST_F(Zipper, PacksAThingBesideIt) {
+  Scratch.Make("v1.2/x.txt");
   const fs::path before = fs::current_path();
-  fs::create_directory(In("v1.2"));
-  WriteFileText(In("v1.2/x.txt"), "x");
   fs::current_path(Scratch.Root);
   EXPECT_TRUE(CZipper::ZipFolder("v1.2", /*ignorePath=*/false));
   fs::current_path(before);
-  EXPECT_EQ(ArchiveNames(In("v1.2.zip")), Names{"x.txt"});
   EXPECT_TRUE(CZipper::ZipFolder(Root + kPathSeparator, /*ignorePath=*/true));
-  EXPECT_EQ(ArchiveNames(In("Tree.zip")), Names({"Tree", "a.txt", "sub", "b.txt", "empty"}));
-
-  EXPECT_TRUE(CZipper::ZipFile(In("Tree/sub/b.txt")));
-  EXPECT_EQ(ArchiveNames(In("Tree/sub/b.zip")), Names{"b.txt"});
-  EXPECT_FALSE(CZipper::ZipFile(In("Tree/sub/b.zip")));
-  EXPECT_EQ(ArchiveNames(In("Tree/sub/b.zip")), Names{"b.txt"});
-  EXPECT_FALSE(CZipper::ZipFile(In("none/b.txt")));
+  EXPECT_TRUE(CZipper::ZipFile(File));
+  const std::string archive = Scratch.In("Tree/sub/b.zip");
+  EXPECT_FALSE(CZipper::ZipFile(archive));
+  EXPECT_FALSE(CZipper::ZipFile(Scratch.In("none/b.txt")));
   EXPECT_FALSE(CZipper::ZipFolder("", false));
-}
-
-TEST_F(Zipper, NeverHoldsItself) {
-  WriteFileText(In("Tree/sub/self.zip"), "older");
-  fs::create_hard_link(In("Tree/sub/self.zip"), In("Tree/other name"));
-  const std::string archive = In("Tree/sub/../sub/self.zip");
-  CZipper zipper(archive.c_str(), Root.c_str());
-  EXPECT_FALSE(zipper.AddFile(Native("sub/self.zip")));
-  EXPECT_TRUE(zipper.AddFolder(Root));
-  zipper.Close();
-  EXPECT_EQ(ArchiveNames(archive), Names({"a.txt", "sub", "sub/b.txt", "sub/empty"}));
+  EXPECT_EQ(ArchiveTree(Scratch.In("v1.2.zip")), "x.txt\n");
+  EXPECT_EQ(ArchiveTree(Scratch.In("Tree.zip")), "Tree/\na.txt\nsub/\nb.txt\nempty/\n");
+  EXPECT_EQ(ArchiveTree(archive), "b.txt\n");
 }
 
 }  // namespace

@@ -11,15 +11,15 @@ static std::string_view WithoutQuotes(std::string_view value) {
   return isQuoted ? value.substr(1, value.size() - 2) : value;
 }
 
-std::string ReadProfileString(const std::string& path, const std::string& section,
-                              const std::string& key, const std::string& fallback, uint32_t size) {
+std::string ReadProfileValue(const std::string& path, const std::string& section,
+                             const std::string& key, const std::string& fallback, uint32_t size) {
   const ProfileText* text = ProfileStore::GetInstance().Load(path);
   const auto value = text == nullptr ? std::nullopt : text->Find(section, key);
   return std::string(value ? WithoutQuotes(*value) : fallback).substr(0, size - 1);
 }
 
-bool WriteProfileString(const std::string& path, const std::string& section, const std::string& key,
-                        const std::string& value) {
+bool WriteProfileValue(const std::string& path, const std::string& section, const std::string& key,
+                       const std::string& value) {
   ProfileStore& store = ProfileStore::GetInstance();
   store.Lock(path);
   ProfileText* text = store.Load(path);

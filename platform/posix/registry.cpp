@@ -1,7 +1,6 @@
 #include "platform/registry.h"
 
 #include <fcntl.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -10,6 +9,7 @@
 
 #include "platform/known_folders.h"
 #include "platform/posix/descriptor.h"
+#include "platform/posix/file_calls.h"
 #include "platform/posix/registry_export.h"
 
 namespace {
@@ -32,10 +32,10 @@ size_t ReadAt(const Descriptor& file, uint64_t offset, char* buffer, size_t size
 // behind the first GiB is not seen.
 ByteReader ReaderOf(const std::string& path) {
   // Without O_NONBLOCK a pipe in the file's place would hold up the run.
-  const auto file = std::make_shared<Descriptor>(
-      ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
+  const auto file = std::make_shared<Descriptor>(RetryOnInterrupt(
+      [&] { return ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
   struct stat status = {};
-  if (!file->IsOpen() || ::fstat(file->Get(), &status) != 0 || !S_ISREG(status.st_mode)) {
+  if (!file->IsOpen() || !StatusOf(*file, status) || !S_ISREG(status.st_mode)) {
     return [](uint64_t, char*, size_t) { return size_t{0}; };
   }
   return [file](uint64_t offset, char* buffer, size_t size) {

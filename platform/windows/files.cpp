@@ -6,23 +6,8 @@
 #include "platform/windows/file_entry.h"
 #include "platform/windows/system.h"
 
-FileKind KindOf(const std::string& path) {
-  struct _stat64 status = {};
-  if (::_stat64(path.c_str(), &status) != 0) {
-    return FileKind::kNone;
-  }
-  const int kind = status.st_mode & _S_IFMT;
-  return kind == _S_IFREG   ? FileKind::kFile
-         : kind == _S_IFDIR ? FileKind::kFolder
-                            : FileKind::kOther;
-}
-
-bool IsSymbolicLink(const std::string& path) {
-  const std::optional<WIN32_FIND_DATAA> entry = FindEntry(path);
-  return entry && IsLink(*entry);
-}
-
-// Zero access is enough to ask for the identity; a folder needs the flag for backups.
+// Nothing for what has none, as a device. Zero access is enough to ask for it; a folder needs the
+// flag for backups.
 static std::optional<BY_HANDLE_FILE_INFORMATION> IdentityOf(const std::string& path) {
   const UniqueHandle file = OwnIfValid(::CreateFileA(
       path.c_str(), /*dwDesiredAccess=*/0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
@@ -33,6 +18,24 @@ static std::optional<BY_HANDLE_FILE_INFORMATION> IdentityOf(const std::string& p
     return std::nullopt;
   }
   return identity;
+}
+
+FileKind KindOf(const std::string& path) {
+  struct _stat64 status = {};
+  if (::_stat64(path.c_str(), &status) != 0) {
+    return FileKind::kNone;
+  }
+  const int kind = status.st_mode & _S_IFMT;
+  if (kind == _S_IFDIR) {
+    return FileKind::kFolder;
+  }
+  // The status of a name like "CON" can be that of a file.
+  return kind == _S_IFREG && IdentityOf(path) ? FileKind::kFile : FileKind::kOther;
+}
+
+bool IsSymbolicLink(const std::string& path) {
+  const std::optional<WIN32_FIND_DATAA> entry = FindEntry(path);
+  return entry && IsLink(*entry);
 }
 
 bool IsSameFile(const std::string& first, const std::string& second) {

@@ -5,8 +5,8 @@
 
 using namespace std::string_literals;
 
-std::string ReadProfileString(const std::string& path, const std::string& section,
-                              const std::string& key, const std::string& fallback, uint32_t size) {
+std::string ReadProfileValue(const std::string& path, const std::string& section,
+                             const std::string& key, const std::string& fallback, uint32_t size) {
   const ProfileGuard guard(path);
   std::string buffer(size, '\0');
   ::GetPrivateProfileStringA(section.c_str(), key.c_str(), fallback.c_str(), buffer.data(), size,
@@ -14,8 +14,8 @@ std::string ReadProfileString(const std::string& path, const std::string& sectio
   return buffer.c_str();
 }
 
-bool WriteProfileString(const std::string& path, const std::string& section, const std::string& key,
-                        const std::string& value) {
+bool WriteProfileValue(const std::string& path, const std::string& section, const std::string& key,
+                       const std::string& value) {
   ProfileStore& store = ProfileStore::GetInstance();
   store.Lock(path);
   const std::string file = store.ForWriting(path);

@@ -10,7 +10,8 @@
 // The system's calls rewrite a profile file in place and lose keys when two processes do so at
 // once. So every access, a read too, is made under the guard; and the writes go to a copy beside
 // the file, which replaces it when the guard ends. The copy's name begins with a dot. One that a
-// killed process left is overwritten by the next change.
+// killed process left is removed by the next change. Where the system refuses the mutex, accesses
+// are made without it.
 class ProfileStore {
  public:
   static ProfileStore& GetInstance();

@@ -8,7 +8,6 @@
 #define NOMINMAX
 #endif
 #include <windows.h>
-#undef WriteProfileString  // the seam has an operation of this name
 
 #include <memory>
 

@@ -32,7 +32,7 @@ OPENING = {"open", "openat"}
 
 # What an interrupted call on these loses is not held against the program: the first two are opened
 # and written by libraries that do not repeat a call; without the third a list is shorter.
-NOT_REPEATED = ("/Summary.txt", "/history.zip", "/Registry.reg")
+NOT_REPEATED = ("/Summary.txt", "/history.zip")
 
 Call = collections.namedtuple("Call", "name number text")  # the number counts calls of that name
 Point = collections.namedtuple("Point", "scenario call fault")  # or a size instead of a call

@@ -1,0 +1,76 @@
+#include <algorithm>
+#include <cstdint>
+#include <ctime>
+#include <string>
+#include <string_view>
+
+#include "fuzz/require.h"
+#include "fuzz/words.h"
+#include "history/ini_file.h"
+#include "history/locations.h"
+#include "platform/posix/profile_text.h"
+#include "platform/posix/registry_export.h"
+#include "report/zip_names.h"
+#include "tests/fake_machine.h"
+
+// A head and a unit, with a NUL between them: the head is followed by as many units as make a large
+// text, which is given to every reader. What takes time by the square of the length, and so would
+// hold up a run that meets such a file or argument, is far above the limit; what goes over the text
+// some times is far below, also with sanitizers. Time is that of the processor, so that a busy
+// machine does not count.
+
+namespace {
+
+double ProcessorSeconds() {
+  timespec time = {};
+  ::clock_gettime(CLOCK_THREAD_CPUTIME_ID, &time);
+  return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_nsec) * 1e-9;
+}
+
+template <typename Work>
+void RequireQuick(Work work, int line = __builtin_LINE()) {
+  constexpr double limit = 0.5;
+  const double begin = ProcessorSeconds();
+  work();
+  Require(ProcessorSeconds() - begin < limit, line);
+}
+
+void ReadProfile(const std::string& text) {
+  ProfileText profile(text);
+  profile.SectionNames();
+  profile.Find("x", "Count");
+  profile.Set("History", "Count", "1");
+}
+
+void ReadRegistry(const std::string& text) {
+  RegistryExport registry([&text](uint64_t offset, char* buffer, size_t size) {
+    return offset < text.size() ? text.copy(buffer, size, offset) : 0;
+  });
+  registry.SubKeyNames("");
+  registry.ValueNames("a");
+  registry.Read("a\\b", "a", 100);
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  static const ScratchHistory scratch;
+  constexpr size_t fileSize = 256 * 1024;
+  constexpr size_t argumentSize = 128 * 1024;  // more than a system takes
+  const std::vector<std::string> parts = Split(std::string(data, data + size), '\0');
+  const std::string& unit = parts.back();
+  if (unit.empty()) {
+    return 0;
+  }
+  std::string text = parts.size() > 1 ? parts.front() : "";
+  while (text.size() < fileSize) {
+    text += unit;
+  }
+  RequireQuick([&] { ReadProfile(text); });
+  RequireQuick([&] { ReadRegistry(text); });
+  const std::string argument = text.substr(0, argumentSize);
+  RequireQuick([&] { LeadsOutOfHistory(argument); });
+  RequireQuick([&] { ReplaceExtension(TrimHead(TrimTail(argument)), ".zip"); });
+  RequireQuick([&] { CIniFile(GetHistoryFilePath()).WriteString(argument, "Key", argument); });
+  return 0;
+}

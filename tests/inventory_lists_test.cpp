@@ -1,0 +1,83 @@
+// What the lists of a snapshot hold and the golden report does not show.
+
+#include <gtest/gtest.h>
+
+#include "history/locations.h"
+#include "inventory/service_list.h"
+#include "products/copy_generation.h"
+#include "products/products_list.h"
+#include "products/registry_value.h"
+#include "tests/fake_machine.h"
+
+namespace {
+
+using namespace std::string_literals;
+
+TEST(Lists, ReadTextsAndNumbersAndNothingElse) {
+  const std::vector<std::pair<RegistryData, std::string>> cases = {
+      {{kRegistryText, "no zero"}, "no zero"},
+      {{kRegistryText, "first\0second\0"s}, "first"},
+      {{kRegistryText, std::string(99, 'x') + '\0'}, std::string(99, 'x')},
+      {{kRegistryText, std::string(100, 'x') + '\0'}, ""},
+      {{kRegistryText, "\0"s}, ""},
+      {{kRegistryNumber, "\0\0\0\0"s}, "0"},
+      {{kRegistryNumber, "\x09\x04\0\0"s}, "1033"},
+      {{kRegistryNumber, "\xFF\xFF\xFF\xFF"}, "-1"},
+      {{kRegistryNumber, "\0\0\0\x80"s}, "-2147483648"},
+      {{kRegistryNumber, "\x01\x02"}, ""},
+      {{2, "%PATH%\0"s}, ""},
+      {{3, "\x01\x02\x03\x04"}, ""}};
+  for (const auto& [data, text] : cases) {
+    Machine().Registry = {{"SOFTWARE\\ZEK", "Value", data}};
+    EXPECT_EQ(ReadRegistryValue("SOFTWARE\\ZEK", "Value"), text);
+    EXPECT_EQ(ReadRegistryValue("SOFTWARE\\ZEK", "Missing"), "");
+  }
+}
+
+TEST(Lists, AreEmptyWhenTheServicesAreRefused) {
+  CServicesList list;
+  list.Services.resize(1);
+  Machine().Services = {5, {}};
+  EXPECT_EQ(list.Collect(), 5);
+  EXPECT_TRUE(list.Services.empty());
+}
+
+TEST(Lists, TakeTheOldCopyInItsOwnCaseOnly) {
+  Machine() = FakeMachine();
+  Machine().Load("[SOFTWARE\\ZEK\\orx]\n");
+  SetCopyGeneration(0);
+  const std::string text = LoggedText([] {
+    CORXProductsList list;
+    list.Collect();
+    list.Print();
+  });
+  EXPECT_TRUE(text.ends_with("*\nThere is no ORX prior to V9 Installed \n")) << text;
+}
+
+TEST(Lists, AppendTheCopiesOfTheLayoutInForce) {
+  Machine() = FakeMachine();
+  Machine().Load(FileText(JoinPath(ORX_GOLDEN_FOLDER, "registry_added.txt")));
+  CORXProductsList list;
+  for (const int32_t generation : {0, 1, 1}) {
+    SetCopyGeneration(generation);
+    EXPECT_EQ(list.Collect(), 0);
+  }
+  std::string names;
+  for (const CORXCopy& copy : list.Copies) {
+    names += std::to_string(copy.Generation) + ' ' + copy.Name + '\n';
+  }
+  // The first is the parent of the later layout's copies.
+  EXPECT_EQ(names, "0 ORX\n1 Empty\n1 C1\n1 Empty\n1 C1\n");
+
+  // What is no part of the report.
+  const CORXCopy& copy = list.Copies.at(2);
+  const auto& [version, release, modification, serviceLevel] = copy.VersionInfo;
+  EXPECT_EQ(version + release + modification + serviceLevel, "940Level 0");
+  const CORXProduct& product = copy.Products.at(0);
+  EXPECT_EQ(product.CopyName + '|' + product.Title + '|' + product.Description,
+            "C1|not shown|nor this");
+  const CADMInstance& instance = copy.AdmInstances.at(0);
+  EXPECT_EQ(instance.CopyName + instance.Name + instance.Parameters.at(0).Value, "C1ADM1shown");
+}
+
+}  // namespace

@@ -1,0 +1,87 @@
+// What a report makes of a history: summaries, the files that it collects, an archive.
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <string>
+
+#include "app/install_history.h"
+#include "history/locations.h"
+#include "tests/archive_reader.h"
+#include "tests/fake_machine.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+// A report's result and, behind it, what it prints.
+std::string Report(const std::string& archive) {
+  testing::internal::CaptureStdout();
+  const int result = CInstallHistory().Report(archive);
+  return std::to_string(result) + testing::internal::GetCapturedStdout();
+}
+
+std::string Created(const std::string& archive) {
+  return "1The file '" + archive + "' is created successfully\n";
+}
+
+TEST(Report, IsTheGoldenOneEveryTime) {
+  const ScratchHistory scratch;
+  for (const char* path :
+       {"setup/Setup.log", "setup/Setup.rsp", "setup/Late.log", "setup/ORXInstallEvent.Log",
+        "other/Setup.log", "Up.trc", "grandparent/", "outside/aside/", "outside/through/",
+        "ZEK/ORXHistory/C1/11/ORXInstallEvent.Log", "ZEK/ORXHistory/C1/12/ORXInstallEvent.Log",
+        "ZEK/ORXHistory/C1/12/Trial.log", "ZEK/ORXHistory/Nameless/",
+        "ZEK/ORXHistory/X/Summary.txt/"}) {
+    scratch.Make(path);
+  }
+  WriteFileText(GetHistoryFilePath(), scratch.Native(Golden("report_history.ini")));
+  const std::string archive = scratch.In("report.zip");
+  const fs::path before = fs::current_path();
+  fs::current_path(scratch.In("setup"));
+  for (int report = 0; report < 2; ++report) {
+    EXPECT_EQ(Report(archive), Created(archive));
+    EXPECT_EQ(scratch.Neutral(FileText(InHistory("Summary.txt"))), Golden("summary_overall.txt"));
+    EXPECT_EQ(scratch.Neutral(FileText(InHistory("C1/Summary.txt"))), Golden("summary_copy.txt"));
+    EXPECT_EQ(scratch.Tree(), Golden("report_files.txt"));
+    EXPECT_EQ(ArchiveTree(archive), Golden("report_archive.txt"));
+  }
+  fs::current_path(before);
+  EXPECT_EQ(FileText(InHistory("C1/11/Setup.log")), "setup/Setup.log");
+  for (const ArchiveEntry& entry : ReadArchive(archive)) {
+    const std::string path = InHistory(entry.Name);
+    EXPECT_EQ(entry.Contents, FileExists(path) ? FileText(path) : "");
+  }
+}
+
+TEST(Report, NeedsAHistoryFolderForItsArchiveAndAHistoryFileForItsSummary) {
+  const ScratchHistory scratch;
+  const std::string archive = scratch.In("report.zip");
+  EXPECT_EQ(Report(archive),
+            "0There is no ORX Installation History Log ( no ORX V9 or Later is installed )\n");
+  EXPECT_EQ(scratch.Tree(), "");
+
+  scratch.Make("ZEK/ORXHistory/Summary.txt");
+  EXPECT_EQ(Report(archive), Created(archive));
+  EXPECT_EQ(FileText(InHistory("Summary.txt")), "ZEK/ORXHistory/Summary.txt");
+  EXPECT_EQ(CInstallHistory().WriteSummary(), 0);
+
+  RunTool({});
+  EXPECT_TRUE(FileExists('"' + GetHistoryFilePath() + '"'));
+  EXPECT_TRUE(DirExists('"' + GetHistoryDir() + '"'));
+  EXPECT_EQ(CInstallHistory().WriteSummary(), 1);
+  EXPECT_EQ(scratch.Neutral(FileText(InHistory("Summary.txt"))), Golden("summary_empty.txt"));
+}
+
+TEST(Report, MakesNoArchiveUnderNamesThatAreTaken) {
+  const ScratchHistory scratch;
+  RunTool({"-start", "7"});
+  const std::string history = FileText(GetHistoryFilePath());
+  for (const std::string& name : {std::string(), scratch.Root, scratch.In("none/a.zip"),
+                                  GetHistoryFilePath(), InHistory("7/../History.ini")}) {
+    EXPECT_EQ(Report(name), "0 Failed to create file '" + name + "'\n");
+  }
+  EXPECT_EQ(FileText(GetHistoryFilePath()), history);
+}
+
+}  // namespace
