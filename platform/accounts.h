@@ -21,8 +21,8 @@ std::optional<std::string> WorkstationUserName();
 std::vector<std::string> ListLocalGroups(const std::string& server);
 
 // The members of a local group, each with its domain; empty if they cannot be listed.
-// Windows: NetLocalGroupGetMembers, level 2. POSIX: getgrnam, and the users whose primary group it
-// is; each once.
+// Windows: NetLocalGroupGetMembers, level 2. POSIX: getgrent, and the users whose primary group it
+// is; each once; both read once in a run.
 std::vector<std::string> ListLocalGroupMembers(const std::string& server, const std::string& group);
 
 // The global groups and the users of each, as the same calls for local ones. POSIX: none.

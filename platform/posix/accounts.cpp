@@ -4,6 +4,7 @@
 #include <pwd.h>
 #include <unistd.h>
 
+#include <string_view>
 #include <unordered_map>
 #include <unordered_set>
 
@@ -28,11 +29,42 @@ UsersByGroup ReadUsersByPrimaryGroup() {
   return users;
 }
 
-// The users whose primary group it is. One walk through the user database serves all groups of a
-// run: a walk for each would cost users times groups.
-const std::vector<std::string>& PrimaryUsersOf(gid_t group) {
-  static UsersByGroup users = ReadUsersByPrimaryGroup();
-  return users[group];
+struct Group {
+  gid_t Number = 0;
+  std::vector<std::string> Members;
+};
+
+using GroupsByName = std::unordered_map<std::string, Group>;
+
+// Of two groups with one name the first, as getgrnam has it.
+GroupsByName ReadGroups() {
+  GroupsByName groups;
+  ::setgrent();
+  while (const ::group* entry = ::getgrent()) {
+    const auto [place, isNew] = groups.try_emplace(entry->gr_name, Group{entry->gr_gid, {}});
+    for (char** member = entry->gr_mem; isNew && *member != nullptr; ++member) {
+      place->second.Members.emplace_back(*member);
+    }
+  }
+  ::endgrent();
+  return groups;
+}
+
+// The named members of a group, and behind them the users whose primary group it is. One walk
+// through each database serves all groups of a run: a walk for each would cost groups times groups,
+// and users times groups.
+std::vector<std::string> UsersOf(const std::string& group) {
+  static const GroupsByName groups = ReadGroups();
+  static const UsersByGroup primaryUsers = ReadUsersByPrimaryGroup();
+  const auto place = groups.find(group);
+  if (place == groups.end()) {
+    return {};
+  }
+  std::vector<std::string> users = place->second.Members;
+  if (const auto more = primaryUsers.find(place->second.Number); more != primaryUsers.end()) {
+    users.insert(users.end(), more->second.begin(), more->second.end());
+  }
+  return users;
 }
 
 }  // namespace
@@ -59,17 +91,7 @@ std::vector<std::string> ListLocalGroups(const std::string& /*server*/) {
 
 std::vector<std::string> ListLocalGroupMembers(const std::string& /*server*/,
                                                const std::string& group) {
-  const ::group* entry = ::getgrnam(group.c_str());
-  if (entry == nullptr) {
-    return {};
-  }
-  std::vector<std::string> users;
-  for (char** member = entry->gr_mem; *member != nullptr; ++member) {
-    users.emplace_back(*member);
-  }
-  const std::vector<std::string>& primaryUsers = PrimaryUsersOf(entry->gr_gid);
-  users.insert(users.end(), primaryUsers.begin(), primaryUsers.end());
-
+  const std::vector<std::string> users = UsersOf(group);
   const std::string domain = HostName() + '\\';
   std::unordered_set<std::string_view> seen;
   std::vector<std::string> members;
