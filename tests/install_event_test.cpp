@@ -8,6 +8,7 @@
 #include <sstream>
 #include <vector>
 
+#include "app/install_history.h"
 #include "app/usage.h"
 #include "history/locations.h"
 #include "tests/fake_machine.h"
@@ -112,6 +113,14 @@ TEST(InstallEvent, KeepsTheGoldenHistory) {
   std::filesystem::remove(GetHistoryFilePath());
   EXPECT_EQ(RunTool({}), 2);
   EXPECT_EQ(HistoryText(scratch), "[History]\nCount=0\n");
+}
+
+TEST(InstallEvent, CountsOnWhenACopyTookTheNameOfTheGrowingFile) {
+  const ScratchHistory scratch;
+  RunTool({"-end", "1", "-CopyName", ".History.tmp"});
+  RunTool({"-start", "2"});
+  EXPECT_TRUE(DirExists(InHistory(".History.tmp")));
+  EXPECT_EQ(CInstallHistory().EventCount, 1);
 }
 
 TEST(InstallEvent, FailsWithoutTheHistoryFolder) {

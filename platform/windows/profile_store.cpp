@@ -1,5 +1,6 @@
 #include "platform/windows/profile_store.h"
 
+#include "platform/files.h"
 #include "platform/path.h"
 #include "platform/windows/file_entry.h"
 // It needs what the system's header defines.
@@ -30,6 +31,10 @@ ProfileStore& ProfileStore::GetInstance() {
   return instance;
 }
 
+static std::string FolderOf(const std::string& path) {
+  return path.substr(0, path.find_last_of(kPathSeparators) + 1);
+}
+
 void ProfileStore::Lock(const std::string& path) {
   if (Depth++ > 0) {
     return;
@@ -37,7 +42,7 @@ void ProfileStore::Lock(const std::string& path) {
   // An owner that died left the file whole, so that its guard is as good as a free one.
   ::WaitForSingleObject(Mutex.get(), INFINITE);
   Path = path;
-  Growing = path.substr(0, path.find_last_of(kPathSeparators) + 1) + ".History.tmp";
+  Growing = FolderOf(path) + ".History.tmp";
 }
 
 const std::string& ProfileStore::ForReading(const std::string& path) const {
@@ -57,7 +62,10 @@ std::string ProfileStore::ForWriting(const std::string& path) {
 void ProfileStore::MarkFailed() { Changes = State::kFailed; }
 
 // True with no copy too if there is nothing to copy yet.
-bool ProfileStore::MakeCopy() const {
+bool ProfileStore::MakeCopy() {
+  if (KindOf(Growing) == FileKind::kFolder) {  // an event can be called anything
+    Growing = FolderOf(Path) + ".History-" + std::to_string(::GetCurrentProcessId()) + ".tmp";
+  }
   RemoveFile(Growing);
   return ::CopyFileA(Path.c_str(), Growing.c_str(), /*bFailIfExists=*/1) != FALSE ||
          ::GetLastError() == ERROR_FILE_NOT_FOUND;

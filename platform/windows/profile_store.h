@@ -35,7 +35,7 @@ class ProfileStore {
   enum class State { kUnchanged, kChanged, kFailed };
 
   ProfileStore();
-  bool MakeCopy() const;
+  bool MakeCopy();
   bool Store() const;
 
   UniqueHandle Mutex;
