@@ -44,7 +44,7 @@ ProfileText::ProfileText(std::string text) : Text(std::move(text)) {
     const size_t close = isFirst ? header.rfind(']') : none;
     if (close != none) {
       const std::string_view name = TrimBlanks(header.substr(1, close - 1));
-      const size_t nameBegin = static_cast<size_t>(name.data() - all.data());
+      const auto nameBegin = static_cast<size_t>(name.data() - all.data());
       Sections.push_back({begin, next, name.empty() ? begin : nameBegin, name.size()});
     }
     bracket = all.find('[', next);
