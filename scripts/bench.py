@@ -189,8 +189,8 @@ def repeated_report(folder, events):
 
 def bench_report(folder, short):
     sizes = (100, 500) if short else (100, 1000, 2000)
-    for work, make, rounds in (("a first report, collecting", first_report, 2 if short else 5),
-                               ("a repeated report", repeated_report, 3 if short else 10)):
+    for work, make, rounds in (("a first report, collecting", first_report, 2 if short else 3),
+                               ("a repeated report", repeated_report, 3 if short else 7)):
         sides = [make(folder, events) for events in sizes]
         take_turns(sides, rounds)
         for side in sides[1:]:
