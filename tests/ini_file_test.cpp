@@ -25,6 +25,8 @@ TEST(IniFile, KeepsEveryValueOnOneLine) {
   EXPECT_EQ(file.GetSectionNames(), std::vector<std::string>{"a]b =c"});
   EXPECT_TRUE(file.WriteInt("S\n", "Number", -12));
   EXPECT_EQ(file.ReadInt("s\n", "NUMBER", 5), -12);
+  WriteFileText(file.Path, std::string("[S]\nKey=a\0b\n", 12));
+  EXPECT_EQ(file.ReadString("S", "Key", "", 256), "a");
   EXPECT_FALSE(CIniFile(scratch.In("missing/a.ini")).WriteInt("S", "K", 1));
 }
 

@@ -137,20 +137,20 @@ TEST_F(Zipper, AddsToAnArchiveReplacesItAndCloses) {
 }
 
 TEST_F(Zipper, PacksAThingBesideIt) {
-  Scratch.Make("v1.2/x.txt");
+  Scratch.Make("v1.2/x.y.txt");
   const fs::path before = fs::current_path();
   fs::current_path(Scratch.Root);
   EXPECT_TRUE(CZipper::ZipFolder("v1.2", /*ignorePath=*/false));
   fs::current_path(before);
   EXPECT_TRUE(CZipper::ZipFolder(Root + kPathSeparator, /*ignorePath=*/true));
-  EXPECT_TRUE(CZipper::ZipFile(File));
-  const std::string archive = Scratch.In("Tree/sub/b.zip");
+  EXPECT_TRUE(CZipper::ZipFile(Scratch.In("v1.2/x.y.txt")));
+  const std::string archive = Scratch.In("v1.2/x.y.zip");
   EXPECT_FALSE(CZipper::ZipFile(archive));
   EXPECT_FALSE(CZipper::ZipFile(Scratch.In("none/b.txt")));
   EXPECT_FALSE(CZipper::ZipFolder("", false));
-  EXPECT_EQ(ArchiveTree(Scratch.In("v1.2.zip")), "x.txt\n");
+  EXPECT_EQ(ArchiveTree(Scratch.In("v1.2.zip")), "x.y.txt\n");
   EXPECT_EQ(ArchiveTree(Scratch.In("Tree.zip")), "Tree/\na.txt\nsub/\nb.txt\nempty/\n");
-  EXPECT_EQ(ArchiveTree(archive), "b.txt\n");
+  EXPECT_EQ(ArchiveTree(archive), "x.y.txt\n");
 }
 
 }  // namespace

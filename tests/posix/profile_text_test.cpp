@@ -15,9 +15,9 @@ TEST(ProfileText, ReadsFilesEditedByHand) {
     std::optional<std::string_view> Value;
   } const cases[] = {
       {"first", "key", "a b"}, {" First ", " KEY ", "a b"}, {"first", "Empty", ""},
-      {"first", "a[b]", "c"},  {"first", "Comment", {}},    {"first", "Late", {}},
+      {"first", "a[b]", "c"},  {"first", "Comment", {}},    {"stray line", "Key", {}},
       {"first", "Signs", {}},  {"x]y", "Signs", "=a=b"},    {"LAST", "Open", "end"},
-      {"broken", "a[b]", {}},  {"none", "Key", {}},         {"stray line", "Key", {}},
+      {"broken", "a[b]", {}},  {"none", "Key", {}},         {"first", "Late", {}},
   };
   for (const auto& test : cases) {
     EXPECT_EQ(text.Find(test.Section, test.Key), test.Value) << test.Section << ' ' << test.Key;
