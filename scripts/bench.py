@@ -198,7 +198,8 @@ def bench_report(folder, short):
 
 
 def bench_archive(folder, short):
-    events, size = (100, 200000) if short else (1000, 200000)
+    events = 100 if short else 1000
+    size = 200000
     make_history(folder, events, "--log-bytes", str(size))
     history = folder / HISTORY
     (history / "History.ini").unlink()  # a report without it makes the archive and no summaries
@@ -270,9 +271,11 @@ def main():
     parser = argparse.ArgumentParser(description=__doc__,
                                      formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("--short", action="store_true", help="smaller sizes and fewer turns")
-    parser.add_argument("works", nargs="*", metavar="WORK", choices=[[], *WORKS],
-                        help="one of %s; all without any" % ", ".join(WORKS))
+    parser.add_argument("works", nargs="*", metavar="WORK",
+                        help="%s; all of them without any" % ", ".join(WORKS))
     options = parser.parse_args()
+    if not set(options.works) <= set(WORKS):
+        parser.error("a work is one of %s" % ", ".join(WORKS))
     heading()
     for name in options.works or WORKS:
         with tempfile.TemporaryDirectory(prefix="orx-bench-") as folder:
