@@ -1,4 +1,5 @@
 #include <algorithm>
+#include <iostream>
 #include <string_view>
 
 #include "app/install_history.h"
@@ -12,10 +13,14 @@ static bool IsHelp(std::string_view argument) {
   });
 }
 
-// Exit results: 0 to 2 as CInstallHistory::Run gives them, 3 for an archive that is not there.
+// Exit results: 0 to 2 as CInstallHistory::Run returns them, 3 for an archive that is not there.
 int main(int argc, char** argv) {
   if (argc == 2 && IsHelp(argv[1])) {
-    PrintUsage();
+    PrintHelp();
+    return 0;
+  }
+  if (argc == 2 && EqualsIgnoringCase("--version", argv[1])) {
+    std::cout << "ORXInstallEventLog " ORX_VERSION << std::endl;
     return 0;
   }
   const bool isReport = argc >= 2 && EqualsIgnoringCase("-report", argv[1]);

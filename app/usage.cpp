@@ -1,6 +1,11 @@
 #include "app/usage.h"
 
+#include <iomanip>
 #include <iostream>
+#include <string>
+
+#include "app/install_event.h"
+#include "app/options.h"
 
 void PrintUsage() {
   std::cout << "ORXInstallEventLog.exe -start|-end|-loglessage [EventID] " << std::endl;
@@ -12,4 +17,30 @@ void PrintUsage() {
   std::cout << "   {-ServiceLevel [ORXServiceLevel]}" << std::endl;
   std::cout << "   {-message [Message]} {-copyname [CopyName]} " << std::endl;
   std::cout << "   {-result [InstallationResult]}" << std::endl;
+}
+
+static void PrintHelpLine(std::string_view word, std::string_view value, std::string_view help) {
+  const std::string call = std::string(word) + ' ' + std::string(value);
+  std::cout << "  " << std::left << std::setw(24) << call << help << '\n';
+}
+
+void PrintHelp() {
+  PrintUsage();
+  std::cout << "\nOperations:\n";
+  for (const Option& option : Options()) {
+    if (option.Field == &CInstallEvent::EventID) {
+      PrintHelpLine(option.Word, option.Value, option.Help);
+    }
+  }
+  PrintHelpLine("-report", "ARCHIVE", "alone: packs the whole history into a zip archive");
+  PrintHelpLine("-help", "", "alone: this text");
+  PrintHelpLine("--version", "", "alone: name and version");
+  std::cout
+      << "\nOptions, each with one value, and the operations that use it. Case does not count;\n"
+         "of two the last counts; unknown words are skipped:\n";
+  for (const Option& option : Options()) {
+    if (option.Field != &CInstallEvent::EventID) {
+      PrintHelpLine(option.Word, option.Value, option.Help);
+    }
+  }
 }

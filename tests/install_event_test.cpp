@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "app/install_history.h"
+#include "app/options.h"
 #include "app/usage.h"
 #include "history/locations.h"
 #include "tests/fake_machine.h"
@@ -48,6 +49,18 @@ TEST(InstallEvent, HasAUsageText) {
   testing::internal::CaptureStdout();
   PrintUsage();
   EXPECT_EQ(testing::internal::GetCapturedStdout(), Golden("usage.txt"));
+}
+
+TEST(InstallEvent, HelpsWithTheOptionsThatItTakes) {
+  testing::internal::CaptureStdout();
+  PrintHelp();
+  const std::string help = testing::internal::GetCapturedStdout();
+  EXPECT_TRUE(help.starts_with(Golden("usage.txt") + "\n"));
+  for (const Option& option : Options()) {
+    const std::string line =
+        "\n  " + std::string(option.Word) + ' ' + std::string(option.Value) + ' ';
+    EXPECT_NE(help.find(line), std::string::npos) << line;
+  }
 }
 
 // A -start or an -end that names everything, each its own things.

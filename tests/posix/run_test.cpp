@@ -65,9 +65,10 @@ TEST_F(Run, GivesItsExitResults) {
     int Result;
     std::string OutputBegin;  // what prints touches no history
   } const cases[] = {
-      {"-help", 0, usage}, {"'/?'", 0, usage},     {"-report", 2, usage},
-      {"-start 7", 0, ""}, {"-END 8 -x", 0, ""},   {"", 2, ""},
-      {"-help -x", 2, ""}, {"-report a b", 2, ""}, {"-REPORT a.zip", 3, "There is no ORX"},
+      {"-help", 0, usage},     {"'/?'", 0, usage},      {"-report", 2, usage},
+      {"-start 7", 0, ""},     {"-END 8 -x", 0, ""},    {"", 2, ""},
+      {"--version", 0, usage}, {"--VERSION", 0, usage}, {"--version x", 2, ""},
+      {"-help -x", 2, ""},     {"-report a b", 2, ""},  {"-REPORT a.zip", 3, "There is no ORX"},
   };
   for (const auto& [arguments, result, outputBegin] : cases) {
     fs::remove_all(Root + "/ZEK");
