@@ -5,6 +5,7 @@
 #include "app/install_history.h"
 #include "app/usage.h"
 #include "platform/ascii_case.h"
+#include "platform/process_setup.h"
 
 static bool IsHelp(std::string_view argument) {
   constexpr std::string_view words[] = {"-help", "-h", "-?", "--help", "/?"};
@@ -15,6 +16,7 @@ static bool IsHelp(std::string_view argument) {
 
 // Exit results: 0 to 2 as CInstallHistory::Run returns them, 3 for an archive that is not there.
 int main(int argc, char** argv) {
+  PrepareProcess();
   if (argc == 2 && IsHelp(argv[1])) {
     PrintHelp();
     return 0;

@@ -6,7 +6,7 @@
 
 #include "fuzz/profile_model.h"
 #include "fuzz/require.h"
-#include "platform/posix/profile_text.h"
+#include "platform/profile_text.h"
 
 // The first line of the input is a program, the rest is a profile file. Three characters of the
 // program are a change: a section, a key and a value, by their numbers in the tables below, to

@@ -13,7 +13,7 @@
 #include "fuzz/require.h"
 #include "fuzz/words.h"
 #include "history/locations.h"
-#include "platform/posix/profile_text.h"
+#include "platform/profile_text.h"
 #include "tests/fake_machine.h"
 
 // The command lines of up to four runs over one new history: arguments with a NUL between them,

@@ -3,19 +3,13 @@
 #include <string_view>
 
 #include "platform/posix/profile_store.h"
-#include "platform/posix/profile_text.h"
-
-static std::string_view WithoutQuotes(std::string_view value) {
-  const bool isQuoted = value.size() >= 2 && value.front() == value.back() &&
-                        (value.front() == '"' || value.front() == '\'');
-  return isQuoted ? value.substr(1, value.size() - 2) : value;
-}
+#include "platform/profile_text.h"
 
 std::string ReadProfileValue(const std::string& path, const std::string& section,
                              const std::string& key, const std::string& fallback, uint32_t size) {
   const ProfileText* text = ProfileStore::GetInstance().Load(path);
   const auto value = text == nullptr ? std::nullopt : text->Find(section, key);
-  return std::string(value ? WithoutQuotes(*value) : fallback).substr(0, size - 1);
+  return std::string(value.value_or(fallback)).substr(0, size - 1);
 }
 
 bool WriteProfileValue(const std::string& path, const std::string& section, const std::string& key,
@@ -37,7 +31,7 @@ int32_t ReadProfileInt(const std::string& path, const std::string& section, cons
   if (!value) {
     return fallback;
   }
-  std::string_view digits = WithoutQuotes(*value);
+  std::string_view digits = *value;
   const bool isNegative = digits.starts_with('-');
   if (isNegative) {
     digits.remove_prefix(1);

@@ -6,7 +6,7 @@
 #include <string>
 
 #include "platform/posix/descriptor.h"
-#include "platform/posix/profile_text.h"
+#include "platform/profile_text.h"
 
 // The profile file that this process used last, parsed, and the lock on its folder.
 //

@@ -12,7 +12,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/posix/profile_text.h"
+#include "platform/profile_text.h"
 #include "tests/archive_reader.h"
 
 namespace {

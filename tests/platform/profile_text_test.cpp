@@ -1,4 +1,4 @@
-#include "platform/posix/profile_text.h"
+#include "platform/profile_text.h"
 
 #include <gtest/gtest.h>
 
@@ -8,21 +8,35 @@ TEST(ProfileText, ReadsFilesEditedByHand) {
   const ProfileText text(
       "\xEF\xBB\xBF[first]\r\nstray line\r\nKey = a b \t\r\nEmpty=\nkey=second of its name\n"
       "; Comment=1\n\n[broken\na[b]=c\n  [ x]y ] behind\nSigns==a=b\n[]\n[FIRST]\nLate=1\n"
-      "[last]\nOpen=end");
+      "[last]\nQuoted = \" q\"\" \nOpen=end");
   struct {
     const char* Section;
     const char* Key;
     std::optional<std::string_view> Value;
   } const cases[] = {
-      {"first", "key", "a b"}, {" First ", " KEY ", "a b"}, {"first", "Empty", ""},
-      {"first", "a[b]", "c"},  {"first", "Comment", {}},    {"stray line", "Key", {}},
-      {"first", "Signs", {}},  {"x]y", "Signs", "=a=b"},    {"LAST", "Open", "end"},
-      {"broken", "a[b]", {}},  {"none", "Key", {}},         {"first", "Late", {}},
+      {"first", "key", "a b"},    {" First ", " KEY ", "a b"}, {"first", "Empty", ""},
+      {"first", "a[b]", "c"},     {"first", "Comment", {}},    {"stray line", "Key", {}},
+      {"first", "Signs", {}},     {"x]y", "Signs", "=a=b"},    {"LAST", "Open", "end"},
+      {"broken", "a[b]", {}},     {"none", "Key", {}},         {"first", "Late", {}},
+      {"last", "Quoted", " q\""},
   };
   for (const auto& test : cases) {
     EXPECT_EQ(text.Find(test.Section, test.Key), test.Value) << test.Section << ' ' << test.Key;
   }
   EXPECT_EQ(text.SectionNames(), (std::vector<std::string_view>{"first", "x]y", "FIRST", "last"}));
+}
+
+TEST(ProfileText, ListsItsSectionsAndLines) {
+  const ProfileText text(
+      "before=1\n[A]\r\n Key = 'v' \r\n\n; c\nno sign\n=x\nkey=2\n[]\nk=\n[a]\n[End]\nlast = \" w");
+  std::string listing;
+  for (size_t i = 0; i < text.SectionCount(); ++i) {
+    listing.append("[").append(text.NameOf(i)).append("]");
+    for (const auto& [key, value] : text.LinesOf(i)) {
+      listing.append(key).append("<").append(value).append(">");
+    }
+  }
+  EXPECT_EQ(listing, "[A]Key<v><x>key<2>[]k<>[a][End]last<\" w>");
 }
 
 TEST(ProfileText, ChangesNothingButTheKey) {

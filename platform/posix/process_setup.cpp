@@ -1,0 +1,23 @@
+#include "platform/process_setup.h"
+
+#include <fcntl.h>
+#include <unistd.h>
+
+#include <csignal>
+
+#include "platform/posix/descriptor.h"
+
+// The system hands out the lowest number that is free.
+static void OpenStandardDescriptors() {
+  int number = 0;
+  while (number >= 0 && number <= STDERR_FILENO) {
+    number = RetryOnInterrupt([] { return ::open("/dev/null", O_RDWR); });
+  }
+  const Descriptor notNeeded(number);
+}
+
+void PrepareProcess() {
+  OpenStandardDescriptors();
+  std::signal(SIGPIPE, SIG_IGN);
+  std::signal(SIGXFSZ, SIG_IGN);
+}
