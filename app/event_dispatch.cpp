@@ -4,6 +4,7 @@
 #include "history/timestamp.h"
 #include "inventory/computer_info.h"
 #include "platform/files.h"
+#include "platform/path.h"
 #include "platform/profile_file.h"
 
 static void WriteComputerInfo() {

@@ -4,6 +4,7 @@
 
 #include "app/options.h"
 #include "history/locations.h"
+#include "platform/path.h"
 
 CInstallEvent::CInstallEvent(int argc, char** argv) : Ini(GetHistoryFilePath()) {
   ParseOptions(argc, argv);

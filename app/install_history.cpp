@@ -5,6 +5,7 @@
 #include "app/install_event.h"
 #include "history/ini_file.h"
 #include "history/locations.h"
+#include "platform/path.h"
 #include "platform/profile_file.h"
 
 CInstallHistory::CInstallHistory() { ReadCount(); }

@@ -3,6 +3,7 @@
 #include "app/install_event.h"
 #include "history/locations.h"
 #include "platform/files.h"
+#include "platform/path.h"
 
 void CInstallEvent::PlaceEventLog() {
   if (CopyName.empty() || LeadsOutOfHistory(CopyName) || LeadsOutOfHistory(EventID)) {

@@ -29,7 +29,7 @@ bool IsSlash(char c) { return c == '/'; }
 void CheckParts(const std::string& path) {
   const std::string folder = FolderPart(path);
   const std::string name = BaseName(path);
-  Require(folder + name == path && MakePath(folder, name) == path);
+  Require(folder + name == path && JoinPath(folder, name) == path);
   Require(folder.empty() || folder.back() == '/');
   Require(name.find('/') == std::string::npos && BaseName(name) == name);
 
@@ -53,7 +53,7 @@ void CheckTrimming(const std::string& text) {
 }
 
 void CheckJoining(const std::string& folder, const std::string& name) {
-  const std::string path = MakePath(folder, name);
+  const std::string path = JoinPath(folder, name);
   Require(path.starts_with(folder) && path.ends_with(name));
   Require(path.size() <= folder.size() + name.size() + 1);
   Require(CutFolder(path, folder) == path.substr(folder.size()));
@@ -87,7 +87,7 @@ void CheckArchive(const std::string& root, const std::string& path, const std::s
     expected.push_back(TrimmedName(path));
   }
   if (zipper.AddFileWithFolder(source, second)) {
-    expected.push_back(TrimmedName(MakePath(second, "file.txt")));
+    expected.push_back(TrimmedName(JoinPath(second, "file.txt")));
   }
   Require(zipper.AddFile(source));
   expected.push_back("file.txt");

@@ -8,6 +8,7 @@
 #include "fuzz/require.h"
 #include "fuzz/words.h"
 #include "history/locations.h"
+#include "platform/path.h"
 #include "platform/profile_file.h"
 #include "tests/fake_machine.h"
 

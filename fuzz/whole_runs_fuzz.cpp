@@ -13,6 +13,7 @@
 #include "fuzz/require.h"
 #include "fuzz/words.h"
 #include "history/locations.h"
+#include "platform/path.h"
 #include "platform/profile_text.h"
 #include "tests/fake_machine.h"
 

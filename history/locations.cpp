@@ -19,11 +19,7 @@ std::string GetHistoryDir() {
 
 std::string GetHistoryFilePath() { return JoinPath(GetHistoryDir(), "History.ini"); }
 
-std::string JoinPath(const std::string& folder, const std::string& name) {
-  return folder + kPathSeparator + name;
-}
-
-// Windows drops blanks and points from the end of a part, so that ".. " leads up as well.
+// Windows drops blanks and points from the end of a part: ".. " leads up too.
 static bool LeadsUp(std::string_view part) {
   return std::count(part.begin(), part.end(), '.') >= 2 &&
          part.find_first_not_of(". ") == std::string_view::npos;
@@ -33,19 +29,19 @@ bool LeadsOutOfHistory(const std::string& name) {
   if (IsRootedPath(name)) {
     return true;
   }
-  bool exists = true;  // what stands before the part; below what does not, nothing is a link
+  bool exists = true;  // false once a parent is missing: nothing below it can be a link
   for (size_t begin = 0; begin <= name.size();) {
-    const size_t end = std::min(name.find_first_of(kPathSeparators, begin), name.size());
+    const size_t end = std::min(FindSeparator(name, begin), name.size());
     const std::string_view part = std::string_view(name).substr(begin, end - begin);
-    if (LeadsUp(part)) {
+    if (LeadsUp(part) || !IsKeptName(part)) {
       return true;
     }
     if (exists) {
-      const std::string place = JoinPath(GetHistoryDir(), name.substr(0, end));
-      if (IsSymbolicLink(place)) {
+      const std::string path = JoinPath(GetHistoryDir(), name.substr(0, end));
+      if (IsSymbolicLink(path)) {
         return true;
       }
-      exists = KindOf(place) != FileKind::kNone;
+      exists = KindOf(path) != FileKind::kNone;
     }
     begin = end + 1;
   }

@@ -14,9 +14,6 @@ std::string GetHistoryDir();
 // The history file, History.ini in the history folder.
 std::string GetHistoryFilePath();
 
-// The two parts with one separator between them, whatever they hold.
-std::string JoinPath(const std::string& folder, const std::string& name);
-
 // True if a name, put below the history folder, would lead out of it: a rooted path, one with a
 // part "..", or one with a part that is a symbolic link there. Such a name is treated as a folder
 // that cannot be made and a file that cannot be opened.

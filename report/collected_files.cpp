@@ -41,7 +41,7 @@ void CopyFilesOf(CInstallEvent& event, std::vector<CollectedFile>& collected) {
   const std::string folder = copyName.empty() ? event.EventID : JoinPath(copyName, event.EventID);
   for (const FileKey& key : fileKeys) {
     const std::string source = (event.*key.Get)();
-    const std::string name = JoinPath(folder, source.substr(source.rfind(kPathSeparator) + 1));
+    const std::string name = JoinPath(folder, BaseName(source));
     if (CopyIntoHistory(source, name)) {
       collected.push_back({event, key, source, JoinPath(GetHistoryDir(), name)});
     }

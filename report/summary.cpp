@@ -6,6 +6,7 @@
 #include "app/install_history.h"
 #include "history/locations.h"
 #include "platform/files.h"
+#include "platform/path.h"
 #include "report/collected_files.h"
 #include "report/copy_events.h"
 

@@ -13,10 +13,13 @@ std::string TrimTail(const std::string& text) {
   while (rest.size() > 1 && whiteSpace.find(rest.back()) != std::string_view::npos) {
     rest.remove_suffix(1);
   }
-  while (rest.size() > 1 && rest.back() == kPathSeparator) {
-    rest.remove_suffix(1);
+  const size_t last = rest.find_last_not_of(kPathSeparator);
+  if (last == std::string_view::npos) {
+    return std::string(rest.substr(0, 1));
   }
-  return std::string(rest);
+  // After a lead byte, the first "separator" is the second byte of a character.
+  const bool isTrimmed = EndsWithSeparator(rest.substr(0, last + 2));
+  return std::string(rest.substr(0, isTrimmed ? last + 1 : last + 2));
 }
 
 std::string TrimHead(const std::string& text) {
@@ -25,27 +28,6 @@ std::string TrimHead(const std::string& text) {
   rest.remove_prefix(std::min(rest.find_first_not_of(kPathSeparator), rest.size()));
   return std::string(rest);
 }
-
-static bool IsSeparator(char c) { return kPathSeparators.find(c) != std::string_view::npos; }
-
-std::string MakePath(const std::string& folder, const std::string& name) {
-  const bool needsSeparator = !folder.empty() && !IsSeparator(folder.back());
-  return needsSeparator ? folder + kPathSeparator + name : folder + name;
-}
-
-// Where the last part begins: behind the last separator, or behind the drive's colon. A path can be
-// rooted without a leading separator only on a system with drives.
-static size_t LastPart(const std::string& path) {
-  const size_t separator = path.find_last_of(kPathSeparators);
-  if (separator != std::string::npos) {
-    return separator + 1;
-  }
-  return IsRootedPath(path) && path.find(':') == 1 ? 2 : 0;
-}
-
-std::string FolderPart(const std::string& path) { return path.substr(0, LastPart(path)); }
-
-std::string BaseName(const std::string& path) { return path.substr(LastPart(path)); }
 
 std::string ReplaceExtension(const std::string& path, const std::string& extension) {
   const std::string name = BaseName(path);

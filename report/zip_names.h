@@ -13,16 +13,6 @@ std::string TrimTail(const std::string& text);
 // The text without the white space at its start and then without the separators there.
 std::string TrimHead(const std::string& text);
 
-// The folder and the name with a separator between them, unless the folder ends with one. An empty
-// folder adds none, an empty name nothing behind it.
-std::string MakePath(const std::string& folder, const std::string& name);
-
-// The path up to its last part, the separator (or drive) at its end included; perhaps empty.
-std::string FolderPart(const std::string& path);
-
-// The last part of the path; empty if the path ends in a separator.
-std::string BaseName(const std::string& path);
-
 // The path with the extension, with its point, in place of that of its last part.
 std::string ReplaceExtension(const std::string& path, const std::string& extension);
 

@@ -51,7 +51,7 @@ bool CZipper::Open(const char* archivePath, const char* rootFolder, bool append)
     return false;
   }
   ArchivePath = *path;
-  RootFolder = TrimTail(rootFolder == nullptr ? FolderPart(*path) : MakePath(rootFolder, ""));
+  RootFolder = TrimTail(rootFolder == nullptr ? FolderPart(*path) : JoinPath(rootFolder, ""));
   return true;
 }
 
@@ -75,7 +75,7 @@ bool CZipper::AddFileWithFolder(const std::string& path, const std::string& fold
   if (ZipHandle == nullptr || IsRootedPath(folder)) {
     return false;
   }
-  return PackFile(SourcePath(path), MakePath(folder, BaseName(path)), AttributeWord(path));
+  return PackFile(SourcePath(path), JoinPath(folder, BaseName(path)), AttributeWord(path));
 }
 
 bool CZipper::AddBuffer(const void* data, uint32_t size, const std::string& name) {
@@ -119,7 +119,7 @@ void CZipper::AddContents(const std::string& folder, bool ignorePath) {
     if (entry.Name.starts_with('.')) {
       continue;
     }
-    const std::string path = MakePath(folder, entry.Name);
+    const std::string path = JoinPath(folder, entry.Name);
     if ((entry.Attributes & kFolderAttribute) != 0) {
       AddFolder(path, ignorePath);
     } else {
@@ -154,7 +154,7 @@ bool CZipper::ZipFile(const std::string& path) {
 }
 
 std::string CZipper::SourcePath(const std::string& path) const {
-  return IsRootedPath(path) ? path : MakePath(RootFolder, path);
+  return IsRootedPath(path) ? path : JoinPath(RootFolder, path);
 }
 
 std::optional<std::string> CZipper::FileEntryName(const std::string& path, bool ignorePath) const {

@@ -11,6 +11,7 @@
 #include "history/locations.h"
 #include "inventory/service_list.h"
 #include "inventory/software_list.h"
+#include "platform/path.h"
 #include "tests/fake_machine.h"
 
 namespace {

@@ -4,6 +4,7 @@
 
 #include "history/locations.h"
 #include "inventory/service_list.h"
+#include "platform/path.h"
 #include "products/copy_generation.h"
 #include "products/products_list.h"
 #include "products/registry_value.h"

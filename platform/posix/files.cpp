@@ -7,6 +7,7 @@
 
 #include <cstdio>
 
+#include "platform/path.h"
 #include "platform/posix/descriptor.h"
 #include "platform/posix/file_calls.h"
 
@@ -86,7 +87,7 @@ bool CopyToNewFile(const std::string& source, const std::string& target) {
   if (!from.IsOpen() || !StatusOf(from, status) || !S_ISREG(status.st_mode)) {
     return false;
   }
-  const std::string folder = target.substr(0, target.rfind('/') + 1);
+  const std::string folder = FolderPart(target);
   const std::string growing = folder + ".copy-" + std::to_string(::getpid()) + ".tmp";
   RemoveFile(growing);  // of a killed process that had the same ID
   const Descriptor to(RetryOnInterrupt(

@@ -7,7 +7,13 @@
 const char kPathSeparator = '/';
 const std::string_view kPathSeparators = "/";
 
+bool IsLeadByte(char /*byte*/) { return false; }
+
 bool IsRootedPath(const std::string& path) { return path.starts_with('/'); }
+
+bool IsKeptName(std::string_view /*part*/) { return true; }
+
+bool FitsPathLimit(const std::string& path) { return path.size() < PATH_MAX; }
 
 std::optional<std::string> AbsolutePath(const std::string& path) {
   if (path.empty()) {

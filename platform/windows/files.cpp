@@ -60,8 +60,8 @@ bool MoveFolder(const std::string& source, const std::string& target) {
 }
 
 bool CopyToNewFile(const std::string& source, const std::string& target) {
-  const std::string folder = target.substr(0, target.find_last_of(kPathSeparators) + 1);
-  const std::string growing = folder + ".copy-" + std::to_string(::GetCurrentProcessId()) + ".tmp";
+  const std::string growing =
+      FolderPart(target) + ".copy-" + std::to_string(::GetCurrentProcessId()) + ".tmp";
   RemoveFile(growing);  // of a killed process that had the same ID
   if (::CopyFileA(source.c_str(), growing.c_str(), /*bFailIfExists=*/1) != FALSE &&
       ::MoveFileA(growing.c_str(), target.c_str()) != FALSE) {

@@ -31,10 +31,6 @@ ProfileStore& ProfileStore::GetInstance() {
   return instance;
 }
 
-static std::string FolderOf(const std::string& path) {
-  return path.substr(0, path.find_last_of(kPathSeparators) + 1);
-}
-
 void ProfileStore::Lock(const std::string& path) {
   if (Depth++ > 0) {
     return;
@@ -42,7 +38,7 @@ void ProfileStore::Lock(const std::string& path) {
   // An owner that died left the file whole, so that its guard is as good as a free one.
   ::WaitForSingleObject(Mutex.get(), INFINITE);
   Path = path;
-  Growing = FolderOf(path) + ".History.tmp";
+  Growing = FolderPart(path) + ".History.tmp";
 }
 
 const std::string& ProfileStore::ForReading(const std::string& path) const {
@@ -64,7 +60,7 @@ void ProfileStore::MarkFailed() { Changes = State::kFailed; }
 // True with no copy too if there is nothing to copy yet.
 bool ProfileStore::MakeCopy() {
   if (KindOf(Growing) == FileKind::kFolder) {  // an event can be called anything
-    Growing = FolderOf(Path) + ".History-" + std::to_string(::GetCurrentProcessId()) + ".tmp";
+    Growing = FolderPart(Path) + ".History-" + std::to_string(::GetCurrentProcessId()) + ".tmp";
   }
   RemoveFile(Growing);
   return ::CopyFileA(Path.c_str(), Growing.c_str(), /*bFailIfExists=*/1) != FALSE ||

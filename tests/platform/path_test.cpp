@@ -1,0 +1,68 @@
+// platform/path.h. Under Wine these run with several code pages.
+
+#include "platform/path.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+const bool isWindows = kPathSeparator == '\\';
+
+// A character whose second byte equals a backslash in the Japanese code page; elsewhere its bytes
+// are two characters, and on Windows the second one is a separator.
+const std::string hyou = "\x95\x5C";
+const bool isOneCharacter = IsLeadByte(hyou[0]) || !isWindows;
+
+std::string Native(std::string path) {
+  for (char& c : path) {
+    c = c == '/' ? kPathSeparator : c;
+  }
+  return path;
+}
+
+TEST(Path, IsSplitAtItsLastSeparator) {
+  struct {
+    std::string Path, Folder, Name;
+  } const cases[] = {
+      {"", "", ""},         {"a", "", "a"}, {"a/b", "a/", "b"},
+      {"a/b/", "a/b/", ""}, {"/", "/", ""}, {"a//b", "a//", "b"},
+  };
+  for (const auto& [path, folder, name] : cases) {
+    EXPECT_EQ(FolderPart(Native(path)), Native(folder)) << path;
+    EXPECT_EQ(BaseName(Native(path)), Native(name)) << path;
+    EXPECT_EQ(JoinPath(Native(folder), Native(name)), Native(path)) << path;
+  }
+}
+
+TEST(Path, KeepsTheSecondByteOfACharacter) {
+  const std::string name = "a" + hyou + ".log";
+  const std::string path = JoinPath(hyou, name);
+  EXPECT_EQ(path, isOneCharacter ? hyou + kPathSeparator + name : hyou + name);
+  EXPECT_EQ(BaseName(path), isOneCharacter ? name : ".log");
+  EXPECT_EQ(FolderPart(path) + BaseName(path), path);
+  EXPECT_EQ(EndsWithSeparator(hyou), !isOneCharacter);
+  EXPECT_TRUE(EndsWithSeparator(hyou + kPathSeparator));
+  EXPECT_EQ(FindSeparator(path), isOneCharacter ? 2U : 1U);
+}
+
+TEST(Path, HasNamesThatTheSystemChanges) {
+  for (const char* name : {"", ".", "..", "42", "a b", ".a", "a.b", "CONSOLE", "COM", "COM12",
+                           "LPTx", "aux1", "NULL.txt", "a[1]=b;c"}) {
+    EXPECT_TRUE(IsKeptName(name)) << name;
+  }
+  for (const char* name :
+       {"a.",      "a ",     "a. .", "...",      ". ",   " ",      "CON",     "nul",
+        "aux.txt", "Prn .a", "COM1", "lpt9.log", "COM0", "conin$", "CONOUT$", "a:b",
+        "a*",      "a?",     "a<b",  "a>b",      "a\"b", "a|b",    "a\tb"}) {
+    EXPECT_EQ(IsKeptName(name), !isWindows) << name;
+  }
+}
+
+TEST(Path, HasALimit) {
+  const std::string root = isWindows ? "C:\\" : "/";
+  const size_t longest = isWindows ? 259 : 4095;
+  EXPECT_TRUE(FitsPathLimit(root + std::string(longest - root.size(), 'x')));
+  EXPECT_FALSE(FitsPathLimit(root + std::string(longest + 1 - root.size(), 'x')));
+}
+
+}  // namespace
