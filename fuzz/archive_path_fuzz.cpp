@@ -13,7 +13,7 @@
 #include "platform/path.h"
 #include "report/zip_names.h"
 #include "report/zipper.h"
-#include "tests/fake_machine.h"
+#include "tests/support/scratch_history.h"
 
 // A path and a second one, with a NUL between them: how they are taken apart and put together,
 // whether they stay below the history folder, and, for one input in sixteen, what names they give

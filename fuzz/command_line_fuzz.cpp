@@ -10,7 +10,8 @@
 #include "history/locations.h"
 #include "platform/path.h"
 #include "platform/profile_file.h"
-#include "tests/fake_machine.h"
+#include "tests/support/run_tool.h"
+#include "tests/support/scratch_history.h"
 
 // Arguments with a NUL between them, and the record that is made of them: every field is what a
 // plain walk finds, and what is stored of it reads back by the rules of profile files. There is no

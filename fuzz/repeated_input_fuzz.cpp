@@ -11,7 +11,7 @@
 #include "platform/profile_text.h"
 #include "platform/posix/registry_export.h"
 #include "report/zip_names.h"
-#include "tests/fake_machine.h"
+#include "tests/support/scratch_history.h"
 
 // A head and a unit, with a NUL between them: the head is followed by as many units as make a large
 // text, which is given to every reader. What takes time by the square of the length, and so would

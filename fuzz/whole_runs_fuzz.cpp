@@ -15,7 +15,8 @@
 #include "history/locations.h"
 #include "platform/path.h"
 #include "platform/profile_text.h"
-#include "tests/fake_machine.h"
+#include "tests/support/run_tool.h"
+#include "tests/support/scratch_history.h"
 
 // The command lines of up to four runs over one new history: arguments with a NUL between them,
 // runs with an RS (0x1E). After each run the history file is byte for byte that of a model, the

@@ -5,7 +5,8 @@
 #include <sstream>
 
 #include "inventory/process_list.h"
-#include "tests/fake_machine.h"
+#include "tests/support/fake_machine.h"
+#include "tests/support/file_text.h"
 
 namespace {
 

@@ -2,28 +2,20 @@
 
 #include <gtest/gtest.h>
 
-#include <fstream>
 #include <iomanip>
-#include <iterator>
-#include <regex>
 
 #include "eventlog/logger.h"
-#include "history/locations.h"
 #include "inventory/service_list.h"
 #include "inventory/software_list.h"
-#include "platform/path.h"
-#include "tests/fake_machine.h"
+#include "tests/support/fake_machine.h"
+#include "tests/support/run_tool.h"
+#include "tests/support/scratch_history.h"
 
 namespace {
 
-std::string Golden(const std::string& name) { return FileText(JoinPath(ORX_GOLDEN_FOLDER, name)); }
-
-// The report of an event, with a mark in place of each time stamp: these are all that differs
-// between two runs over the same machine. The line ends are those of the system.
-std::string Report(const std::string& place) {
-  std::ifstream file(JoinPath(JoinPath(GetHistoryDir(), place), "ORXInstallEvent.Log"));
-  const std::string text(std::istreambuf_iterator<char>(file), {});
-  return std::regex_replace(text, std::regex("[0-9]{8} [0-9]{2}:[0-9]{2}:[0-9]{2}"), "<time>");
+// The report of an event as it is in the golden files.
+std::string Report(const std::string& path) {
+  return WithoutTimes(Replaced(FileText(InHistory(path + "/ORXInstallEvent.Log")), "\r\n", "\n"));
 }
 
 void SetSystem(uint8_t productType) {
@@ -73,7 +65,7 @@ TEST(EventReport, IsTheGoldenOne) {
   Machine().ProcessIDs.reset();
   EXPECT_EQ(
       RunTool({"-end", "42", "-Result", "Successful", "-CopyName", "C1", "-Action", "Update"}), 0);
-  EXPECT_EQ(Report(JoinPath("C1", "42")), Golden("ORXInstallEvent.Log"));
+  EXPECT_EQ(Report("C1/42"), Golden("ORXInstallEvent.Log"));
 }
 
 // The rows of the user, software and service tables turn left adjustment on for all that follows.

@@ -4,7 +4,7 @@
 
 #include <algorithm>
 
-#include "tests/fake_machine.h"
+#include "tests/support/scratch_history.h"
 
 namespace {
 

@@ -12,7 +12,8 @@
 #include "app/options.h"
 #include "app/usage.h"
 #include "history/locations.h"
-#include "tests/fake_machine.h"
+#include "tests/support/run_tool.h"
+#include "tests/support/scratch_history.h"
 
 namespace {
 

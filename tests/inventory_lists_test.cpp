@@ -8,7 +8,9 @@
 #include "products/copy_generation.h"
 #include "products/products_list.h"
 #include "products/registry_value.h"
-#include "tests/fake_machine.h"
+#include "tests/support/fake_machine.h"
+#include "tests/support/file_text.h"
+#include "tests/support/run_tool.h"
 
 namespace {
 
@@ -57,7 +59,7 @@ TEST(Lists, TakeTheOldCopyInItsOwnCaseOnly) {
 
 TEST(Lists, AppendTheCopiesOfTheLayoutInForce) {
   Machine() = FakeMachine();
-  Machine().Load(FileText(JoinPath(ORX_GOLDEN_FOLDER, "registry_added.txt")));
+  Machine().Load(Golden("registry_added.txt"));
   CORXProductsList list;
   for (const int32_t generation : {0, 1, 1}) {
     SetCopyGeneration(generation);

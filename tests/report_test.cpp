@@ -7,8 +7,9 @@
 
 #include "app/install_history.h"
 #include "history/locations.h"
-#include "tests/archive_reader.h"
-#include "tests/fake_machine.h"
+#include "tests/support/archive_reader.h"
+#include "tests/support/run_tool.h"
+#include "tests/support/scratch_history.h"
 
 namespace {
 

@@ -9,8 +9,8 @@
 #include "history/locations.h"
 #include "platform/path.h"
 #include "report/zip_names.h"
-#include "tests/archive_reader.h"
-#include "tests/fake_machine.h"
+#include "tests/support/archive_reader.h"
+#include "tests/support/scratch_history.h"
 
 namespace {
 

@@ -1,24 +1,23 @@
-// platform/path.h. Under Wine these run with several code pages.
+// Under Wine these run with several code pages.
 
 #include "platform/path.h"
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
+
+#include "tests/platform/contract.h"
+
 namespace {
 
-const bool isWindows = kPathSeparator == '\\';
+namespace fs = std::filesystem;
 
 // A character whose second byte equals a backslash in the Japanese code page; elsewhere its bytes
 // are two characters, and on Windows the second one is a separator.
 const std::string hyou = "\x95\x5C";
 const bool isOneCharacter = IsLeadByte(hyou[0]) || !isWindows;
 
-std::string Native(std::string path) {
-  for (char& c : path) {
-    c = c == '/' ? kPathSeparator : c;
-  }
-  return path;
-}
+std::string Native(const std::string& path) { return Replaced(path, "/", {kPathSeparator}); }
 
 TEST(Path, IsSplitAtItsLastSeparator) {
   struct {
@@ -63,6 +62,19 @@ TEST(Path, HasALimit) {
   const size_t longest = isWindows ? 259 : 4095;
   EXPECT_TRUE(FitsPathLimit(root + std::string(longest - root.size(), 'x')));
   EXPECT_FALSE(FitsPathLimit(root + std::string(longest + 1 - root.size(), 'x')));
+}
+
+TEST(Path, IsMadeAbsolute) {
+  const std::string here = fs::current_path().string();
+  EXPECT_TRUE(IsRootedPath(here));
+  EXPECT_FALSE(IsRootedPath("a"));
+  EXPECT_EQ(AbsolutePath("a"), here + kPathSeparator + "a");
+  EXPECT_EQ(AbsolutePath(""), std::nullopt);
+  // The longest path that a buffer of 260 bytes holds; POSIX has no such limit.
+  const std::string root = isWindows ? "C:\\" : "/";
+  const std::string longest = root + std::string(259 - root.size(), 'x');
+  EXPECT_EQ(AbsolutePath(longest), longest);
+  EXPECT_EQ(AbsolutePath(longest + 'x').has_value(), !isWindows);
 }
 
 }  // namespace

@@ -6,9 +6,9 @@
 #include <climits>
 #include <cstdlib>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <regex>
+
+#include "tests/support/scratch_folder.h"
 
 namespace {
 
@@ -16,20 +16,16 @@ constexpr const char* wrapper = "/usr/lib/x86_64-linux-gnu/libnss_wrapper.so";
 
 // What the report says of them, without the rules of its tables.
 std::string ReportOver(const std::string& passwd, const std::string& group) {
-  char folder[] = "/tmp/orx-accounts-XXXXXX";
-  EXPECT_NE(::mkdtemp(folder), nullptr);
-  const std::string root = folder;
-  std::ofstream(root + "/passwd") << passwd;
-  std::ofstream(root + "/group") << group;
+  const ScratchFolder scratch;
+  scratch.Make("passwd", passwd);
+  scratch.Make("group", group);
   // The sanitizer's library wants to be the first that is loaded.
   const std::string command =
       "ASAN_OPTIONS=verify_asan_link_order=0 LD_PRELOAD=" + std::string(wrapper) +
-      " NSS_WRAPPER_PASSWD=" + root + "/passwd NSS_WRAPPER_GROUP=" + root +
-      "/group ORX_COMMON_APPDATA=" + root + " " ORX_PROGRAM " -start 1";
+      " NSS_WRAPPER_PASSWD=" + scratch.In("passwd") + " NSS_WRAPPER_GROUP=" + scratch.In("group") +
+      " ORX_COMMON_APPDATA=" + scratch.Root + " " ORX_PROGRAM " -start 1";
   EXPECT_EQ(std::system(command.c_str()), 0);
-  std::ifstream report(root + "/ZEK/ORXHistory/1/ORXInstallEvent.Log");
-  const std::string text(std::istreambuf_iterator<char>(report), {});
-  std::filesystem::remove_all(root);
+  const std::string text = FileText(scratch.In("ZEK/ORXHistory/1/ORXInstallEvent.Log"));
   const size_t begin = text.find("Logged on User:");
   const std::string section = text.substr(begin, text.find("2) Software") - begin);
   return std::regex_replace(section, std::regex("[-=]{35,}\n"), "");

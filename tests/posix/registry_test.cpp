@@ -13,6 +13,7 @@
 #include <regex>
 
 #include "platform/posix/registry_export.h"
+#include "tests/support/file_text.h"
 
 namespace {
 
@@ -21,10 +22,7 @@ using namespace std::string_literals;
 
 const std::string header = "Windows Registry Editor Version 5.00\n\n";
 
-std::string Case(const std::string& name) {
-  std::ifstream file(ORX_REGISTRY_CASES "/" + name, std::ios::binary);
-  return {std::istreambuf_iterator<char>(file), {}};
-}
+std::string Case(const std::string& name) { return FileText(ORX_REGISTRY_CASES "/" + name); }
 
 ByteReader ReaderOf(const std::string& bytes) {
   return [&bytes](uint64_t offset, char* buffer, size_t size) {

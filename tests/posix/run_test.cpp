@@ -7,39 +7,24 @@
 #include <algorithm>
 #include <cstdlib>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <string>
 #include <vector>
 
 #include "platform/profile_text.h"
-#include "tests/archive_reader.h"
+#include "tests/support/archive_reader.h"
+#include "tests/support/scratch_folder.h"
 
 namespace {
 
 namespace fs = std::filesystem;
 using namespace std::string_literals;
 
-std::string Text(const std::string& path) {
-  std::ifstream file(path, std::ios::binary);
-  return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
-}
-
-void Write(const std::string& path, const std::string& text) {
-  std::ofstream(path, std::ios::binary) << text;
-}
-
-class Run : public testing::Test {
+class Run : public testing::Test, protected ScratchFolder {
  protected:
   void SetUp() override {
-    char name[] = "/tmp/orx-run-XXXXXX";
-    ASSERT_NE(::mkdtemp(name), nullptr);
-    Root = name;
-    ::setenv("ORX_COMMON_APPDATA", name, /*overwrite=*/1);
-    History = Root + "/ZEK/ORXHistory/";
-    fs::create_directories(History);
+    ::setenv("ORX_COMMON_APPDATA", Root.c_str(), /*overwrite=*/1);
+    Make("ZEK/ORXHistory/");
   }
-  void TearDown() override { fs::remove_all(Root); }
 
   // The result of a script, which runs in the scratch folder and ends at the first failure. It
   // finds the program as $ORX, which cannot wait for ever, as for the other end of a pipe.
@@ -52,10 +37,9 @@ class Run : public testing::Test {
   // The program's result; its output goes to the file "output".
   int Call(const std::string& arguments) const { return Shell("$ORX " + arguments + " >output"); }
 
-  ProfileText HistoryFile() const { return ProfileText(Text(History + "History.ini")); }
+  ProfileText HistoryFile() const { return ProfileText(FileText(History + "History.ini")); }
 
-  std::string Root;
-  std::string History;
+  const std::string History = In("ZEK/ORXHistory/");
 };
 
 TEST_F(Run, GivesItsExitResults) {
@@ -73,12 +57,12 @@ TEST_F(Run, GivesItsExitResults) {
   for (const auto& [arguments, result, outputBegin] : cases) {
     fs::remove_all(Root + "/ZEK");
     EXPECT_EQ(Call(arguments), result) << arguments;
-    EXPECT_EQ(Text(Root + "/output").substr(0, usage.size()), outputBegin);
+    EXPECT_EQ(FileText(Root + "/output").substr(0, usage.size()), outputBegin);
     EXPECT_EQ(fs::exists(History), outputBegin.empty());
   }
-  Write(Root + "/ZEK", "a file in the way");
+  WriteFileText(Root + "/ZEK", "a file in the way");
   EXPECT_EQ(Call("-start 7"), 1);
-  EXPECT_EQ(Text(Root + "/output"), "Initialiation Failed:\n");
+  EXPECT_EQ(FileText(Root + "/output"), "Initialiation Failed:\n");
 }
 
 TEST_F(Run, OverlappingStartsAllCount) {
@@ -90,7 +74,7 @@ TEST_F(Run, OverlappingStartsAllCount) {
     const std::string id = std::to_string(i);
     EXPECT_EQ(history.Find(id, "Event_ID"), id);
     EXPECT_EQ(history.Find(id, "Product"), "P" + id);
-    EXPECT_TRUE(Text(History + id + "/ORXInstallEvent.Log")
+    EXPECT_TRUE(FileText(History + id + "/ORXInstallEvent.Log")
                     .ends_with(" Starts  \n" + std::string(94, '*') + "\n"));
   }
 }
@@ -101,12 +85,12 @@ TEST_F(Run, OverlappingMessagesStayWhole) {
   for (char c = 'a'; c <= 'z'; ++c) {
     messages += std::string(20000, c) + '\n';
   }
-  Write(Root + "/messages", messages);
+  WriteFileText(Root + "/messages", messages);
   EXPECT_EQ(Shell("cd ZEK/ORXHistory/7; : >ORXInstallEvent.Log;"
                   "xargs -P 16 -n 1 -a ../../../messages $ORX -logmessage 7 -message;"
                   "sort -o ORXInstallEvent.Log ORXInstallEvent.Log"),
             0);
-  EXPECT_EQ(Text(History + "7/ORXInstallEvent.Log"), messages);
+  EXPECT_EQ(FileText(History + "7/ORXInstallEvent.Log"), messages);
 }
 
 TEST_F(Run, SurvivesHistoryFilesOfAnyKind) {
@@ -130,7 +114,7 @@ TEST_F(Run, SurvivesHistoryFilesOfAnyKind) {
       {many, "5", 100002},
   };
   for (const auto& test : cases) {
-    Write(History + "History.ini", test.Text);
+    WriteFileText(History + "History.ini", test.Text);
     EXPECT_EQ(Call("-start new -Type '\xC3\x28\xFF]=[x'"), 0);
     const ProfileText history = HistoryFile();
     EXPECT_EQ(history.Find("History", "Count"), test.Count);
@@ -166,15 +150,15 @@ TEST_F(Run, NeitherFollowsNorPacksLinksAndPipes) {
       0);
   ASSERT_EQ(::mknod((History + "socket").c_str(), S_IFSOCK | 0600, 0), 0);
   const std::string log = "Log_File_Name=" + Root + "/setup.log\n";
-  Write(History + "History.ini", "[7]\nCopy_Name=C1\n" + log + "[8]\nCopy_Name=C2/7\n" + log +
-                                     "[7.log]\nCopy_Name=C2\n" + log);
+  WriteFileText(History + "History.ini", "[7]\nCopy_Name=C1\n" + log + "[8]\nCopy_Name=C2/7\n" +
+                                             log + "[7.log]\nCopy_Name=C2\n" + log);
   for (const std::string arguments :
        {"-start C1", "-start C2", "-start 9", "-end 9 -CopyName C1", "-report a.zip"}) {
     EXPECT_EQ(Call(arguments), 0);
   }
   EXPECT_EQ(ArchiveTree(Root + "/a.zip"),
             "9/\n9/ORXInstallEvent.Log\nC2/\nC2/7/\nC2/7/Summary.txt\nC2/7.log/\nHistory.ini\n");
-  EXPECT_EQ(Text(Root + "/outside/Summary.txt"), "untouched\n");
+  EXPECT_EQ(FileText(Root + "/outside/Summary.txt"), "untouched\n");
   EXPECT_EQ(fs::remove_all(Root + "/outside"), 3U);  // itself and what is made above
 }
 

@@ -1,119 +1,14 @@
-#include "tests/fake_machine.h"
+#include "tests/support/fake_machine.h"
 
 #include <algorithm>
-#include <filesystem>
-#include <fstream>
-#include <iterator>
-#include <numeric>
-#include <random>
-#include <regex>
-#include <set>
 #include <sstream>
 
-#include "app/install_history.h"
-#include "eventlog/logger.h"
-#include "history/locations.h"
 #include "platform/ascii_case.h"
 #include "platform/known_folders.h"
-#include "platform/path.h"
-
-static std::string commonFolder;
 
 FakeMachine& Machine() {
   static FakeMachine machine;
   return machine;
-}
-
-ScratchHistory::ScratchHistory() {
-  const auto name = "orx-test-" + std::to_string(std::random_device()());
-  Root = (std::filesystem::temp_directory_path() / name).string();
-  std::filesystem::create_directory(Root);
-  commonFolder = Root;
-  Machine() = FakeMachine();
-}
-
-ScratchHistory::~ScratchHistory() {
-  std::error_code ignored;
-  std::filesystem::remove_all(Root, ignored);
-  commonFolder.clear();
-}
-
-std::string ScratchHistory::In(const std::string& path) const { return Native("@/" + path); }
-
-void ScratchHistory::Make(const std::string& path) const {
-  if (path.ends_with('/')) {
-    std::filesystem::create_directories(In(path));
-    return;
-  }
-  std::filesystem::create_directories(std::filesystem::path(In(path)).parent_path());
-  WriteFileText(In(path), path);
-}
-
-std::string ScratchHistory::Tree() const {
-  std::set<std::string> lines;
-  for (const auto& entry : std::filesystem::recursive_directory_iterator(Root)) {
-    const std::string path = entry.path().string().substr(Root.size() + 1);
-    lines.insert(Neutral(path) + (entry.is_directory() ? "/\n" : "\n"));
-  }
-  return std::accumulate(lines.begin(), lines.end(), std::string());
-}
-
-static std::string Replaced(std::string text, const std::string& old, const std::string& by) {
-  for (size_t place = 0; (place = text.find(old, place)) != std::string::npos;) {
-    text.replace(place, old.size(), by);
-    place += by.size();
-  }
-  return text;
-}
-
-std::string ScratchHistory::Neutral(std::string text) const {
-  std::erase(text, '\r');
-  text = Replaced(Replaced(text, Root, "@"), {kPathSeparator}, "/");
-  return std::regex_replace(text, std::regex("[0-9]{8} [0-9]{2}:[0-9]{2}:[0-9]{2}"), "<time>");
-}
-
-std::string ScratchHistory::Native(const std::string& text) const {
-  return Replaced(Replaced(text, "/", {kPathSeparator}), "@", Root);
-}
-
-std::string InHistory(const std::string& path) {
-  return JoinPath(GetHistoryDir(), Replaced(path, "/", {kPathSeparator}));
-}
-
-std::string Golden(const std::string& name) { return FileText(JoinPath(ORX_GOLDEN_FOLDER, name)); }
-
-ProgramArguments::ProgramArguments(std::vector<std::string> words) : Words(std::move(words)) {
-  Words.insert(Words.begin(), "ORXInstallEventLog");
-  for (std::string& word : Words) {
-    Pointers.push_back(word.data());
-  }
-}
-
-static void ResetLogFormat() { CLogger::GetInstance().copyfmt(std::ios(nullptr)); }
-
-int RunTool(std::vector<std::string> words) {
-  ResetLogFormat();
-  ProgramArguments arguments(std::move(words));
-  return CInstallHistory().Run(arguments.Count(), arguments.Vector());
-}
-
-std::string LoggedText(const std::function<void()>& write) {
-  ResetLogFormat();
-  std::stringbuf text;
-  std::ios& log = CLogger::GetInstance();
-  std::streambuf* file = log.rdbuf(&text);
-  write();
-  log.rdbuf(file);
-  return text.str();
-}
-
-std::string FileText(const std::string& path) {
-  std::ifstream file(path, std::ios::binary);
-  return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
-}
-
-void WriteFileText(const std::string& path, const std::string& text) {
-  std::ofstream(path, std::ios::binary) << text;
 }
 
 static RegistryData DataOf(const std::string& text) {
@@ -147,7 +42,7 @@ void FakeMachine::Load(const std::string& text) {
   }
 }
 
-std::string GetFolderPath(int32_t csidl) { return csidl == 35 ? commonFolder : ""; }
+std::string GetFolderPath(int32_t csidl) { return csidl == 35 ? Machine().CommonFolder : ""; }
 
 std::optional<std::string> ShortComputerName() { return Machine().ComputerName; }
 

@@ -1,0 +1,64 @@
+#include "platform/folder_listing.h"
+
+#include <gtest/gtest.h>
+
+#include <ctime>
+#include <filesystem>
+#include <numeric>
+#include <set>
+
+#include "tests/platform/contract.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+using namespace std::string_literals;
+using Files = Platform;
+
+// The names in a folder, sorted, each followed by a blank.
+std::string Names(const std::string& folder) {
+  std::set<std::string> names;
+  for (const FolderEntry& entry : ListFolder(folder)) {
+    names.insert(entry.Name == "." || entry.Name == ".." ? "" : entry.Name + ' ');
+  }
+  return std::accumulate(names.begin(), names.end(), ""s);
+}
+
+TEST_F(Files, AreListedWithTheirProperties) {
+  Make("plain", "");
+  fs::permissions(Make("fixed", ""), fs::perms::owner_read);
+  Make(".dot", "");
+  Make("folder/");
+  constexpr uint32_t readOnly = 1;
+  for (const auto& [name, attributes] : ListFolder(Root)) {
+    EXPECT_EQ(attributes, FileAttributes(In(name))) << name;
+    const bool isFolder = name == "folder" || name == "." || name == "..";
+    EXPECT_EQ((attributes & kFolderAttribute) != 0, isFolder) << name;
+    EXPECT_EQ((attributes & readOnly) != 0, name == "fixed") << name;
+  }
+  EXPECT_EQ(Names(Root), ".dot fixed folder plain ");
+  EXPECT_EQ(Names(In("folder")), "");
+  EXPECT_TRUE(ListFolder(In("none")).empty());
+  EXPECT_TRUE(ListFolder(In("plain")).empty());
+  fs::permissions(In("fixed"), fs::perms::owner_all);
+}
+
+TEST_F(Files, KeepTheTimeOfTheirLastWrite) {
+  const std::time_t before = std::time(nullptr);
+  Make("file", "x");
+  Make("folder/");
+  for (const char* name : {"file", "folder"}) {
+    const CalendarTime time = LastWriteTime(In(name)).value();
+    tm fields = {};
+    fields.tm_year = time.Year - 1900;
+    fields.tm_mon = time.Month - 1;
+    fields.tm_mday = time.Day;
+    fields.tm_hour = time.Hour;
+    fields.tm_min = time.Minute;
+    fields.tm_sec = time.Second;
+    fields.tm_isdst = -1;
+    EXPECT_NEAR(std::difftime(std::mktime(&fields), before), 0, 5);
+  }
+}
+
+}  // namespace

@@ -1,0 +1,109 @@
+#include "platform/profile_file.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <functional>
+#include <regex>
+#include <sstream>
+
+#include "tests/platform/contract.h"
+
+namespace {
+
+using namespace std::string_literals;
+
+class ProfileFile : public Platform {
+ protected:
+  // What is read of each value after it was written, each followed by a bar, as in the list.
+  std::string ReadEach(const std::string& values, const std::function<std::string()>& read) const {
+    std::istringstream stream(values);
+    std::string text;
+    for (std::string value; std::getline(stream, value, '|');) {
+      EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", value)) << value;
+      text += read() + '|';
+    }
+    return text;
+  }
+
+  const std::string Ini = In("a.ini");
+};
+
+TEST_F(ProfileFile, CutsValuesAtTheBuffersEnd) {
+  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "0123456789"));
+  for (const uint32_t size : {1U, 2U, 10U, 11U, 12U, 256U}) {
+    const std::string expected = "0123456789"s.substr(0, size - 1);
+    EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", size), expected) << size;
+    EXPECT_EQ(ReadProfileValue(Ini, "S", "None", "0123456789", size), expected) << size;
+    EXPECT_EQ(ReadProfileValue(In("none"), "S", "Key", "0123456789", size), expected) << size;
+  }
+  EXPECT_EQ(Tree(), "a.ini\n");
+}
+
+TEST_F(ProfileFile, TakesBlanksAndOnePairOfQuotesOffAValue) {
+  const auto readText = [this] { return ReadProfileValue(Ini, "S", "Key", "none", 256); };
+  EXPECT_EQ(ReadEach(R"("a"|'a'|""a""|" a "|"a|a"|"a'|"a" "b"|"|""|  a b  | "a" |a=b;c|[x]||  |)",
+                     readText),
+            R"(a|a|"a"| a |"a|a"|"a'|a" "b|"||a b|a|a=b;c|[x]|||)");
+  const auto readNumber = [this] { return std::to_string(ReadProfileInt(Ini, "S", "Key", 5)); };
+  EXPECT_EQ(ReadEach(R"(12|-12|0|12abc|abc|-| 7 |007|"12"|2147483647|)", readNumber),
+            "12|-12|0|12|0|0|7|7|12|2147483647|");
+  EXPECT_EQ(ReadProfileInt(Ini, "S", "None", -5), -5);
+  EXPECT_EQ(ReadProfileInt(In("none"), "S", "Key", 5), 5);
+}
+
+TEST_F(ProfileFile, KeepsOrderAndCase) {
+  const char* const writes[][3] = {{"One", "B", "1"}, {"Two", "K", "2"},  {"One", "A", "3"},
+                                   {"ONE", "b", "4"}, {"two", "New", ""}, {"Two", "K", ""}};
+  for (const auto& [section, key, value] : writes) {
+    EXPECT_TRUE(WriteProfileValue(Ini, section, key, value));
+  }
+  // Line ends are the system's, which may also set a blank line between sections.
+  const std::string text = std::regex_replace(FileText(Ini), std::regex("[\r\n]+"), "\n");
+  EXPECT_EQ(text, "[One]\nB=4\nA=3\n[Two]\nK=\nNew=\n");
+  EXPECT_EQ(ReadProfileValue(Ini, "TWO", "new", "none", 256), "");
+  EXPECT_EQ(ReadProfileValue(Ini, "oNE", "a", "none", 256), "3");
+}
+
+TEST_F(ProfileFile, ListsSectionsAsFarAsTheyFit) {
+  const auto upToEnd = [](const std::string& names) {
+    return names.substr(0, names.find("\0\0"s));
+  };
+  EXPECT_EQ(ReadProfileSectionNames(Ini, 100).substr(0, 2), "\0\0"s);
+  WriteProfileValue(Ini, "ab", "Key", "");
+  WriteProfileValue(Ini, "cde", "Key", "");
+  for (const uint32_t size : {2, 3, 5, 6, 7, 8, 9, 100}) {
+    const std::string names = ReadProfileSectionNames(Ini, size);
+    EXPECT_LE(names.size(), size);
+    EXPECT_EQ(upToEnd(names), upToEnd("ab\0cde"s.substr(0, size - 2) + "\0\0"s)) << size;
+  }
+}
+
+TEST_F(ProfileFile, IsNotMadeWhereItCannotBe) {
+  Make("folder/");
+  EXPECT_FALSE(WriteProfileValue(In("folder"), "S", "Key", "v"));
+  EXPECT_FALSE(WriteProfileValue(In("none/a.ini"), "S", "Key", "v"));
+  EXPECT_EQ(ReadProfileValue(In("folder"), "S", "Key", "none", 256), "none");
+  EXPECT_EQ(Tree(), "folder/\n");
+}
+
+TEST_F(ProfileFile, ChangesAtOnceWhenTheOutermostGuardEnds) {
+  WriteProfileValue(Ini, "S", "Key", "old");
+  const std::string before = FileText(Ini);
+  {
+    const ProfileGuard guard(Ini);
+    {
+      const ProfileGuard inner(Ini);
+      EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "new"));
+      EXPECT_TRUE(WriteProfileValue(Ini, "T", "Key", "more"));
+    }
+    EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", 256), "new");
+    EXPECT_EQ(ReadProfileValue(Ini, "T", "Key", "", 256), "more");
+    EXPECT_EQ(FileText(Ini), before);
+  }
+  EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", 256), "new");
+  EXPECT_NE(FileText(Ini), before);
+  EXPECT_EQ(Tree(), "a.ini\n");
+}
+
+}  // namespace

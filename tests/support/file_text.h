@@ -1,0 +1,16 @@
+#pragma once
+
+#include <string>
+
+// All bytes of a file; empty if it cannot be read.
+std::string FileText(const std::string& path);
+void WriteFileText(const std::string& path, const std::string& text);
+
+// The bytes of a file of tests/golden/.
+std::string Golden(const std::string& name);
+
+// The text with "<time>" for each time stamp.
+std::string WithoutTimes(const std::string& text);
+
+// The text with each occurrence replaced.
+std::string Replaced(std::string text, const std::string& old, const std::string& by);
