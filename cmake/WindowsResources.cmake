@@ -1,9 +1,9 @@
 # Gives a program its manifest (the systems that it knows, and that it runs with its caller's rights)
-# and the resource that names its version.
+# and the resource that names its version. The description is the one line that the system shows.
 enable_language(RC)
 
 function(orx_add_windows_resources target)
-  set(folder ${CMAKE_CURRENT_BINARY_DIR}/resources)
+  set(folder ${CMAKE_CURRENT_BINARY_DIR}/resources/${target})
   configure_file(platform/windows/program.manifest.in ${folder}/program.manifest @ONLY)
   configure_file(platform/windows/program.rc.in ${folder}/program.rc @ONLY)
   target_sources(${target} PRIVATE ${folder}/program.rc)
