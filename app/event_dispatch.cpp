@@ -1,3 +1,5 @@
+#include <utility>
+
 #include "app/install_event.h"
 #include "eventlog/logger.h"
 #include "history/locations.h"
@@ -55,6 +57,7 @@ void CInstallEvent::OpenEventLog() const {
 
 void CInstallEvent::RecordStart() {
   const ProfileGuard guard(Ini.Path);
+  const auto guardOfRun = std::move(StartGuard);  // ends here too: the snapshot takes its time
   SetStartTime(GetTimestamp());
   SetEndTime("");
   SetProduct(Product);

@@ -1,9 +1,11 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 #include <string>
 
 #include "history/ini_file.h"
+#include "platform/profile_file.h"
 
 // The record of one event: what this run's command line says of it, and the accessors of what the
 // history file says of it. The two differ on purpose: the fields are this run's, the keys are the
@@ -89,6 +91,9 @@ class CInstallEvent {
   std::string ServiceLevel;
   int32_t SectionNumber = 0;  // of the snapshot's next section
   CIniFile Ini;
+
+  // The guard of a "-start" on the history file, which RecordStart ends; else null.
+  std::shared_ptr<const ProfileGuard> StartGuard;
 
  private:
   void ParseOptions(int argc, char** argv);

@@ -11,6 +11,8 @@
 CInstallHistory::CInstallHistory() { ReadCount(); }
 
 int CInstallHistory::Run(int argc, char** argv) {
+  // From the look at the history file to the start keys, so that a start replaces it once.
+  auto guard = std::make_shared<const ProfileGuard>(GetHistoryFilePath());
   if (!InitHistoryStore()) {
     std::cout << "Initialiation Failed:" << std::endl;
     return 1;
@@ -19,6 +21,10 @@ int CInstallHistory::Run(int argc, char** argv) {
   if (!event.Valid) {
     return 2;
   }
+  if (event.Mode == "-start") {
+    event.StartGuard = guard;
+  }
+  guard.reset();
   event.Dispatch();
   return 0;
 }
@@ -32,9 +38,10 @@ bool CInstallHistory::InitHistoryStore() {
     std::cout << " Failed to create path:" << historyFolder;
     return false;
   }
-  // Unguarded, a run beside this one could count its event before the reset below undoes it.
+  // Run's own guard does nothing on a first run, as the folder did not exist. Without this one, a
+  // run that counts its event now would have its count reset.
   const ProfileGuard guard(GetHistoryFilePath());
-  // A file that is there but could not be looked at must keep its count.
+  // A file that exists but whose status cannot be read must keep its count.
   const CIniFile history(GetHistoryFilePath());
   if (!FileExists(history.Path) && history.ReadString("History", "Count", "", 2).empty()) {
     ResetCount();
@@ -43,11 +50,10 @@ bool CInstallHistory::InitHistoryStore() {
 }
 
 CInstallEvent CInstallHistory::RegisterEvent(int argc, char** argv) {
-  const ProfileGuard guard(GetHistoryFilePath());
-  ReadCount();  // once more: other runs may have counted since the construction
+  ReadCount();  // again: other runs may have counted since the constructor
   CInstallEvent event(argc, argv);
   if (event.Valid && event.Mode == "-start") {
-    // Unsigned, as a file edited by hand may hold the highest number there is.
+    // Unsigned, as a file edited by hand may have the highest number.
     EventCount = static_cast<int32_t>(static_cast<uint32_t>(EventCount) + 1);
     WriteCount(EventCount);
   }

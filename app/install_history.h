@@ -42,8 +42,7 @@ class CInstallHistory {
   // True when the history folders and the history file are there.
   bool InitHistoryStore();
 
-  // Builds the record of this run and counts a "-start", as one change that no other run mixes
-  // with.
+  // Builds the record of this run and counts a "-start"; to be called under a guard.
   CInstallEvent RegisterEvent(int argc, char** argv);
 
   void ReadCount();

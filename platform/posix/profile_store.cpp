@@ -1,120 +1,151 @@
 #include "platform/posix/profile_store.h"
 
 #include <fcntl.h>
-#include <sys/file.h>
 #include <unistd.h>
 
 #include <utility>
 
+#include "platform/path.h"
+#include "platform/posix/file_access.h"
 #include "platform/posix/file_calls.h"
 #include "platform/posix/text_file.h"
+#include "platform/temporary_path.h"
 
 ProfileStore& ProfileStore::GetInstance() {
   static ProfileStore instance;
   return instance;
 }
 
-static std::string FolderOf(const std::string& path) { return path.substr(0, path.rfind('/') + 1); }
-
-bool ProfileStore::IsCurrent(const std::string& path) const {
+bool ProfileStore::IsCurrent(const std::string& path, const File& file) {
   struct stat now = {};
-  return Text && path == Path && StatusOf(path, Links::kFollow, now) &&
-         now.st_dev == Status.st_dev && now.st_ino == Status.st_ino &&
-         now.st_size == Status.st_size && now.st_ctim.tv_sec == Status.st_ctim.tv_sec &&
-         now.st_ctim.tv_nsec == Status.st_ctim.tv_nsec;
+  return file.Text && StatusOf(path, Links::kFollow, now) && now.st_dev == file.Status.st_dev &&
+         now.st_ino == file.Status.st_ino && now.st_size == file.Status.st_size &&
+         now.st_ctim.tv_sec == file.Status.st_ctim.tv_sec &&
+         now.st_ctim.tv_nsec == file.Status.st_ctim.tv_nsec;
 }
 
-ProfileText* ProfileStore::Load(const std::string& path) {
-  if ((IsChanged && path == Path) || IsCurrent(path)) {
-    return Text.get();
+void ProfileStore::Keep(Descriptor opened, File& file) {
+  file.Opened = std::move(opened);
+  if (!StatusOf(file.Opened, file.Status)) {
+    file.Status = {};
   }
-  Path = path;
-  Text.reset();
-  File.Reset(-1);
-  // A link in the file's place could lead anywhere, and a pipe would hold up the run.
-  Descriptor file(RetryOnInterrupt(
+}
+
+void ProfileStore::Read(const std::string& path, File& file) {
+  file.Text.reset();
+  file.Opened.Reset(-1);
+  file.Status = {};
+  // A link could lead anywhere, and a pipe would hold up the run.
+  Descriptor opened(RetryOnInterrupt(
       [&] { return ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC); }));
-  if (!file.IsOpen()) {
+  if (!opened.IsOpen()) {
     if (errno == ENOENT) {
-      Text = std::make_unique<ProfileText>("");
-      Status = {};
+      file.Text = std::make_unique<ProfileText>("");
     }
-    return Text.get();
-  }
-  Keep(std::move(file));
-  if (S_ISREG(Status.st_mode)) {
-    if (std::optional<std::string> text = ReadAll(File)) {
-      Text = std::make_unique<ProfileText>(std::move(*text));
-    }
-  }
-  return Text.get();
-}
-
-void ProfileStore::Keep(Descriptor file) {
-  File = std::move(file);
-  if (!StatusOf(File, Status)) {
-    Status = {};
-  }
-}
-
-void ProfileStore::Lock(const std::string& path) {
-  if (Depth++ > 0) {
     return;
   }
-  const std::string folder = FolderOf(path);
-  Folder.Reset(
-      RetryOnInterrupt([&] { return ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC); }));
-  if (Folder.IsOpen() && RetryOnInterrupt([&] { return ::flock(Folder.Get(), LOCK_EX); }) != 0) {
-    Folder.Reset(-1);
+  Keep(std::move(opened), file);
+  if (S_ISREG(file.Status.st_mode)) {
+    if (std::optional<std::string> text = ReadAll(file.Opened)) {
+      file.Text = std::make_unique<ProfileText>(std::move(*text));
+    }
   }
 }
 
-bool ProfileStore::Unlock() {
+const ProfileText* ProfileStore::Load(const std::string& path) {
+  File& file = Files[path];
+  if (file.Changes == State::kUnchanged && !IsCurrent(path, file)) {
+    Read(path, file);
+    if (!file.Text && Depth > 0) {
+      file.Changes = State::kFailed;
+    }
+  }
+  return file.Text.get();
+}
+
+bool ProfileStore::Set(const std::string& path, const std::string& section, const std::string& key,
+                       const std::string& value) {
+  if (Load(path) == nullptr) {
+    return false;
+  }
+  File& file = Files[path];
+  file.Text->Set(section, key, value);
+  file.Changes = State::kChanged;
+  return true;
+}
+
+void ProfileStore::Enter(const std::string& path) {
+  ++Depth;
+  const std::string folder = FolderPart(path);
+  if (Locks.contains(folder)) {
+    return;
+  }
+  FolderLock lock(folder, LockTime);
+  // A folder that is made later can be locked then.
+  if (lock.Result() != LockResult::kNoFolder) {
+    Locks.emplace(folder, std::move(lock));
+  }
+}
+
+bool ProfileStore::Leave() {
   if (--Depth > 0) {
     return true;
   }
-  const bool isStored = !IsChanged || Store();
-  IsChanged = false;
-  if (!isStored) {
-    Text.reset();
+  bool areStored = true;
+  for (auto& [path, file] : Files) {
+    if (file.Changes == State::kChanged && !Store(path, file)) {
+      file.Text.reset();
+      areStored = false;
+    }
+    file.Changes = State::kUnchanged;
   }
-  Folder.Reset(-1);
-  return isStored;
+  Locks.clear();
+  return areStored;
 }
 
-// Anew, after removing a file of that name.
-static Descriptor OpenAnew(const std::string& path) {
-  RemoveFile(path);
+bool ProfileStore::IsLocked(const std::string& path) const {
+  const auto lock = Locks.find(FolderPart(path));
+  return lock != Locks.end() && lock->second.Result() == LockResult::kLocked;
+}
+
+static Descriptor CreateFile(const std::string& path, mode_t mode) {
   return Descriptor(RetryOnInterrupt([&] {
-    return ::open(path.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0666);
+    return ::open(path.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, mode);
   }));
 }
 
-// Writes the text beside the file and renames it over.
-bool ProfileStore::Store() {
-  // Only the holder of the lock writes here, and what stands here is of a run that was killed.
-  std::string growing = FolderOf(Path) + ".History.tmp";
-  Descriptor file = Folder.IsOpen() ? OpenAnew(growing) : Descriptor();
-  if (!file.IsOpen()) {
-    // There is no lock to be had, or a folder of that name: an event can be called anything.
-    growing = FolderOf(Path) + ".History-" + std::to_string(::getpid()) + ".tmp";
-    file = OpenAnew(growing);
+// A file system that cannot do it is no reason to lose the text.
+static bool FlushToDisk(const Descriptor& file) {
+  return RetryOnInterrupt([&] { return ::fdatasync(file.Get()); }) == 0 || errno == EINVAL ||
+         errno == ENOTSUP || errno == ENOSYS || errno == EROFS;
+}
+
+// Writes the text to a temporary file and renames it over the profile file.
+bool ProfileStore::Store(const std::string& path, File& file) const {
+  const bool isReplacement = file.Status.st_mode != 0;
+  const mode_t mode = isReplacement ? 0600 : 0666;  // closed, until CopyAccess opens it
+  std::string temporary = FixedPathBeside(path);
+  Descriptor written;
+  if (IsLocked(path)) {
+    RemoveFile(temporary);  // only a run that was killed can have left it
+    written = CreateFile(temporary, mode);
   }
-  if (!file.IsOpen()) {
+  if (!written.IsOpen()) {
+    // No lock, or something of that name that cannot be removed: an event can be called anything.
+    temporary = RandomPathBeside(path);
+    written = CreateFile(temporary, mode);
+  }
+  if (!written.IsOpen()) {
     return false;
   }
-  const bool isReplacement = Status.st_mode != 0;
-  if (isReplacement) {
-    // The owner first, as a change of it can clear bits of the mode; not everyone may give away.
-    RetryOnInterrupt([&] { return ::fchown(file.Get(), Status.st_uid, Status.st_gid); });
-    RetryOnInterrupt([&] { return ::fchmod(file.Get(), Status.st_mode & 07777); });
+  const bool isWritten = WriteAll(written, file.Text->Get());
+  if (isWritten && isReplacement) {
+    CopyAccess(file.Opened, file.Status, written);
   }
-  if (!WriteAll(file, Text->Get()) ||
-      RetryOnInterrupt([&] { return ::fdatasync(file.Get()); }) != 0 ||
-      !RenameOver(growing, Path)) {
-    RemoveFile(growing);
+  if (!isWritten || !FlushToDisk(written) || !RenameOver(temporary, path)) {
+    RemoveFile(temporary);
     return false;
   }
-  Keep(std::move(file));
+  Keep(std::move(written), file);
   return true;
 }

@@ -2,48 +2,63 @@
 
 #include <sys/stat.h>
 
+#include <chrono>
+#include <map>
 #include <memory>
 #include <string>
 
 #include "platform/posix/descriptor.h"
+#include "platform/posix/folder_lock.h"
 #include "platform/profile_text.h"
 
-// The profile file that this process used last, parsed, and the lock on its folder.
+// The profile files that this process uses, parsed, and the locks on their folders.
 //
-// Other processes replace the file and never change it in place, so that a text once read stays
-// good as long as the name leads to the same device, inode, size and change time; that is looked at
-// on every access. The file stays open as long as its text is kept: its inode number cannot come
-// back as that of another file.
+// Other processes replace a file and do not change it in place. So a text that was read once is
+// valid as long as the path leads to the same device, inode, size and change time; every access
+// checks that. The file stays open as long as its text is kept, so that its inode number is not
+// used again for another file.
 class ProfileStore {
  public:
+  // One per process: the profile calls have only a path, and they share the locks.
   static ProfileStore& GetInstance();
 
-  // The text as it is now: empty if there is no file, null if there is one that cannot be read.
-  // Good until the next call.
-  ProfileText* Load(const std::string& path);
+  // The text as it is now, valid until the next call: empty if there is no file, null if it cannot
+  // be read. After such a failure inside Enter and Leave, the file cannot be read or changed until
+  // Leave: what was read before may be wrong and must not be written back.
+  const ProfileText* Load(const std::string& path);
 
-  // Takes the lock, waiting for whoever has it. Calls nest; the first one's path counts. On a file
-  // system without locks runs go on without: one may undo the change of another, but each leaves
-  // a whole file.
-  void Lock(const std::string& path);
+  // Changes a key of the text that Load returns; to be called inside Enter and Leave.
+  bool Set(const std::string& path, const std::string& section, const std::string& key,
+           const std::string& value);
 
-  // The text that Load gave was changed, under the lock, and is to be written.
-  void MarkChanged() { IsChanged = true; }
+  // Locks the folder of the file until the last Leave. Calls nest, with the same path or others.
+  // Without the lock, runs go on: one may undo a change of another, but each leaves a whole file.
+  void Enter(const std::string& path);
 
-  // Frees the lock with the last call, after writing what was changed. False if that failed: then
-  // the file is as it was, and so is the next Load.
-  bool Unlock();
+  // The last one writes every file that was changed and frees the locks. False if a file could not
+  // be written: it is as it was, and so is the next Load.
+  bool Leave();
+
+  // Time that the process may still wait for locks, all together.
+  std::chrono::nanoseconds LockTime = std::chrono::seconds(10);
 
  private:
-  bool IsCurrent(const std::string& path) const;
-  bool Store();
-  void Keep(Descriptor file);
+  enum class State { kUnchanged, kChanged, kFailed };
 
-  std::string Path;
-  std::unique_ptr<ProfileText> Text;
-  Descriptor File;
-  struct stat Status = {};
-  bool IsChanged = false;
-  Descriptor Folder;
+  struct File {
+    std::unique_ptr<ProfileText> Text;
+    Descriptor Opened;
+    struct stat Status = {};  // without a mode if there is no file
+    State Changes = State::kUnchanged;
+  };
+
+  static bool IsCurrent(const std::string& path, const File& file);
+  static void Read(const std::string& path, File& file);
+  static void Keep(Descriptor opened, File& file);
+  bool IsLocked(const std::string& path) const;
+  bool Store(const std::string& path, File& file) const;
+
+  std::map<std::string, File> Files;
+  std::map<std::string, FolderLock> Locks;
   int Depth = 0;
 };

@@ -2,109 +2,100 @@
 
 #include "platform/files.h"
 #include "platform/path.h"
+#include "platform/temporary_path.h"
 #include "platform/windows/file_entry.h"
-// It needs what the system's header defines.
-#include <sddl.h>
-
-// A mutex of the whole machine, as the history is, whichever session or user the runs belong to:
-// everyone may wait for it and free it, and only that is asked for.
-static HANDLE OpenSharedMutex() {
-  constexpr DWORD access = SYNCHRONIZE | MUTEX_MODIFY_STATE;
-  constexpr const char* everyoneMayUse = "D:(A;;0x100001;;;WD)";
-  SECURITY_ATTRIBUTES security = {sizeof security, /*lpSecurityDescriptor=*/nullptr,
-                                  /*bInheritHandle=*/FALSE};
-  if (::ConvertStringSecurityDescriptorToSecurityDescriptorA(
-          everyoneMayUse, SDDL_REVISION_1, &security.lpSecurityDescriptor,
-          /*SecurityDescriptorSize=*/nullptr) == FALSE) {
-    return nullptr;
-  }
-  const HANDLE mutex = ::CreateMutexExA(&security, "Global\\ORXInstallEventLog.History",
-                                        /*dwFlags=*/0, access);
-  ::LocalFree(security.lpSecurityDescriptor);
-  return mutex;
-}
-
-ProfileStore::ProfileStore() : Mutex(OpenSharedMutex()) {}
+#include "platform/windows/file_replacement.h"
+#include "platform/windows/patience.h"
 
 ProfileStore& ProfileStore::GetInstance() {
   static ProfileStore instance;
   return instance;
 }
 
-void ProfileStore::Lock(const std::string& path) {
-  if (Depth++ > 0) {
-    return;
+static bool IsMissing(DWORD error) {
+  return error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND;
+}
+
+void ProfileStore::Enter(const std::string& path) {
+  ++Depth;
+  const std::string folder = FolderPart(path);
+  if (!Locks.contains(folder)) {
+    Locks.try_emplace(folder, folder, LockTime);
   }
-  // An owner that died left the file whole, so that its guard is as good as a free one.
-  ::WaitForSingleObject(Mutex.get(), INFINITE);
-  Path = path;
-  Growing = FolderPart(path) + ".History.tmp";
 }
 
-const std::string& ProfileStore::ForReading(const std::string& path) const {
-  return Changes == State::kChanged && path == Path ? Growing : path;
-}
-
-std::string ProfileStore::ForWriting(const std::string& path) {
-  if (path != Path) {
-    return "";
-  }
-  if (Changes == State::kUnchanged) {
-    Changes = MakeCopy() ? State::kChanged : State::kFailed;
-  }
-  return Changes == State::kChanged ? Growing : "";
-}
-
-void ProfileStore::MarkFailed() { Changes = State::kFailed; }
-
-// True with no copy too if there is nothing to copy yet.
-bool ProfileStore::MakeCopy() {
-  if (KindOf(Growing) == FileKind::kFolder) {  // an event can be called anything
-    Growing = FolderPart(Path) + ".History-" + std::to_string(::GetCurrentProcessId()) + ".tmp";
-  }
-  RemoveFile(Growing);
-  return ::CopyFileA(Path.c_str(), Growing.c_str(), /*bFailIfExists=*/1) != FALSE ||
-         ::GetLastError() == ERROR_FILE_NOT_FOUND;
-}
-
-static bool FlushToDisk(const std::string& path) {
-  const UniqueHandle file = OwnIfValid(
-      ::CreateFileA(path.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE,
-                    /*lpSecurityAttributes=*/nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL,
-                    /*hTemplateFile=*/nullptr));
-  return file && ::FlushFileBuffers(file.get()) != FALSE;
-}
-
-// A program that looks at every new file, or shows this one, can keep it from being replaced for a
-// moment; all keys of an event are worth some patience.
-static bool Replace(const std::string& source, const std::string& target) {
-  constexpr int attempts = 25;
-  constexpr DWORD pause = 20;  // milliseconds
-  for (int i = 0; i < attempts; ++i) {
-    if (::MoveFileExA(source.c_str(), target.c_str(),
-                      MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != FALSE) {
-      return true;
-    }
-    const DWORD error = ::GetLastError();
-    if (error != ERROR_SHARING_VIOLATION && error != ERROR_ACCESS_DENIED) {
-      return false;
-    }
-    ::Sleep(pause);
-  }
-  return false;
-}
-
-bool ProfileStore::Store() const { return FlushToDisk(Growing) && Replace(Growing, Path); }
-
-bool ProfileStore::Unlock() {
+bool ProfileStore::Leave() {
   if (--Depth > 0) {
     return true;
   }
-  const bool isStored = Changes == State::kUnchanged || (Changes == State::kChanged && Store());
-  if (!isStored) {
-    RemoveFile(Growing);
+  bool areStored = true;
+  for (const auto& [path, file] : Files) {
+    if (file.Changes == State::kChanged && !ReplaceFileBy(file.Copy, path)) {
+      areStored = false;
+    }
+    if (!file.Copy.empty()) {
+      RemoveFile(file.Copy);
+    }
   }
-  Changes = State::kUnchanged;
-  ::ReleaseMutex(Mutex.get());
-  return isStored;
+  Files.clear();
+  Locks.clear();
+  return areStored;
+}
+
+ProfileStore::Readable ProfileStore::OpenForReading(const std::string& path) {
+  File& file = Files[path];
+  if (file.Changes == State::kFailed || IsSymbolicLink(path)) {
+    file.Changes = State::kFailed;
+    return {};
+  }
+  Readable readable;
+  readable.Path = file.Changes == State::kChanged ? file.Copy : path;
+  const bool isOpen = CallWithPatience(25, AccessDenied::kIsFinal, [&] {
+    readable.Opened = OpenShared(readable.Path, GENERIC_READ);
+    char byte = 0;
+    DWORD count = 0;
+    return readable.Opened && ::ReadFile(readable.Opened.get(), &byte, sizeof byte, &count,
+                                         /*lpOverlapped=*/nullptr) != FALSE;
+  });
+  if (!isOpen && !IsMissing(::GetLastError())) {
+    file.Changes = State::kFailed;
+    return {};
+  }
+  return readable;
+}
+
+// True without a copy too if there is no file yet.
+bool ProfileStore::MakeCopy(const std::string& path, File& file) const {
+  file.Copy = FixedPathBeside(path);
+  if (Locks.at(FolderPart(path)).IsLocked()) {
+    RemoveFile(file.Copy);  // only a run that was killed can have left it
+  }
+  if (KindOf(file.Copy) != FileKind::kNone) {
+    // No lock, or something of that name that cannot be removed: an event can be called anything.
+    file.Copy = RandomPathBeside(path);
+  }
+  return CallWithPatience(25, AccessDenied::kIsFinal,
+                          [&] {
+                            return ::CopyFileA(path.c_str(), file.Copy.c_str(),
+                                               /*bFailIfExists=*/TRUE) != FALSE;
+                          }) ||
+         IsMissing(::GetLastError());
+}
+
+bool ProfileStore::Write(const std::string& path, const std::string& section,
+                         const std::string& key, const std::string& value) {
+  File& file = Files[path];
+  if (file.Changes == State::kUnchanged) {
+    const bool isReadable = !OpenForReading(path).Path.empty();
+    file.Changes = isReadable && MakeCopy(path, file) ? State::kChanged : State::kFailed;
+  }
+  const bool isWritten =
+      file.Changes == State::kChanged && CallWithPatience(25, AccessDenied::kIsFinal, [&] {
+        return ::WritePrivateProfileStringA(section.c_str(), key.c_str(), value.c_str(),
+                                            file.Copy.c_str()) != FALSE;
+      });
+  if (!isWritten) {
+    file.Changes = State::kFailed;
+  }
+  return isWritten;
 }

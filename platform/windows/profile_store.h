@@ -1,46 +1,59 @@
 #pragma once
 
+#include <chrono>
+#include <map>
 #include <string>
 
+#include "platform/windows/folder_lock.h"
 #include "platform/windows/system.h"
 
-// The guard that this process holds, and the copy of the profile file that takes what is written
-// under it.
+// The locks that this process holds, and the copies of profile files that take what is written
+// under them.
 //
-// The system's calls rewrite a profile file in place and lose keys when two processes do so at
-// once. So every access, a read too, is made under the guard; and the writes go to a copy beside
-// the file, which replaces it when the guard ends. The copy's name begins with a dot. One that a
-// killed process left is removed by the next change. Where the system refuses the mutex, accesses
-// are made without it.
+// The system's calls change a profile file in place and lose keys when two processes do so at once.
+// So every access, a read too, is made inside Enter and Leave; and the writes go to a copy in the
+// same folder, which replaces the file in the last Leave. A copy that a killed process left is
+// removed by the next change. The calls also do not say whether a read failed, so that it is
+// checked before each one that the file can be read.
 class ProfileStore {
  public:
+  // One per process: the profile calls have only a path, and they share the locks.
   static ProfileStore& GetInstance();
 
-  // Takes the guard, waiting for whoever has it. Calls nest; the first one's path counts.
-  void Lock(const std::string& path);
+  // The file to read. While Opened exists, no other program can open it without sharing.
+  struct Readable {
+    std::string Path;  // empty if the file cannot be read; a file that does not exist can
+    UniqueHandle Opened;
+  };
+  // After a failure the file cannot be read or changed until the last Leave: what was read before
+  // may be wrong and must not be written back.
+  Readable OpenForReading(const std::string& path);
 
-  // The file to read, and the file to write; empty if the copy cannot be made. Only under the
-  // guard.
-  const std::string& ForReading(const std::string& path) const;
-  std::string ForWriting(const std::string& path);
+  bool Write(const std::string& path, const std::string& section, const std::string& key,
+             const std::string& value);
 
-  // A write has failed: nothing of what this guard has written counts.
-  void MarkFailed();
+  // Locks the folder of the file until the last Leave. Calls nest, with the same path or others.
+  // Without the lock, runs go on: one may undo a change of another, but each leaves a whole file.
+  void Enter(const std::string& path);
 
-  // Frees the guard with the last call, after putting the copy in the file's place. False if that
-  // failed: then the file is as it was.
-  bool Unlock();
+  // The last one replaces every file that was changed and frees the locks. False if a file could
+  // not be replaced: it is as it was.
+  bool Leave();
+
+  // Time that the process may still wait for locks, all together.
+  std::chrono::nanoseconds LockTime = std::chrono::seconds(10);
 
  private:
   enum class State { kUnchanged, kChanged, kFailed };
 
-  ProfileStore();
-  bool MakeCopy();
-  bool Store() const;
+  struct File {
+    std::string Copy;
+    State Changes = State::kUnchanged;
+  };
 
-  UniqueHandle Mutex;
+  bool MakeCopy(const std::string& path, File& file) const;
+
+  std::map<std::string, File> Files;
+  std::map<std::string, FolderLock> Locks;
   int Depth = 0;
-  std::string Path;
-  std::string Growing;
-  State Changes = State::kUnchanged;
 };

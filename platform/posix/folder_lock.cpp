@@ -1,0 +1,26 @@
+#include "platform/posix/folder_lock.h"
+
+#include <fcntl.h>
+#include <sys/file.h>
+
+#include <thread>
+
+FolderLock::FolderLock(const std::string& folder, std::chrono::nanoseconds& timeLeft)
+    : Folder(RetryOnInterrupt(
+          [&] { return ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC); })) {
+  if (!Folder.IsOpen()) {
+    State = LockResult::kNoFolder;
+    return;
+  }
+  // Whoever may open the folder can keep the lock for ever: a call that waits for it may not
+  // return.
+  while (RetryOnInterrupt([&] { return ::flock(Folder.Get(), LOCK_EX | LOCK_NB); }) != 0) {
+    if (errno != EWOULDBLOCK || timeLeft <= timeLeft.zero()) {
+      return;
+    }
+    const auto begin = std::chrono::steady_clock::now();
+    std::this_thread::sleep_for(std::chrono::milliseconds(2));
+    timeLeft -= std::chrono::steady_clock::now() - begin;
+  }
+  State = LockResult::kLocked;
+}
