@@ -12,6 +12,7 @@ inline constexpr uint32_t kFolderAttribute = 0x10;
 
 struct FolderEntry {
   std::string Name;         // without its folder
+  uint64_t Size = 0;        // of a file, in bytes
   uint32_t Attributes = 0;  // as FileAttributes gives them
 };
 

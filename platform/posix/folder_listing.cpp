@@ -41,7 +41,8 @@ std::vector<FolderEntry> ListFolder(const std::string& path) {
       return ::fstatat(::dirfd(folder.get()), entry->d_name, &status, AT_SYMLINK_NOFOLLOW);
     });
     if (result == 0 && (S_ISREG(status.st_mode) || S_ISDIR(status.st_mode))) {
-      entries.push_back({entry->d_name, AttributesFromMode(status.st_mode)});
+      entries.push_back({entry->d_name, static_cast<uint64_t>(status.st_size),
+                         AttributesFromMode(status.st_mode)});
     }
   }
   std::sort(entries.begin(), entries.end(),

@@ -13,7 +13,8 @@ std::vector<FolderEntry> ListFolder(const std::string& path) {
   const UniqueSearch search(first);
   do {
     if (!IsLink(entry)) {
-      entries.push_back({entry.cFileName, entry.dwFileAttributes});
+      const uint64_t size = (uint64_t{entry.nFileSizeHigh} << 32) | entry.nFileSizeLow;
+      entries.push_back({entry.cFileName, size, entry.dwFileAttributes});
     }
   } while (::FindNextFileA(search.get(), &entry) != FALSE);
   return entries;

@@ -1,0 +1,27 @@
+#include "platform/terminal.h"
+
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <string_view>
+
+#include "platform/posix/descriptor.h"
+
+std::optional<size_t> TerminalWidth(OutputStream stream) {
+  const int file = stream == OutputStream::kOutput ? STDOUT_FILENO : STDERR_FILENO;
+  if (::isatty(file) == 0) {
+    return std::nullopt;
+  }
+  winsize size = {};
+  const int result = RetryOnInterrupt([&] { return ::ioctl(file, TIOCGWINSZ, &size); });
+  return result == 0 && size.ws_col > 0 ? size.ws_col : 80;
+}
+
+Utf8Terminal::Utf8Terminal() {
+  const char* kind = std::getenv("TERM");
+  ShowsColours =
+      ::isatty(STDOUT_FILENO) != 0 && kind != nullptr && kind != std::string_view("dumb");
+}
+
+Utf8Terminal::~Utf8Terminal() = default;

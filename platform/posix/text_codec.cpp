@@ -1,0 +1,54 @@
+#include "platform/text_codec.h"
+
+#include <iconv.h>
+
+#include <cerrno>
+
+#include "platform/ascii_case.h"
+
+struct TextCodec::State {
+  explicit State(iconv_t converter) : Converter(converter) {}
+  ~State() { ::iconv_close(Converter); }
+  State(const State&) = delete;
+  State& operator=(const State&) = delete;
+
+  iconv_t Converter;
+};
+
+std::optional<TextCodec> TextCodec::Open(const std::string& encoding) {
+  constexpr std::string_view prefix = "windows-";
+  const bool isWindowsName =
+      EqualsIgnoringCase(std::string_view(encoding).substr(0, prefix.size()), prefix);
+  const std::string name = isWindowsName ? "CP" + encoding.substr(prefix.size()) : encoding;
+  if (name.empty()) {
+    return std::nullopt;  // for iconv it is the encoding of the locale
+  }
+  const iconv_t converter = ::iconv_open("UTF-8", name.c_str());
+  if (converter == reinterpret_cast<iconv_t>(-1)) {
+    return std::nullopt;
+  }
+  return TextCodec(std::make_shared<State>(converter));
+}
+
+std::string TextCodec::ToUtf8(std::string_view text) const {
+  ::iconv(Shared->Converter, /*inbuf=*/nullptr, /*inbytesleft=*/nullptr, /*outbuf=*/nullptr,
+          /*outbytesleft=*/nullptr);
+  std::string result;
+  char* input = const_cast<char*>(text.data());  // iconv does not write there
+  size_t left = text.size();
+  while (left > 0) {
+    char piece[1024];
+    char* output = piece;
+    size_t room = sizeof piece;
+    const size_t converted = ::iconv(Shared->Converter, &input, &left, &output, &room);
+    result.append(piece, sizeof piece - room);
+    if (converted == static_cast<size_t>(-1) && errno != E2BIG) {
+      result += "\xEF\xBF\xBD";
+      ++input;
+      --left;
+    }
+  }
+  return result;
+}
+
+std::string SystemTextToUtf8(std::string_view text) { return std::string(text); }

@@ -1,0 +1,26 @@
+#pragma once
+
+#include <minizip/unzip.h>
+
+#include <string>
+
+#include "reader/archive.h"
+
+// The file functions through which minizip reads the bytes of an archive. It asks for single bytes
+// and goes to and fro, so that a window of the bytes is kept.
+class Archive::Stream {
+ public:
+  explicit Stream(ArchiveBytes bytes) : Bytes(std::move(bytes)) {}
+
+  // Good as long as this object lives and stays where it is.
+  zlib_filefunc64_def Functions();
+
+ private:
+  size_t Read(char* buffer, size_t size);
+  bool Seek(uint64_t offset, int origin);
+
+  ArchiveBytes Bytes;
+  uint64_t Offset = 0;
+  uint64_t WindowOffset = 0;
+  std::string Window;
+};

@@ -1,0 +1,66 @@
+#include "reader/source.h"
+
+#include "platform/files.h"
+#include "platform/shared_file.h"
+#include "platform/text_codec.h"
+#include "reader/text_encoding.h"
+
+static std::string MegabytesOf(uint64_t bytes) { return std::to_string(bytes >> 20) + " MB"; }
+
+// Empty if nothing speaks against reading the file.
+std::string Source::WhyNotRead(size_t file) const {
+  const uint64_t size = Files[file].Size;
+  if (size > kMostBytesOfFile) {
+    return "has more than " + MegabytesOf(kMostBytesOfFile);
+  }
+  if (size > kMostBytesRead - BytesRead) {
+    return "is beyond the first " + MegabytesOf(kMostBytesRead) + " of what is read";
+  }
+  return "";
+}
+
+std::optional<std::string> Source::Read(size_t file) {
+  std::string reason = WhyNotRead(file);
+  std::optional<std::string> bytes;
+  if (reason.empty()) {
+    bytes = ReadBytes(file, reason);
+    BytesRead += Files[file].Size;
+  }
+  if (!bytes) {
+    const std::string name = TextDecoder().ToUtf8(Files[file].Path);
+    Findings.push_back({FindingLevel::kError, "damaged", "", name + " " + reason + "."});
+  }
+  if (OnRead) {
+    OnRead();
+  }
+  return bytes;
+}
+
+static std::unique_ptr<Source> OpenFileOrFolder(const std::string& path, std::string& error) {
+  const FileKind kind = KindOf(path);
+  if (kind == FileKind::kFolder) {
+    return OpenFolder(path, error);
+  }
+  const auto file = std::make_shared<SharedFile>(path, LinkPolicy::kFollow);
+  if (file->IsOpen()) {
+    return OpenArchive(
+        {file->Size(), [file](uint64_t offset, char* buffer,
+                              size_t size) { return file->ReadAt(offset, buffer, size); }},
+        error);
+  }
+  error = kind == FileKind::kNone   ? "is not there; name an archive or a folder"
+          : kind == FileKind::kFile ? "cannot be opened; look at its permissions"
+                                    : "is neither a file nor a folder; name an archive or a folder";
+  return nullptr;
+}
+
+std::unique_ptr<Source> OpenSource(const std::string& path, std::string& error) {
+  std::unique_ptr<Source> source = OpenFileOrFolder(path, error);
+  const std::string name = TextDecoder().ToUtf8(SystemTextToUtf8(path));
+  if (source) {
+    source->Name = name;
+  } else {
+    error = name + " " + error + ".";
+  }
+  return source;
+}

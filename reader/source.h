@@ -1,0 +1,60 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "reader/archive.h"
+#include "reader/finding.h"
+
+// Where a history is read from: a folder or an archive. Nothing is written there and no lock is
+// taken. What is beyond these limits is left out, with a finding.
+
+inline constexpr uint64_t kMostBytesOfFile = 32 << 20;  // of one file that is read
+inline constexpr uint64_t kMostBytesRead = 1 << 30;     // of all files that are read
+inline constexpr size_t kMostFiles = 200'000;           // in a folder or an archive
+inline constexpr size_t kMostBytesOfName = 4096;        // of a path
+inline constexpr size_t kMostBytesOfNames = 32 << 20;   // of all paths
+
+struct SourceFile {
+  std::string Path;   // below the folder of the history: raw bytes, parts joined by '/'
+  uint64_t Size = 0;  // in bytes, as the folder or the archive says
+  size_t Entry = 0;   // for the source itself
+};
+
+class Source {
+ public:
+  virtual ~Source() = default;
+
+  // The raw bytes of Files[file]; nothing, and a finding, if they cannot be read whole or are
+  // beyond a limit.
+  std::optional<std::string> Read(size_t file);
+
+  std::string Name;                   // as the user gave it, UTF-8
+  std::vector<SourceFile> Files;      // regular files; no links, no names that begin with a dot
+  std::vector<Finding> Findings;      // what was left out or is damaged
+  std::function<void()> OnRead = {};  // called after each read
+
+ protected:
+  // A failure leaves its reason as the end of a sentence that begins with the name of the file.
+  virtual std::optional<std::string> ReadBytes(size_t file, std::string& reason) = 0;
+
+ private:
+  std::string WhyNotRead(size_t file) const;
+
+  uint64_t BytesRead = 0;
+};
+
+// Opens the history in a folder or an archive, wherever in it History.ini is; without that file,
+// where the reports of events are. Nothing, and in the text one line that says what is wrong and
+// what to do, if there is none. An archive's own path may be a link; below a folder none is
+// followed.
+std::unique_ptr<Source> OpenSource(const std::string& path, std::string& error);
+
+// The same for a history folder or a folder above one, and for the bytes of an archive.
+std::unique_ptr<Source> OpenFolder(const std::string& path, std::string& error);
+std::unique_ptr<Source> OpenArchive(ArchiveBytes bytes, std::string& error);
