@@ -1,14 +1,15 @@
 """Runs of all kinds, sixteen at once, over one history: first undisturbed, then with every third
-run killed at some moment, then on a file system that gives no locks. All the while a reader parses
-the history file. At the end what finished must be there, whole and once.
+run killed at a random moment, then on a file system without locks. Meanwhile a reader parses the
+history file. At the end everything that finished must be there, whole and once.
 """
 
 import random
 import threading
 import time
 
-import common
-from common import check
+import history
+from harness import Machine, in_threads
+from history import check
 
 WORKERS = 16
 SHARED = 4
@@ -18,8 +19,8 @@ COPIES = 5
 class Crowd:
     """The workers of one round and what they know to be finished."""
 
-    def __init__(self, program, seconds):
-        self.machine = common.Machine(program)
+    def __init__(self, machine, seconds):
+        self.machine = machine
         self.until = time.monotonic() + seconds
         self.lock = threading.Lock()
         self.runs = self.killed = self.reports = self.looks = self.begun = 0
@@ -28,7 +29,7 @@ class Crowd:
         self.cut = set()  # texts of the killed ones
 
     def before(self, chance):
-        """The words before a run: nothing, or what kills it."""
+        """The words before a run: none, or a command that kills it."""
         del chance
         return ()
 
@@ -75,14 +76,14 @@ class Crowd:
     def report(self, chance, worker):
         archive = self.machine.scratch / f"{worker}.zip"
         if self.run(chance, "-report", str(archive)):
-            entries = common.check_archive(archive)
-            check_sections(common.parse_history(entries["History.ini"]))
+            entries = history.read_archive(archive)
+            history.parse_history(entries["History.ini"], has_whole_events=True)
             self.reports += 1
 
     def message_during_start(self, number):
-        """A message that a run appends while the start still writes the log."""
+        """A run appends a message while the start still writes the log."""
         event = f"early{number}"
-        log = self.machine.history / event / "ORXInstallEvent.Log"
+        log = self.machine.history / event / history.LOG
         start = threading.Thread(target=self.machine.run, args=("-start", event))
         start.start()
         while not log.exists():
@@ -100,17 +101,17 @@ class Crowd:
         chance = random.Random(worker)
         number = 0
         while time.monotonic() < self.until:
-            outcome.attempt(f"worker {worker}", lambda: self.live(chance, worker, number))
+            outcome.attempt(f"overlap, worker {worker}", lambda: self.live(chance, worker, number))
             number += 1
 
     def read(self, outcome):
         while time.monotonic() < self.until:
-            outcome.attempt("reader", self.look)
+            outcome.attempt("overlap, reader", self.look)
             self.looks += 1
             time.sleep(0.01)
 
     def look(self):
-        check_sections(self.machine.sections())
+        history.parse_history(self.machine.ini.read_bytes(), has_whole_events=True)
 
     def go(self, outcome):
         for number in range(SHARED):
@@ -118,24 +119,18 @@ class Crowd:
         self.started |= {f"shared{number}" for number in range(SHARED)}
         self.begun += SHARED
         for number in range(10):
-            outcome.attempt("early message", lambda n=number: self.message_during_start(n))
-        threads = [threading.Thread(target=self.work, args=(outcome, worker))
-                   for worker in range(WORKERS)]
-        threads.append(threading.Thread(target=self.read, args=(outcome,)))
-        for thread in threads:
-            thread.start()
-        for thread in threads:
-            thread.join()
+            outcome.attempt("overlap, early message", lambda n=number: self.message_during_start(n))
+        in_threads([(self.work, outcome, worker) for worker in range(WORKERS)]
+                   + [(self.read, outcome)])
         self.judge(outcome)
-        self.machine.remove()
 
     def judge(self, outcome):
-        sections = outcome.attempt("history", self.machine.sections) or {"History": {"Count": "0"}}
-        outcome.attempt("count", lambda: self.check_count(sections))
+        sections = outcome.attempt("overlap, history", self.machine.sections) or {"History": {"Count": "0"}}
+        outcome.attempt("overlap, count", lambda: self.check_count(sections))
         for event in self.started:
-            outcome.attempt(f"event {event}", lambda e=event: self.check_event(sections, e))
-            outcome.attempt(f"log {event}", lambda e=event: self.check_log(sections, e))
-        outcome.attempt("last report", self.check_last_report)
+            outcome.attempt(f"overlap, event {event}", lambda e=event: self.check_event(sections, e))
+            outcome.attempt(f"overlap, log {event}", lambda e=event: self.check_log(sections, e))
+        outcome.attempt("overlap, last report", self.check_last_report)
 
     def check_count(self, sections):
         count = int(sections["History"]["Count"])
@@ -152,7 +147,7 @@ class Crowd:
 
     def log_of(self, keys, event):
         """The log's file, which a killed end may have moved without turning the key."""
-        places = [folder / event / "ORXInstallEvent.Log" for folder in
+        places = [folder / event / history.LOG for folder in
                   (self.machine.history, self.machine.history / (keys["Copy_Name"] or "none"))]
         found = [place for place in places if place.exists()]
         check(len(found) == 1, f"{len(found)} logs")
@@ -187,7 +182,7 @@ class Crowd:
     def check_last_report(self):
         archive = self.machine.scratch / "last.zip"
         self.machine.must("-report", str(archive), timeout=120)
-        entries = common.check_archive(archive)
+        entries = history.read_archive(archive)
         check(entries["History.ini"] == self.machine.ini.read_bytes(), "history in the archive")
         temporary = self.machine.history / ".History.tmp"
         self.machine.must("-start", "after")
@@ -233,29 +228,17 @@ class UnlockedCrowd(Crowd):
         self.machine.sections()
 
     def judge(self, outcome):
-        outcome.attempt("history", self.machine.sections)
+        outcome.attempt("overlap, history", self.machine.sections)
 
 
-def check_sections(sections):
-    for name, keys in sections.items():
-        check(name == "History" or set(keys) == set(common.EVENT_KEYS), f"part of section {name}")
+ROUNDS = (("undisturbed", UndisturbedCrowd, 0.5), ("killed", KilledCrowd, 0.35),
+          ("without locks", UnlockedCrowd, 0.15))
 
 
-def main():
-    parser = common.arguments(__doc__, "of all rounds together")
-    options = parser.parse_args()
-    seconds = options.seconds or 90
-    outcome = common.Outcome()
-    rounds = (("undisturbed", UndisturbedCrowd, 0.5), ("killed", KilledCrowd, 0.35),
-              ("without locks", UnlockedCrowd, 0.15))
-    for name, kind, share in rounds:
-        crowd = kind(options.program, seconds * share)
-        crowd.go(outcome)
-        print(f"{name}: {crowd.runs} runs, {crowd.killed} of them killed, {crowd.reports} archives "
-              f"and {crowd.looks} histories read meanwhile", flush=True)
-    print(f"{outcome.seconds():.0f} s")
-    outcome.end()
-
-
-if __name__ == "__main__":
-    main()
+def attack_together(program, outcome, seconds):
+    for name, kind, share in ROUNDS:
+        with Machine(program) as machine:
+            crowd = kind(machine, seconds * share)
+            crowd.go(outcome)
+        print(f"overlap, {name}: {crowd.runs} runs, {crowd.killed} of them killed, {crowd.reports} "
+              f"archives and {crowd.looks} histories read meanwhile", flush=True)

@@ -1,4 +1,4 @@
-"""Breaks the program off at every writing system call, and makes every call on its files fail.
+"""Kills the program at every writing system call, and makes every call on its files fail.
 
 Each kind of run is traced once. Then it is run again for each of its calls, from the same history,
 and that call either kills it or returns an error. A limit on the size of files does the same in
@@ -7,18 +7,18 @@ allows, nothing of other events may have changed, and the next runs must work.
 """
 
 import collections
+import contextlib
 import itertools
 import os
-import queue
 import random
 import re
 import resource
 import shutil
 import signal
-import threading
 
-import common
-from common import Fault, check
+import history
+from harness import Machine, difference, sample
+from history import check
 
 # By their names on all processors. A call that only reads is of interest where it fails.
 WRITING = {"open", "openat", "creat", "write", "writev", "pwrite64", "pwritev", "rename",
@@ -30,8 +30,7 @@ READING = {"open", "openat", "read", "pread64", "lseek", "stat", "lstat", "fstat
            "statx", "access", "faccessat", "faccessat2", "getdents64"}
 OPENING = {"open", "openat"}
 
-# What an interrupted call on these loses is not held against the program: the first two are opened
-# and written by libraries that do not repeat a call; without the third a list is shorter.
+# Libraries open and write these files and do not repeat an interrupted call.
 NOT_REPEATED = ("/Summary.txt", "/history.zip")
 
 Call = collections.namedtuple("Call", "name number text")  # the number counts calls of that name
@@ -39,9 +38,9 @@ Point = collections.namedtuple("Point", "scenario call fault")  # or a size inst
 
 
 class Scenario:
-    """One kind of run: from which history, and which changes of the history file it makes, each
-    of them whole or not at all. A change is a list of parts that belong together as long as
-    nothing fails."""
+    """One kind of run: the history that it starts from, and the changes that it makes to the
+    history file, each whole or not at all. A change is a list of parts, of which some may be
+    missing after an error."""
 
     def __init__(self, name, base, words, event, changes):
         self.name, self.base, self.words = name, base, words
@@ -73,23 +72,25 @@ def reset_count(sections):
 
 
 class Bench:
-    """A machine with the histories from which the runs start."""
+    """A machine with the histories that the runs start from."""
 
-    def __init__(self, program):
-        self.machine = common.Machine(program)
-        self.files = self.machine.scratch / "files"
-        self.archive = self.machine.scratch / "history.zip"
-        self.trace = self.machine.scratch / "trace"
+    def __init__(self, machine):
+        self.machine = machine
+        self.files = machine.scratch / "files"
+        self.archive = machine.archive
+        self.trace = machine.scratch / "trace"
         self.files.mkdir()
         for kind in ("log", "trc", "rsp"):
             (self.files / f"setup.{kind}").write_text(f"{kind} line\n" * 500)
         self.make_histories()
-        self.scenarios = self.make_scenarios()
+        self.scenarios = {scenario.name: scenario for scenario in self.make_scenarios()}
+        for scenario in self.scenarios.values():
+            self.trace_calls(scenario)
 
     def make_histories(self):
         machine = self.machine
-        (machine.root / "ZEK").mkdir()
-        shutil.copy(common.REPOSITORY / "scripts/sample-machine/Registry.reg",
+        machine.history.rmdir()
+        shutil.copy(history.REPOSITORY / "scripts/sample-machine/Registry.reg",
                     machine.root / "ZEK")
         machine.save("empty")
         own = [word for option, kind in (("-l", "log"), ("-t", "trc"), ("-u", "rsp"))
@@ -111,7 +112,7 @@ class Bench:
             return [[lambda s: self.count(s, identity)],
                     [lambda s: s.setdefault(identity, {}).update(keys)]]
         words = ("-Product", "P4", "-Command", "run")
-        target = self.machine.history / "C2/open/ORXInstallEvent.Log"
+        target = self.machine.history / "C2/open" / history.LOG
         return [
             Scenario("first start", "empty", ("-start", "new", *words), "new",
                      [[reset_count], *start("new")]),
@@ -130,14 +131,11 @@ class Bench:
         ]
 
     def count(self, sections, identity):
-        history = sections.setdefault("History", {"Count": "0"})
-        history["Count"] = str(int(history["Count"]) + 1)
-        log = self.machine.history / identity / "ORXInstallEvent.Log"
-        values = dict.fromkeys(common.EVENT_KEYS, "")
-        values.update(Event_ID=identity, Copy_Name="(Unknown)", Complete_Flag="FALSE",
-                      Log_File_Name="(none)", Trace_File="(none)", Response_File="(none)",
-                      Event_Log_File=str(log))
-        sections[identity] = values
+        counts = sections.setdefault("History", {"Count": "0"})
+        counts["Count"] = str(int(counts["Count"]) + 1)
+        sections[identity] = history.event(
+            identity, self.machine.history / identity / history.LOG,
+            Log_File_Name="(none)", Trace_File="(none)", Response_File="(none)")
 
     def collect(self, section, key, folder):
         name = section[key].rpartition("/")[2]
@@ -146,7 +144,7 @@ class Bench:
     def state(self):
         if not self.machine.ini.exists():
             return {}
-        return common.without_times(self.machine.sections())
+        return history.without_times(self.machine.sections())
 
     def begin(self, scenario):
         self.machine.restore(scenario.base)
@@ -157,7 +155,7 @@ class Bench:
                                                          str(self.trace), *options))
 
     def trace_calls(self, scenario):
-        """Notes the calls of an undisturbed run from its first access to the history on."""
+        """Keeps the calls of an undisturbed run, from its first access to the history on."""
         self.begin(scenario)
         check(self.traced(scenario)[0] == 0, "the undisturbed run failed")
         scenario.reference = self.picture()
@@ -182,9 +180,9 @@ class Bench:
             if is_ours and call.name != "exit_group" and (writes or call.name in READING):
                 for error in ("EIO", "EINTR", *(["ENOSPC"] if writes else [])):
                     yield Point(scenario, call, error)
-        history = len((self.machine.scratch / scenario.base / "ZEK/ORXHistory/History.ini")
-                      .read_bytes()) if scenario.base == "full" else 0
-        for size in sorted({0, 1, 17, *range(100, history + 1500, 150)}):
+        file = self.machine.scratch / scenario.base / history.HISTORY / "History.ini"
+        length = file.stat().st_size if file.exists() else 0
+        for size in sorted({0, 1, 17, *range(100, length + 1500, 150)}):
             yield Point(scenario, size, "kill")
             yield Point(scenario, size, "EFBIG")
 
@@ -206,7 +204,7 @@ class Bench:
             resource.setrlimit(resource.RLIMIT_FSIZE, (point.call, point.call))
             kills = point.fault == "kill"
             signal.signal(signal.SIGXFSZ, signal.SIG_DFL if kills else signal.SIG_IGN)
-        # The handling of this signal that Python sets is not the one that a program gets.
+        # Python ignores this signal; restore_signals would overrule set_limit.
         result, output = self.machine.run(*point.scenario.words, preexec_fn=set_limit,
                                           restore_signals=False)
         return (None if result == -signal.SIGXFSZ else result), output
@@ -254,11 +252,11 @@ class Bench:
     def check_own_log(self, scenario):
         if scenario.name not in ("logmessage", "end"):
             return
-        places = [folder / "open/ORXInstallEvent.Log"
+        places = [folder / "open" / history.LOG
                   for folder in (self.machine.history, self.machine.history / "C2")]
         logs = [place.read_bytes() for place in places if place.exists()]
         check(len(logs) == 1, f"{len(logs)} logs")
-        before = (self.machine.scratch / "full/ZEK/ORXHistory/open/ORXInstallEvent.Log")
+        before = self.machine.scratch / "full" / history.HISTORY / "open" / history.LOG
         check(logs[0].startswith(before.read_bytes()), "log lost its beginning")
 
     def check_next_runs(self, scenario, old):
@@ -274,12 +272,12 @@ class Bench:
             allowed = scenario.killed_states(old)[-1:]
         check(new in allowed, f"next run {difference(old, new)}")
         if "start" in scenario.name:
-            log = self.machine.history / scenario.event / "ORXInstallEvent.Log"
+            log = self.machine.history / scenario.event / history.LOG
             check(log.read_bytes().endswith(b" Starts  \n" + 94 * b"*" + b"\n"), "next log broken")
         check(not (self.machine.history / ".History.tmp").exists() or not scenario.changes
               or scenario.name == "report", "litter")
         self.machine.must("-report", str(self.archive))
-        entries = common.check_archive(self.archive)
+        entries = history.read_archive(self.archive)
         found = {str(path.relative_to(self.machine.history)): path
                  for path in self.machine.history.rglob("[!.]*")}
         check(set(entries) == set(found), f"archive holds {set(entries) ^ set(found)}")
@@ -293,7 +291,7 @@ class Bench:
             names[str(path.relative_to(self.machine.history))] = (
                 settled(path.read_bytes()) if path.is_file() else b"")
         if self.archive.exists():
-            entries = common.check_archive(self.archive)
+            entries = history.read_archive(self.archive)
             names.update((f"archive {name}", settled(data)) for name, data in entries.items())
         return names
 
@@ -304,50 +302,29 @@ def settled(text):
     return re.sub(rb"\n3\) Current.*?\n4\) ", b"\n", text, flags=re.DOTALL)
 
 
-def difference(old, new):
-    """The names that differ, each with the first lines that do."""
-    def lines(value):
-        text = value.decode(errors="replace") if isinstance(value, bytes) else str(value)
-        return text.splitlines() or [""]
-    parts = []
-    for name in sorted({*old, *new}):
-        if old.get(name) != new.get(name):
-            pairs = itertools.zip_longest(lines(old.get(name)), lines(new.get(name)))
-            pair = next((pair for pair in pairs if pair[0] != pair[1]), ("", ""))
-            parts.append(f"{name}: {pair[0]!s:.300} | {pair[1]!s:.300}")
-    return "; ".join(parts)
-
-
 def in_order(points, is_sample):
     """All points; for a sample the rarer ones first: one for each fault of each call of each kind
-    of run, then the others in no order."""
+    of run, then the others in random order."""
     if not is_sample:
         return points
     random.Random(1).shuffle(points)
     seen = collections.Counter()
     ranked = []
     for point in points:
-        name = point.call if isinstance(point.call, int) else point.call.name
-        kind = (point.scenario.name, "size" if isinstance(name, int) else name, point.fault)
-        seen[kind] += 1
-        ranked.append((min(seen[kind], 2), len(ranked), point))
+        seen[kind_of(point)] += 1
+        ranked.append((min(seen[kind_of(point)], 2), len(ranked), point))
     return [point for _, _, point in sorted(ranked, key=lambda item: item[:2])]
 
 
-def work(bench, points, outcome, done, limit):
-    scenarios = {scenario.name: scenario for scenario in bench.scenarios}
-    while not limit or outcome.seconds() < limit:
-        try:
-            point = points.get_nowait()
-        except queue.Empty:
-            return
-        # The texts of the calls and the histories are those of the other bench, by name the same.
-        own = Point(scenarios[point.scenario.name], point.call, point.fault)
-        where = "size" if isinstance(point.call, int) else point.call.name
-        number = point.call if isinstance(point.call, int) else point.call.number
-        outcome.attempt(f"{point.scenario.name}, {where} {number}, {point.fault}",
-                        lambda own=own: bench.check_point(own))
-        done[(point.scenario.name, where, point.fault)] += 1
+def kind_of(point):
+    call = "size" if isinstance(point.call, int) else point.call.name
+    return point.scenario.name, call, point.fault
+
+
+def name_of(point):
+    run, call, fault = kind_of(point)
+    number = point.call if isinstance(point.call, int) else point.call.number
+    return f"kill: {run}, {call} {number}, {fault}"
 
 
 def print_table(done, total):
@@ -359,39 +336,17 @@ def print_table(done, total):
         print(f"{run:12}{call:14}" + "".join(f"{cell:>8}" for cell in cells))
 
 
-def main():
-    parser = common.arguments(__doc__, "take a sample of about that many seconds")
-    options = parser.parse_args()
-    outcome = common.Outcome()
-    benches = [Bench(options.program) for _ in range(os.cpu_count() or 1)]
-    try:
-        for bench in benches:
-            for scenario in bench.scenarios:
-                bench.trace_calls(scenario)
-        bench = benches[0]
-        points = [point for scenario in bench.scenarios for point in bench.points(scenario)]
-        name = lambda p: "size" if isinstance(p.call, int) else p.call.name
-        total = collections.Counter((p.scenario.name, name(p), p.fault) for p in points)
-        done = collections.Counter()
-        waiting = queue.Queue()
-        for point in in_order(points, options.seconds > 0):
-            waiting.put(point)
-        workers = [threading.Thread(target=work, args=(bench, waiting, outcome, done,
-                                                       options.seconds)) for bench in benches]
-        for worker in workers:
-            worker.start()
-        for worker in workers:
-            worker.join()
-        print_table(done, total)
-    except Fault as fault:
-        outcome.faults.append(("set-up", fault))
-        print(f"FAULT {fault}")
-    finally:
-        for bench in benches:
-            bench.machine.remove()
-    print(f"{outcome.seconds():.0f} s")
-    outcome.end()
-
-
-if __name__ == "__main__":
-    main()
+def attack_calls(program, outcome, seconds):
+    with contextlib.ExitStack() as machines:
+        benches = [Bench(machines.enter_context(Machine(program)))
+                   for _ in range(os.cpu_count() or 1)]
+        points = [point for scenario in benches[0].scenarios.values()
+                  for point in benches[0].points(scenario)]
+        points = {name_of(point): point for point in in_order(points, seconds > 0)}
+        # A bench has scenarios of its own, by the same names; the calls are the same.
+        done = sample(outcome, [
+            (name, lambda bench, p=point: bench.check_point(
+                p._replace(scenario=bench.scenarios[p.scenario.name])))
+            for name, point in points.items()], seconds, benches)
+    print_table(collections.Counter(kind_of(points[name]) for name in done),
+                collections.Counter(kind_of(point) for point in points.values()))

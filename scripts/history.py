@@ -1,0 +1,83 @@
+"""The history file and the archive as all scripts read and write them."""
+
+import re
+import zipfile
+import zlib
+from pathlib import Path
+
+REPOSITORY = Path(__file__).resolve().parents[1]
+PROGRAM = REPOSITORY / "build/release/ORXInstallEventLog"
+HISTORY = Path("ZEK", "ORXHistory")  # below the common application data folder
+LOG = "ORXInstallEvent.Log"
+
+# The keys of an event that was started, in the order of the file.
+EVENT_KEYS = tuple(re.findall(
+    r'"(\w+)"', (REPOSITORY / "tests/support/event_keys.inc").read_text()))
+TIME = re.compile(r"\d{8} \d\d:\d\d:\d\d")
+
+
+class Fault(Exception):
+    """A promise that does not hold."""
+
+
+def check(holds, message):
+    if not holds:
+        raise Fault(message)
+
+
+def event(identity, log="", **keys):
+    """An event's keys as a start leaves them, with those given in place of the usual values."""
+    values = dict.fromkeys(EVENT_KEYS, "")
+    values.update(Event_ID=identity, Copy_Name="(Unknown)", Complete_Flag="FALSE",
+                  Event_Log_File=str(log), **keys)
+    return values
+
+
+def format_history(sections):
+    return "".join(f"[{name}]\n" + "".join(f"{key}={value}\n" for key, value in keys.items())
+                   for name, keys in sections.items())
+
+
+def parse_history(data, has_whole_events=False):
+    """The sections of a history file as the program writes it, in file order. Raises a Fault for a
+    line that is neither section nor key, for a name that comes twice, for a last line that is cut
+    and, on request, for an event with other keys than those of a start."""
+    check(data.endswith(b"\n"), "the history does not end with a line end")
+    sections = {}
+    keys = None
+    for line in data.decode("utf-8", "surrogateescape")[:-1].split("\n"):
+        if line.startswith("[") and line.endswith("]"):
+            check(line[1:-1] not in sections, f"section twice: {line!r}")
+            keys = sections[line[1:-1]] = {}
+            continue
+        key, sign, value = line.partition("=")
+        check(sign and keys is not None, f"neither section nor key: {line!r}")
+        check(key in EVENT_KEYS or key == "Count", f"unknown key: {line!r}")
+        check(key not in keys, f"key twice: {line!r}")
+        keys[key] = value
+    check(re.fullmatch(r"\d+", sections.get("History", {}).get("Count", "")), "no Count")
+    for name, keys in sections.items():
+        check(not has_whole_events or name == "History" or set(keys) == set(EVENT_KEYS),
+              f"part of section {name}")
+    return sections
+
+
+def without_times(sections):
+    return {name: {key: TIME.sub("TIME", value) if key.endswith("_Time") else value
+                   for key, value in keys.items()} for name, keys in sections.items()}
+
+
+def read_archive(path, has_blank_names=False):
+    """The entries of a valid archive of a history by name; no part of a name begins with a dot.
+    Blanks around a name are cut off, so that two files with names of nothing else may be one."""
+    try:
+        with zipfile.ZipFile(path) as archive:
+            check(archive.testzip() is None, f"damaged entry: {archive.testzip()}")
+            names = archive.namelist()
+            entries = {name: archive.read(name) for name in names}
+    except (zipfile.BadZipFile, OSError, ValueError, EOFError, zlib.error) as error:
+        raise Fault(f"no valid archive: {error}") from error
+    check(has_blank_names or len(entries) == len(names), "an entry twice")
+    for name in names:
+        check(not any(part.startswith(".") for part in name.split("/")), f"litter: {name}")
+    return entries

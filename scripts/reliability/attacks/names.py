@@ -1,0 +1,47 @@
+"""Identities, copy names and history files that lead out of the history folder."""
+
+import os
+
+from harness import attack
+from history import check
+from planted import run_any
+
+HOSTILE = ("..", "../outside", "../../../outside", "a/../../../../outside", ".", "./7", "7/.",
+           "7/..", "...", ".. ", " ..", "..\\..", "C:\\outside", "\\\\host\\share", "History",
+           "History.ini", "Summary.txt", ".History.tmp", ".copy-1.tmp", "-start", "[x]", "]", "=",
+           "a=b", ";c", "#", "a\nb", "a\r\n[History]\r\nCount=99", "\t", "\x01\x7f", "a/b/c",
+           "/", "//", "n" * 256, "n/" * 3000, "\udcc3(\udcff", "C1", "%s%n", "~", "$(id)", "*")
+
+
+@attack()
+def hostile_names(machine):
+    """Each as an identity and as a copy's name; then the history must still be in order."""
+    os.symlink(machine.outside / "folder", machine.history / "linked")
+    names = (*HOSTILE, "linked", "linked/new", str(machine.outside), str(machine.outside / "new"))
+    for number, name in enumerate(names):
+        for words in (("-start", name), ("-logmessage", name, "-message", name),
+                      ("-end", name, "-CopyName", f"copy{number}", "-Result", name),
+                      ("-start", f"event{number}"),
+                      ("-end", f"event{number}", "-CopyName", name)):
+            run_any(machine, words)
+    run_any(machine, ("-report",))
+    machine.must("-start", "last")
+    sections = machine.sections()
+    check(sections["History"]["Count"] == str(2 * len(names) + 1), "count")
+    check("last" in sections, "last start")
+
+
+@attack()
+def hostile_history(machine):
+    """A history file that names places outside as copies and identities."""
+    out = os.path.relpath(machine.outside, machine.history)
+    (machine.history / "linked").symlink_to(machine.outside)
+    text = "[History]\nCount=9\n"
+    for name in (out, str(machine.outside), "linked", f"x/../{out}", "."):
+        text += (f"[{name}]\nCopy_Name=\nLog_File_Name={machine.source}\n"
+                 f"[{name}/folder]\nCopy_Name=\nLog_File_Name={machine.source}\n"
+                 f"[in {name}]\nCopy_Name={name}\nLog_File_Name={machine.source}\n"
+                 f"[folder {name}]\nCopy_Name={name}/folder\nTrace_File={machine.source}\n")
+    machine.ini.write_text(text)
+    run_any(machine, ("-report",))
+    check(machine.archive.exists(), "no archive")

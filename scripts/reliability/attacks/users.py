@@ -1,0 +1,63 @@
+"""Histories that belong to others, and a history folder elsewhere."""
+
+import os
+import shutil
+import stat
+
+import history
+from harness import NOBODY, as_nobody, attack, digest
+from history import check
+from planted import RUNS, run_any
+
+
+@attack()
+def linked_history_folder(machine):
+    """An administrator may keep the history elsewhere: it is then what the link leads to."""
+    elsewhere = machine.scratch / "elsewhere"
+    machine.history.rmdir()
+    elsewhere.mkdir()
+    machine.history.symlink_to(elsewhere)
+    machine.watch()
+    for words in RUNS:
+        run_any(machine, words)
+    check((elsewhere / "C1").is_dir() or (elsewhere / "7").is_dir(), "nothing recorded")
+    check("History.ini" in history.read_archive(machine.archive), "nothing packed")
+
+
+@attack(needs_root=True)
+def foreign_history(machine):
+    """The history folder of another user: root adds to it and leaves it to its owner."""
+    os.chown(machine.history, NOBODY, NOBODY)
+    os.chmod(machine.archives, 0o777)
+    machine.watch()
+    machine.must("-start", "first", preexec_fn=as_nobody)
+    os.chmod(machine.ini, 0o640)
+    for words in RUNS:
+        run_any(machine, words)
+    status = machine.ini.stat()
+    check((status.st_uid, stat.S_IMODE(status.st_mode)) == (NOBODY, 0o640), "owner or mode")
+    machine.must("-end", "first", preexec_fn=as_nobody)
+    check(machine.sections()["first"]["Complete_Flag"] == "TRUE", "owner shut out")
+    machine.check_outside()
+
+
+@attack(needs_root=True)
+def read_only_history(machine):
+    """A user who may only read: nothing changes, and no installer is stopped."""
+    for words in RUNS:
+        run_any(machine, words)
+    machine.must("-start", "open")
+    os.chmod(machine.archives, 0o777)
+    machine.archive.unlink()
+    inside = {path: digest(path) for path in machine.history.rglob("*")}
+    for words in (*RUNS, ("-start", "new"), ("-end", "open", "-CopyName", "C9")):
+        run_any(machine, words, preexec_fn=as_nobody)
+    check(machine.archive.exists(), "no archive")
+    check(inside == {path: digest(path) for path in machine.history.rglob("*")}, "changed")
+    os.chmod(machine.history, 0o700)
+    for words in RUNS:
+        run_any(machine, words, preexec_fn=as_nobody)
+    shutil.rmtree(machine.root / "ZEK")
+    machine.watch()
+    machine.must("-start", "new", result=1, preexec_fn=as_nobody)
+    check(not (machine.root / "ZEK").exists(), "made a folder")

@@ -1,0 +1,89 @@
+#!/usr/bin/env python3
+"""Attacks on the program's promises.
+
+    run.py [--program PATH] [--only NAME] [--seconds N] [--list]
+
+Without options every attack runs against build/release/ORXInstallEventLog; what does not hold is
+printed under the attack's name, and the result is 1. "--only NAME" runs the attacks whose name
+contains NAME, "--program" another program, for example an older one that must fail.
+"--seconds N" limits the three large families (kill, overlap, planted) to about N seconds together,
+as a sample; all other attacks always run.
+
+To add an attack, write a short function in one of the files of attacks/:
+
+    @attack()
+    def pipe_as_archive_name(machine):
+        os.mkfifo(machine.archive)
+        machine.must("-report", str(machine.archive), result=3)
+
+It gets a scratch machine of its own (harness.Machine): `run`, `must`, `start` and `record` run the
+program, `sections` reads the history strictly, `history.read_archive` an archive. `check(holds,
+message)` states a promise. The machine is removed whatever happens, what was given to
+`machine.callback` before that; that nothing outside the history has changed is checked after every
+attack. Several rows of one attack are written as a table:
+
+    @attack(("a pipe", os.mkfifo), ("a folder", os.mkdir))
+    def taken_archive_name(machine, make):
+
+"needs_root=True" skips an attack for other users. A new file in attacks/ is found by itself.
+"""
+
+import argparse
+import importlib
+import os
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).resolve().parents[1]))
+
+import history  # noqa: E402
+import kill  # noqa: E402
+import overlap  # noqa: E402
+import planted  # noqa: E402
+from harness import ATTACKS, Outcome, run_attack  # noqa: E402
+
+# Name, function, share of the seconds of a sample, seconds of a whole run (0: until all is done).
+FAMILIES = (("kill", kill.attack_calls, 0.6, 0),
+            ("overlap", overlap.attack_together, 0.2, 90),
+            ("planted", planted.attack_paths, 0.2, 0))
+
+
+def load_attacks():
+    folder = Path(__file__).parent / "attacks"
+    sys.path.insert(0, str(folder.parent))
+    for file in sorted(folder.glob("*.py")):
+        importlib.import_module(f"attacks.{file.stem}")
+
+
+def main():
+    parser = argparse.ArgumentParser(description=__doc__,
+                                     formatter_class=argparse.RawDescriptionHelpFormatter)
+    parser.add_argument("--program", type=Path, default=history.PROGRAM)
+    parser.add_argument("--only", default="", metavar="NAME")
+    parser.add_argument("--seconds", type=float, default=0)
+    parser.add_argument("--list", action="store_true", help="print the names and do nothing")
+    options = parser.parse_args()
+    load_attacks()
+    attacks = [entry for entry in ATTACKS if options.only in entry.name]
+    families = [family for family in FAMILIES if options.only in family[0]]
+    if options.list:
+        print("\n".join([entry.name for entry in attacks] + [family[0] for family in families]))
+        return
+    if not attacks and not families:
+        parser.error("no attack has that name")
+    outcome = Outcome()
+    for entry in attacks:
+        if entry.needs_root and os.geteuid() != 0:
+            print(f"skipped {entry.name}: only root can try it")
+            continue
+        outcome.attempt(entry.name, lambda entry=entry: run_attack(options.program, entry.action))
+    print(f"{len(attacks)} attacks: {outcome.summary()}", flush=True)
+    for name, attack_family, share, whole in families:
+        seconds = options.seconds * share if options.seconds else whole
+        outcome.attempt(name, lambda f=attack_family, s=seconds: f(options.program, outcome, s))
+    print(outcome.summary())
+    sys.exit(1 if outcome.faults else 0)
+
+
+if __name__ == "__main__":
+    main()
