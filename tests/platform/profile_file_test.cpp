@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <functional>
 #include <regex>
@@ -11,6 +12,7 @@
 
 namespace {
 
+namespace fs = std::filesystem;
 using namespace std::string_literals;
 
 class ProfileFile : public Platform {
@@ -31,8 +33,8 @@ class ProfileFile : public Platform {
 
 TEST_F(ProfileFile, CutsValuesAtTheBuffersEnd) {
   EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "0123456789"));
-  for (const uint32_t size : {1U, 2U, 10U, 11U, 12U, 256U}) {
-    const std::string expected = "0123456789"s.substr(0, size - 1);
+  for (const uint32_t size : {0U, 1U, 2U, 10U, 11U, 12U, 256U}) {
+    const std::string expected = "0123456789"s.substr(0, std::max(size, 1U) - 1);
     EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", size), expected) << size;
     EXPECT_EQ(ReadProfileValue(Ini, "S", "None", "0123456789", size), expected) << size;
     EXPECT_EQ(ReadProfileValue(In("none"), "S", "Key", "0123456789", size), expected) << size;
@@ -46,8 +48,11 @@ TEST_F(ProfileFile, TakesBlanksAndOnePairOfQuotesOffAValue) {
                      readText),
             R"(a|a|"a"| a |"a|a"|"a'|a" "b|"||a b|a|a=b;c|[x]|||)");
   const auto readNumber = [this] { return std::to_string(ReadProfileInt(Ini, "S", "Key", 5)); };
-  EXPECT_EQ(ReadEach(R"(12|-12|0|12abc|abc|-| 7 |007|"12"|2147483647|)", readNumber),
-            "12|-12|0|12|0|0|7|7|12|2147483647|");
+  EXPECT_EQ(ReadEach(R"(12|-12|0|12abc|abc|-| 7 |007|"12"|2147483647||""|+5|+|+-5|- 5|" 7"|1 2|)",
+                     readNumber),
+            "12|-12|0|12|0|0|7|7|12|2147483647|5|5|5|0|0|0|7|1|");
+  EXPECT_EQ(ReadEach("0x10|-0xfG|0XF|0x|0o17|0b11|2147483648|4294967297|99999999999|", readNumber),
+            "16|-15|0|0|15|3|-2147483648|1|1215752191|");
   EXPECT_EQ(ReadProfileInt(Ini, "S", "None", -5), -5);
   EXPECT_EQ(ReadProfileInt(In("none"), "S", "Key", 5), 5);
 }
@@ -72,10 +77,11 @@ TEST_F(ProfileFile, ListsSectionsAsFarAsTheyFit) {
   EXPECT_EQ(ReadProfileSectionNames(Ini, 100).substr(0, 2), "\0\0"s);
   WriteProfileValue(Ini, "ab", "Key", "");
   WriteProfileValue(Ini, "cde", "Key", "");
-  for (const uint32_t size : {2, 3, 5, 6, 7, 8, 9, 100}) {
+  for (const uint32_t size : {0, 1, 2, 3, 5, 6, 7, 8, 9, 100}) {
     const std::string names = ReadProfileSectionNames(Ini, size);
-    EXPECT_LE(names.size(), size);
-    EXPECT_EQ(upToEnd(names), upToEnd("ab\0cde"s.substr(0, size - 2) + "\0\0"s)) << size;
+    const uint32_t counted = std::max(size, 2U);
+    EXPECT_LE(names.size(), counted);
+    EXPECT_EQ(upToEnd(names), upToEnd("ab\0cde"s.substr(0, counted - 2) + "\0\0"s)) << size;
   }
 }
 
@@ -104,6 +110,38 @@ TEST_F(ProfileFile, ChangesAtOnceWhenTheOutermostGuardEnds) {
   EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", 256), "new");
   EXPECT_NE(FileText(Ini), before);
   EXPECT_EQ(Tree(), "a.ini\n");
+}
+
+TEST_F(ProfileFile, KeepsSeveralFilesUnderOneGuard) {
+  const std::string other = Make("other/b.ini", "[S]\nKey=b\n");
+  {
+    const ProfileGuard guard(Ini);
+    EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "a"));
+    EXPECT_EQ(ReadProfileValue(other, "S", "Key", "none", 256), "b");
+    const ProfileGuard ofOther(other);
+    EXPECT_TRUE(WriteProfileValue(other, "S", "Key", "new"));
+    EXPECT_TRUE(WriteProfileValue(In("c.ini"), "S", "Key", "c"));
+    EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "none", 256), "a");
+    EXPECT_EQ(ReadProfileValue(other, "S", "Key", "none", 256), "new");
+  }
+  EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "none", 256), "a");
+  EXPECT_EQ(ReadProfileValue(other, "S", "Key", "none", 256), "new");
+  EXPECT_EQ(ReadProfileValue(In("c.ini"), "S", "Key", "none", 256), "c");
+  EXPECT_EQ(Tree(), "a.ini\nc.ini\nother/\nother/b.ini\n");
+}
+
+// The count that was taken from a file that could not be read must not be written to it.
+TEST_F(ProfileFile, IsNotWrittenAfterAReadThatFailed) {
+  fs::create_directory(Ini);
+  {
+    const ProfileGuard guard(Ini);
+    EXPECT_EQ(ReadProfileInt(Ini, "S", "Count", 0), 0);
+    fs::remove(Ini);
+    Make("a.ini", "[S]\nCount=5\n");
+    EXPECT_FALSE(WriteProfileValue(Ini, "S", "Count", "1"));
+  }
+  EXPECT_EQ(ReadProfileInt(Ini, "S", "Count", 0), 5);
+  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Count", "6"));
 }
 
 }  // namespace

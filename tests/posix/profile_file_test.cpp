@@ -1,0 +1,104 @@
+#include "platform/profile_file.h"
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/file.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+#include <sys/xattr.h>
+
+#include <chrono>
+#include <csignal>
+#include <thread>
+
+#include "platform/posix/descriptor.h"
+#include "tests/platform/contract.h"
+
+namespace {
+
+using namespace std::chrono_literals;
+using std::chrono::steady_clock;
+
+class ProfileOnPosix : public Platform {
+ protected:
+  std::string Value() const { return ReadProfileValue(Ini, "S", "Key", "none", 256); }
+
+  const std::string Ini = Make("a.ini", "[S]\nKey=old\n");
+};
+
+TEST_F(ProfileOnPosix, IsReadAgainAfterAChangeThatOnlyTheChangeTimeShows) {
+  EXPECT_EQ(Value(), "old");
+  struct stat before = {};
+  ASSERT_EQ(::stat(Ini.c_str(), &before), 0);
+  std::this_thread::sleep_for(20ms);  // the clock of file times has steps of some milliseconds
+  Make("a.ini", "[S]\nKey=new\n");
+  const timespec times[] = {before.st_atim, before.st_mtim};
+  ASSERT_EQ(::utimensat(AT_FDCWD, Ini.c_str(), times, /*flags=*/0), 0);
+  EXPECT_EQ(Value(), "new");
+}
+
+TEST_F(ProfileOnPosix, IsAsBeforeAfterAReplacementThatFailed) {
+  EXPECT_EQ(Value(), "old");
+  std::signal(SIGXFSZ, SIG_IGN);
+  rlimit limit = {};
+  ASSERT_EQ(::getrlimit(RLIMIT_FSIZE, &limit), 0);
+  const rlimit nothing = {0, limit.rlim_max};
+  ::setrlimit(RLIMIT_FSIZE, &nothing);
+  const bool isWritten = WriteProfileValue(Ini, "S", "Key", "new");
+  ::setrlimit(RLIMIT_FSIZE, &limit);
+  EXPECT_FALSE(isWritten);
+  EXPECT_EQ(Value(), "old");
+  EXPECT_EQ(Tree(), "a.ini\n");
+}
+
+// An access control list as the kernel takes it: version 2, then tag, permissions and ID of each
+// entry. User 65534 may read, and the mask allows reading and writing.
+constexpr char accessList[] =
+    "\2\0\0\0"
+    "\1\0\6\0\xFF\xFF\xFF\xFF"
+    "\2\0\4\0\xFE\xFF\0\0"
+    "\4\0\0\0\xFF\xFF\xFF\xFF"
+    "\x10\0\6\0\xFF\xFF\xFF\xFF"
+    "\x20\0\0\0\xFF\xFF\xFF\xFF";
+constexpr const char* listName = "system.posix_acl_access";
+
+TEST_F(ProfileOnPosix, KeepsOwnerPermissionsAndAccessList) {
+  const uid_t owner = ::getuid() == 0 ? 65534 : ::getuid();
+  for (const mode_t mode : {0600, 0640, 0604, 04755}) {
+    ASSERT_EQ(::chown(Ini.c_str(), owner, /*group=*/::getgid()), 0);
+    ASSERT_EQ(::chmod(Ini.c_str(), mode), 0);
+    EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", std::to_string(mode)));
+    struct stat status = {};
+    ASSERT_EQ(::stat(Ini.c_str(), &status), 0);
+    EXPECT_EQ(status.st_mode & 07777, mode);
+    EXPECT_EQ(status.st_uid, owner);
+    EXPECT_LT(::getxattr(Ini.c_str(), listName, /*value=*/nullptr, /*size=*/0), 0);
+  }
+  if (::setxattr(Ini.c_str(), listName, accessList, sizeof accessList - 1, /*flags=*/0) != 0) {
+    GTEST_SKIP() << "a file system without access control lists";
+  }
+  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "with a list"));
+  char list[sizeof accessList] = {};
+  ::getxattr(Ini.c_str(), listName, list, sizeof list);
+  EXPECT_EQ(std::string(list, sizeof list), std::string(accessList, sizeof accessList));
+}
+
+TEST_F(ProfileOnPosix, WaitsForALockOnlyOnce) {
+  const Descriptor folder(::open(Root.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+  ASSERT_EQ(::flock(folder.Get(), LOCK_EX), 0);
+  LimitProfileLockTime(60ms);
+  const auto begin = steady_clock::now();
+  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "first"));
+  const auto middle = steady_clock::now();
+  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "second"));
+  EXPECT_GE(middle - begin, 60ms);
+  EXPECT_LT(steady_clock::now() - middle, 50ms);
+  EXPECT_EQ(Value(), "second");
+  EXPECT_EQ(Tree(), "a.ini\n");
+  ::flock(folder.Get(), LOCK_UN);
+  const ProfileGuard guard(Ini);  // a free lock is still taken
+  EXPECT_NE(::flock(folder.Get(), LOCK_EX | LOCK_NB), 0);
+  LimitProfileLockTime(10s);
+}
+
+}  // namespace
