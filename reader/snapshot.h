@@ -30,3 +30,7 @@ size_t PartOf(Section section);
 // The items of a part in the order of the report, each process on its own. Nothing if the text is
 // not built as the recorder writes it.
 std::optional<std::vector<Item>> ReadItems(std::string_view text, size_t part, Padding padding);
+
+// How many bytes at the start of the text are the lines of a part that breaks off there: up to the
+// first line that it cannot have.
+size_t TableLength(std::string_view text, size_t part);

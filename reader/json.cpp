@@ -1,0 +1,140 @@
+#include "reader/json.h"
+
+#include <nlohmann/json.hpp>
+#include <utility>
+
+#include "reader/check.h"
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+std::string Line(const Json& object) {
+  return object.dump(/*indent=*/-1, ' ', /*ensure_ascii=*/false, Json::error_handler_t::replace);
+}
+
+template <typename T>
+Json OrNull(const std::optional<T>& value) {
+  return value ? Json(*value) : Json();
+}
+
+Json TimeOrNull(const std::optional<LocalTime>& time) {
+  return time ? Json(IsoTime(*time)) : Json();
+}
+
+Json Facts(const Event& event) {
+  const ChangeCounts& counts = event.Differences.Counts;
+  return {{"event", event.Identity},
+          {"computer", OrNull(event.Computer)},
+          {"started", TimeOrNull(event.Started)},
+          {"ended", TimeOrNull(event.Ended)},
+          {"state", StateName(event.State)},
+          {"action", event.Action},
+          {"type", event.Type},
+          {"product", event.Product},
+          {"version", event.Version},
+          {"service_level", event.ServiceLevel},
+          {"path", event.Path},
+          {"copy", event.Copy},
+          {"result", event.Result},
+          {"changes",
+           {{"added", counts.Added}, {"removed", counts.Removed}, {"changed", counts.Changed}}}};
+}
+
+Json Fields(const Change& change) {
+  Json fields = Json::object();
+  for (const FieldChange& field : change.Fields) {
+    fields[std::string(field.Name)] = {{"before", OrNull(field.Before)},
+                                       {"after", OrNull(field.After)}};
+  }
+  return fields;
+}
+
+void AddChange(Json& object, const Change& change) {
+  object["change"] = ChangeName(change.Kind);
+  object["section"] = SectionName(change.Where);
+  object["path"] = change.Path;
+  object["name"] = change.Name;
+  object["fields"] = Fields(change);
+}
+
+Json FilesOf(const Event& event) {
+  Json files = Json::array();
+  for (const EventFile& file : event.Files) {
+    files.push_back({{"key", file.Key},
+                     {"path", file.Path},
+                     {"present", file.IsPresent},
+                     {"size", file.IsPresent ? Json(file.Size) : Json()}});
+  }
+  return files;
+}
+
+Json MessagesOf(const Event& event) {
+  Json messages = Json::array();
+  ForEachMessage(event, [&messages](std::string_view message) { messages.push_back(message); });
+  return messages;
+}
+
+Json ChangesOf(const Event& event) {
+  Json changes = Json::array();
+  for (const Change& change : event.Differences.List) {
+    AddChange(changes.emplace_back(Json::object()), change);
+  }
+  return changes;
+}
+
+// The sections of which nothing can be said.
+Json NotCompared(const Event& event) {
+  Json sections = Json::array();
+  for (size_t i = 0; i < kSectionCount; ++i) {
+    if (!event.Differences.Compared[i]) {
+      sections.push_back(SectionName(static_cast<Section>(i)));
+    }
+  }
+  return sections;
+}
+
+}  // namespace
+
+std::string EventJson(std::string_view source, const Event& event) {
+  Json object = Facts(event);
+  object["source"] = source;
+  return Line(object);
+}
+
+std::string EventDetailsJson(std::string_view source, const Event& event) {
+  Json object = Facts(event);
+  object["command_line"] = event.CommandLine;
+  object["report"] = OrNull(event.Report);
+  object["files"] = FilesOf(event);
+  object["messages"] = MessagesOf(event);
+  object["changes"] = ChangesOf(event);
+  object["not_compared"] = NotCompared(event);
+  object["source"] = source;
+  return Line(object);
+}
+
+std::string ChangeJson(std::string_view source, const Event& event, const Change& change) {
+  Json object = {{"event", event.Identity}};
+  AddChange(object, change);
+  object["source"] = source;
+  return Line(object);
+}
+
+std::string FindingJson(std::string_view source, const Finding& finding) {
+  return Line({{"level", LevelName(finding.Level)},
+               {"code", finding.Code},
+               {"event", finding.Event},
+               {"text", finding.Text},
+               {"source", source}});
+}
+
+std::string HitJson(std::string_view source, const Event& event, std::string_view kind,
+                    std::string_view name, std::string_view text) {
+  return Line({{"event", event.Identity},
+               {"started", TimeOrNull(event.Started)},
+               {"kind", kind},
+               {"name", name},
+               {"text", text},
+               {"source", source}});
+}

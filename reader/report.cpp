@@ -1,0 +1,422 @@
+#include "reader/report.h"
+
+#include <algorithm>
+#include <span>
+#include <utility>
+
+#include "reader/lines.h"
+#include "reader/report_marks.h"
+
+namespace {
+
+using Marks = std::span<const Mark>;
+
+// The value after a label, with further lines up to the one that begins with the next label: a
+// value from the command line may have line breaks in it. Nothing at the start of another block.
+std::optional<std::string_view> ValueUpTo(LineReader& lines, std::string_view label,
+                                          std::string_view nextLabel) {
+  const auto first = lines.Labelled(label);
+  if (!first) {
+    return std::nullopt;
+  }
+  std::string_view value = *first;
+  while (!lines.Remaining().starts_with(nextLabel)) {
+    const auto line = lines.Next();
+    if (!line || line->starts_with(kStartTitle) || line->starts_with("**********")) {
+      return std::nullopt;
+    }
+    value = {value.data(), static_cast<size_t>(line->data() + line->size() - value.data())};
+  }
+  return value;
+}
+
+std::optional<StartBlock> ReadStart(LineReader& lines) {
+  StartBlock block;
+  const auto time = lines.Labelled(kStartTitle);
+  const auto identity = ValueUpTo(lines, "EventID       :", "Product       :");
+  const auto product = ValueUpTo(lines, "Product       :", "Service Level :");
+  const auto serviceLevel = ValueUpTo(lines, "Service Level :", "CommandLine   :");
+  LineReader ahead = lines;
+  auto commandLine = ValueUpTo(ahead, "CommandLine   :", "\nSystem Information: \n");
+  if (commandLine) {
+    lines = ahead;
+  } else {
+    commandLine = lines.Labelled("CommandLine   :");  // the run broke off after it
+  }
+  if (!time || !identity || !product || !serviceLevel || !commandLine) {
+    return std::nullopt;
+  }
+  return StartBlock{*time, *identity, *product, *serviceLevel, *commandLine};
+}
+
+// The name of the computer. Nothing if the block breaks off or is none.
+std::optional<std::string_view> ReadComputer(LineReader& lines) {
+  const std::string rule(45, '=');
+  if (!lines.SkipAll({"", "System Information: ", rule})) {
+    return std::nullopt;
+  }
+  const auto name = lines.Labelled("Computer Name       :");
+  for (const std::string_view label :
+       {"OS                  :", "Type                :", "Service Pack        :",
+        "Number of processors:", "CPU                 :"}) {
+    if (!lines.Labelled(label)) {
+      return std::nullopt;
+    }
+  }
+  return lines.SkipAll({rule, ""}) ? name : std::nullopt;
+}
+
+enum class EndStatus {
+  kWhole,
+  kBreaksOff,   // the text ends first
+  kContradicts  // another text is there
+};
+
+struct EndBlocks {
+  EndStatus Status = EndStatus::kWhole;
+  ResultBlock Result;
+  size_t End = 0;  // offset after them
+};
+
+// The result block and the end block.
+bool ReadEndLines(LineReader& lines, ResultBlock& result) {
+  const std::string rule(69, '=');
+  if (!lines.SkipAll({"", "", "", ""}) || !lines.Labelled("Result of ") || !lines.Skip(rule)) {
+    return false;
+  }
+  for (const auto& [label, field] :
+       {std::pair("Start Time                   :", &ResultBlock::StartTime),
+        std::pair("End   Time                   :", &ResultBlock::EndTime),
+        std::pair("ORX Products & Build Level   :", &ResultBlock::Product),
+        std::pair("Service Level                :", &ResultBlock::ServiceLevel),
+        std::pair("Install Type ( GUI | Silent ):", &ResultBlock::Type),
+        std::pair("Installation Action          :", &ResultBlock::Action),
+        std::pair("Result                       :", &ResultBlock::Result),
+        std::pair("Log File Name                :", &ResultBlock::LogFile),
+        std::pair("Trace File Name              :", &ResultBlock::TraceFile)}) {
+    const auto value = lines.Labelled(label);
+    if (!value) {
+      return false;
+    }
+    result.*field = *value;
+  }
+  return lines.SkipAll({rule, "", ""}) && lines.Labelled(kEndTitle);
+}
+
+EndBlocks ReadEnd(std::string_view text, size_t offset) {
+  EndBlocks blocks;
+  LineReader lines(text.substr(offset));
+  if (!ReadEndLines(lines, blocks.Result)) {
+    const bool hasLine = lines.Remaining().find('\n') != std::string_view::npos;
+    blocks.Status = hasLine ? EndStatus::kContradicts : EndStatus::kBreaksOff;
+  }
+  blocks.End = text.size() - lines.Remaining().size();
+  return blocks;
+}
+
+// The second snapshot of a run, as far as it goes.
+struct Ending {
+  Marks Box;  // its mark and those after it
+  const Mark* BoxEnd = nullptr;
+  EndBlocks Blocks;
+};
+
+class RunReader {
+ public:
+  // The marks of the run, from its start block on if it has one. The text ends with the run.
+  RunReader(std::string_view text, size_t begin, Marks marks, const ReportFacts& facts)
+      : Text(text), Facts(facts), AllMarks(marks), Cursor(begin) {}
+
+  ReportRun Read() {
+    ReadStartAndBefore();
+    const std::optional<Ending> ending = Facts.MayHaveEnded ? FindEnding() : std::nullopt;
+    const size_t limit = ending ? ending->Box.front().Begin : Text.size();
+    if (Run.Before && !BeforeIsWhole) {
+      SkipBrokenPart(limit);
+    }
+    AddMessages(Cursor, ending ? limit : EndOfMessages());
+    if (ending) {
+      TakeEnding(*ending);
+    } else if (Facts.EndTime) {
+      Run.IsWhole = false;
+    }
+    return std::move(Run);
+  }
+
+ private:
+  bool IsOfEvent(std::string_view boxText, std::string_view words) const {
+    return !Identity ||
+           (boxText.starts_with(*Identity) && boxText.substr(Identity->size()).starts_with(words));
+  }
+
+  void AddMessages(size_t begin, size_t end) {
+    if (begin < end) {
+      Run.Messages.push_back(Text.substr(begin, end - begin));
+    }
+  }
+
+  void ReadStartAndBefore() {
+    if (Facts.Identity) {
+      Identity = *Facts.Identity;
+    }
+    if (AllMarks.empty() || AllMarks.front().Kind != MarkKind::kStart) {
+      return;
+    }
+    const Mark& start = AllMarks.front();
+    AddMessages(Cursor, start.Begin);
+    LineReader lines(Text.substr(start.Begin));
+    Run.Start = ReadStart(lines);
+    if (Run.Start) {
+      Identity = Run.Start->Identity;
+      Run.Computer = ReadComputer(lines);
+    }
+    Cursor = Text.size() - lines.Remaining().size();
+    const auto box = std::find_if(AllMarks.begin(), AllMarks.end(), [this](const Mark& mark) {
+      return mark.Begin >= Cursor && mark.Kind == MarkKind::kBeforeBox;
+    });
+    constexpr std::string_view words = " -- Before ";
+    Run.IsWhole = box != AllMarks.end() && Run.Computer && box->Begin == Cursor &&
+                  IsOfEvent(box->Text, words);
+    if (!Run.IsWhole) {
+      // The run broke off here: the rest of a line is no message.
+      const size_t lineEnd = Text.find('\n', Cursor);
+      Cursor = lineEnd == Text.npos ? Text.size() : Cursor;
+      return;
+    }
+    const std::string_view action = box->Text.substr(Identity->size() + words.size());
+    Run.StartAction = action.substr(0, action.rfind(" Starts "));
+    ReadBefore(Marks(box, AllMarks.end()));
+  }
+
+  void ReadBefore(Marks marks) {
+    const auto end = std::find_if(marks.begin(), marks.end(), [this](const Mark& mark) {
+      return (mark.Kind == MarkKind::kBeforeEnd && IsOfEvent(mark.Text, " Before ")) ||
+             IsAfterBox(mark);
+    });
+    BeforeIsWhole = end != marks.end() && end->Kind == MarkKind::kBeforeEnd;
+    const size_t parts = TakeParts(Marks(marks.begin(), end), Run.Before.emplace());
+    if (BeforeIsWhole && parts == kSnapshotParts) {
+      ClosePart(*Run.Before, end->Begin);
+      Cursor = end->End;
+    } else {
+      Cursor = PartBegin;
+      BrokenPart = parts;
+      Run.IsWhole = BeforeIsWhole = false;
+    }
+  }
+
+  // Fills all parts but the last that begins, and returns how many begin.
+  size_t TakeParts(Marks marks, Snapshot& snapshot) {
+    size_t parts = 0;
+    PartBegin = marks.front().End;
+    for (const Mark& mark : marks) {
+      if (mark.Kind == MarkKind::kHeading && mark.Part == parts) {
+        if (parts > 0) {
+          snapshot.Parts[parts - 1] = Text.substr(PartBegin, mark.Begin - 1 - PartBegin);
+        }
+        PartBegin = mark.End;
+        ++parts;
+      }
+    }
+    return parts;
+  }
+
+  void ClosePart(Snapshot& snapshot, size_t end) const {
+    snapshot.Parts.back() = Text.substr(PartBegin, end - PartBegin);
+  }
+
+  // Messages follow the part at which the first run broke off: all from the first line on that its
+  // tables cannot have.
+  void SkipBrokenPart(size_t limit) {
+    if (BrokenPart > 0 && Cursor < limit) {
+      Cursor += TableLength(Text.substr(Cursor, limit - Cursor), BrokenPart - 1);
+    }
+  }
+
+  std::optional<Ending> FindEnding() const {
+    std::optional<Ending> whole;
+    std::optional<Ending> broken;
+    std::optional<Ending> earlier;
+    for (size_t i = 0; i < AllMarks.size(); ++i) {
+      if (AllMarks[i].Begin < Cursor || !IsAfterBox(AllMarks[i])) {
+        continue;
+      }
+      const Ending ending = EndingAt(AllMarks.subspan(i));
+      if (IsEndOfFacts(ending)) {
+        whole = ending;
+      } else if (ending.Blocks.Status == EndStatus::kBreaksOff) {
+        broken = ending;
+      } else if (IsEarlierEndOfFacts(ending)) {
+        earlier = ending;
+      }
+    }
+    return whole ? whole : broken ? broken : earlier;
+  }
+
+  bool IsAfterBox(const Mark& mark) const {
+    return mark.Kind == MarkKind::kAfterBox && IsOfEvent(mark.Text, " -- After ");
+  }
+
+  Ending EndingAt(Marks marks) const {
+    Ending ending;
+    ending.Box = marks;
+    for (const Mark& mark : marks.subspan(1)) {
+      if (IsAfterBox(mark)) {
+        ending.Blocks.Status = EndStatus::kContradicts;
+        return ending;
+      }
+      if (mark.Kind == MarkKind::kAfterEnd && IsOfEvent(mark.Text, " -- After ")) {
+        ending.BoxEnd = &mark;
+        ending.Blocks = ReadEnd(Text, mark.End);
+        return ending;
+      }
+    }
+    ending.Blocks.Status = EndStatus::kBreaksOff;
+    ending.Blocks.End = Text.size();
+    return ending;
+  }
+
+  bool HasStartOfFacts(const Ending& ending) const {
+    return ending.Blocks.Status == EndStatus::kWhole &&
+           (!Facts.StartTime || ending.Blocks.Result.StartTime == *Facts.StartTime);
+  }
+
+  bool IsEndOfFacts(const Ending& ending) const {
+    return HasStartOfFacts(ending) &&
+           (!Facts.EndTime || ending.Blocks.Result.EndTime == *Facts.EndTime);
+  }
+
+  // A second end finds the folder moved: it changes the time in the history file, not the report.
+  bool IsEarlierEndOfFacts(const Ending& ending) const {
+    return HasStartOfFacts(ending) && ending.Blocks.Result.EndTime < *Facts.EndTime &&
+           ending.Blocks.End == Text.size();
+  }
+
+  void TakeEnding(const Ending& ending) {
+    const auto boxEnd =
+        std::find_if(ending.Box.begin(), ending.Box.end(),
+                     [&ending](const Mark& mark) { return &mark == ending.BoxEnd; });
+    const size_t parts = TakeParts(Marks(ending.Box.begin(), boxEnd), Run.After.emplace());
+    if (ending.BoxEnd != nullptr && parts == kSnapshotParts) {
+      ClosePart(*Run.After, ending.BoxEnd->Begin);
+    }
+    if (ending.Blocks.Status == EndStatus::kWhole) {
+      Run.Result = ending.Blocks.Result;
+      AddMessages(ending.Blocks.End, Text.size());
+    } else {
+      Run.IsWhole = false;
+    }
+  }
+
+  // The second snapshot may break off within its first box, which is no message then.
+  size_t EndOfMessages() {
+    if (!Facts.MayHaveEnded) {
+      return Text.size();
+    }
+    const std::string head = std::string(AfterBoxHead()) + std::string(Identity.value_or("")) +
+                             (Identity ? " -- After " : "");
+    size_t begin = Text.size();
+    for (int lines = 0; lines < 5 && begin > Cursor; ++lines) {
+      const size_t lineEnd = begin > 1 ? Text.rfind('\n', begin - 2) : Text.npos;
+      begin = lineEnd == Text.npos ? 0 : lineEnd + 1;
+      const std::string_view tail = Text.substr(begin);
+      if (begin >= Cursor && (head.starts_with(tail) || tail.starts_with(head))) {
+        Run.IsWhole = false;
+        return begin;
+      }
+    }
+    return Text.size();
+  }
+
+  std::string_view Text;
+  const ReportFacts& Facts;
+  Marks AllMarks;
+  ReportRun Run;
+  std::optional<std::string_view> Identity;
+  bool BeforeIsWhole = false;
+  size_t BrokenPart = 0;
+  size_t PartBegin = 0;
+  size_t Cursor = 0;  // all before it belongs to a block
+};
+
+}  // namespace
+
+// The start of each run, at most up to the one of the facts: a start at which the history file had
+// the time of that start already is a message.
+static std::vector<size_t> FindStarts(std::string_view text, Marks marks,
+                                      const ReportFacts& facts) {
+  std::vector<size_t> starts;
+  std::optional<std::string_view> identity;
+  for (size_t i = 0; i < marks.size(); ++i) {
+    if (marks[i].Kind != MarkKind::kStart) {
+      continue;
+    }
+    LineReader lines(text.substr(marks[i].Begin));
+    const auto block = ReadStart(lines);
+    if (!block && !starts.empty()) {
+      continue;
+    }
+    if (identity && block->Identity != *identity) {
+      continue;
+    }
+    starts.push_back(i);
+    if (!block || !facts.StartTime || block->Time >= *facts.StartTime) {
+      return starts;
+    }
+    identity = block->Identity;
+  }
+  // None is of the facts, so that nothing tells the others from messages.
+  starts.erase(starts.begin() + std::min<ptrdiff_t>(1, std::ssize(starts)), starts.end());
+  return starts;
+}
+
+// Without facts, the last end says when its run started.
+static std::optional<std::string> StartTimeOfEnd(std::string_view text, Marks marks) {
+  for (size_t i = marks.size(); i > 0; --i) {
+    if (marks[i - 1].Kind == MarkKind::kAfterEnd) {
+      const EndBlocks blocks = ReadEnd(text, marks[i - 1].End);
+      if (blocks.Status == EndStatus::kWhole) {
+        return std::string(blocks.Result.StartTime);
+      }
+    }
+  }
+  return std::nullopt;
+}
+
+std::vector<ReportRun> ParseReport(std::string_view text, const ReportFacts& facts) {
+  const std::vector<Mark> marks = FindMarks(text);
+  ReportFacts known = facts;
+  if (!known.StartTime) {
+    known.StartTime = StartTimeOfEnd(text, marks);
+  }
+  const std::vector<size_t> starts = FindStarts(text, marks, known);
+  ReportFacts unknown;
+  unknown.Identity = facts.Identity;
+  std::vector<ReportRun> runs;
+  const size_t count = std::max<size_t>(starts.size(), 1);
+  for (size_t i = 0; i < count; ++i) {
+    const bool isLast = i + 1 == count;
+    const size_t firstMark = starts.empty() ? 0 : starts[i];
+    const size_t endMark = isLast ? marks.size() : starts[i + 1];
+    const size_t begin = i == 0 ? 0 : marks[firstMark].Begin;
+    const size_t end = isLast ? text.size() : marks[endMark].Begin;
+    RunReader reader(text.substr(0, end), begin,
+                     Marks(marks).subspan(firstMark, endMark - firstMark),
+                     isLast ? known : unknown);
+    runs.push_back(reader.Read());
+  }
+  return runs;
+}
+
+void UnifyLineEnds(std::string& text) {
+  size_t kept = text.find("\r\n");
+  if (kept == text.npos) {
+    return;
+  }
+  for (size_t i = kept; i < text.size(); ++i) {
+    if (text[i] != '\r' || i + 1 == text.size() || text[i + 1] != '\n') {
+      text[kept++] = text[i];
+    }
+  }
+  text.resize(kept);
+}
