@@ -78,8 +78,9 @@ def main():
             continue
         outcome.attempt(entry.name, lambda entry=entry: run_attack(options.program, entry.action))
     print(f"{len(attacks)} attacks: {outcome.summary()}", flush=True)
+    shares = sum(share for _, _, share, _ in families)
     for name, attack_family, share, whole in families:
-        seconds = options.seconds * share if options.seconds else whole
+        seconds = options.seconds * share / shares if options.seconds else whole
         outcome.attempt(name, lambda f=attack_family, s=seconds: f(options.program, outcome, s))
     print(outcome.summary())
     sys.exit(1 if outcome.faults else 0)

@@ -25,16 +25,17 @@ std::string Names(const std::string& folder) {
 }
 
 TEST_F(Files, AreListedWithTheirProperties) {
-  Make("plain", "");
+  Make("plain", "12345");
   fs::permissions(Make("fixed", ""), fs::perms::owner_read);
   Make(".dot", "");
   Make("folder/");
   constexpr uint32_t readOnly = 1;
-  for (const auto& [name, attributes] : ListFolder(Root)) {
+  for (const auto& [name, size, attributes] : ListFolder(Root)) {
     EXPECT_EQ(attributes, FileAttributes(In(name))) << name;
     const bool isFolder = name == "folder" || name == "." || name == "..";
     EXPECT_EQ((attributes & kFolderAttribute) != 0, isFolder) << name;
     EXPECT_EQ((attributes & readOnly) != 0, name == "fixed") << name;
+    EXPECT_TRUE(isFolder || size == (name == "plain" ? 5 : 0)) << name;
   }
   EXPECT_EQ(Names(Root), ".dot fixed folder plain ");
   EXPECT_EQ(Names(In("folder")), "");
