@@ -1,10 +1,23 @@
-# What every target of ours is compiled with.
+# The options that every target of this project is compiled with.
 add_library(orx_options INTERFACE)
 
 option(ORX_SANITIZE "Address and undefined-behaviour sanitizers" OFF)
 option(ORX_FUZZ "Fuzz targets; needs clang" OFF)
 
-if(NOT MSVC)
+if(WIN32)
+  # The oldest Windows that the program starts on: Vista and Server 2008.
+  target_compile_definitions(orx_options INTERFACE _WIN32_WINNT=0x0600)
+endif()
+
+if(MSVC)
+  set(CMAKE_MSVC_RUNTIME_LIBRARY "MultiThreaded$<$<CONFIG:Debug>:Debug>")
+  # The standard C functions that the compiler warns of are used within their limits.
+  target_compile_definitions(orx_options INTERFACE _CRT_SECURE_NO_WARNINGS)
+  target_compile_options(orx_options INTERFACE /W4 /WX /utf-8 /guard:cf)
+  # 0x800 limits the search for imported libraries to the system folder, from Windows 10 on.
+  target_link_options(orx_options INTERFACE /guard:cf /DEPENDENTLOADFLAG:0x800
+    /SUBSYSTEM:CONSOLE,6.00)
+else()
   target_compile_options(orx_options INTERFACE -Wall -Wextra -Wpedantic -Wshadow -Wconversion
     -Wnon-virtual-dtor -Wold-style-cast -Werror)
   if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
@@ -15,7 +28,7 @@ if(NOT MSVC)
     target_compile_options(orx_options INTERFACE
       -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
     target_link_options(orx_options INTERFACE -fsanitize=address,undefined)
-  elseif(NOT WIN32)
+  else()
     target_compile_options(orx_options INTERFACE
       -fstack-protector-strong -U_FORTIFY_SOURCE $<$<CONFIG:Release>:-D_FORTIFY_SOURCE=2>)
   endif()
@@ -28,11 +41,13 @@ if(NOT MSVC)
   endif()
 endif()
 
-# The compiler's libraries go into the program, without what it does not use of them: it starts
-# faster and needs none of them installed.
+# The compiler's libraries become part of the program, which then starts faster and needs none of
+# them installed. The linker drops what the program does not use of them.
 add_library(orx_static_runtime INTERFACE)
 if(WIN32 AND NOT MSVC)
-  target_link_options(orx_static_runtime INTERFACE -static)
+  target_link_options(orx_static_runtime INTERFACE -static -fstack-protector-strong
+    -Wl,--subsystem,console:6.0 -Wl,--major-os-version,6 -Wl,--minor-os-version,0
+    $<$<CONFIG:Release>:-s>)
 elseif(NOT MSVC AND NOT ORX_SANITIZE)
   target_link_options(orx_static_runtime INTERFACE -static-libstdc++ -static-libgcc
     -Wl,--gc-sections)

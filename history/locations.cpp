@@ -8,8 +8,7 @@
 #include "platform/path.h"
 
 std::string GetCommonAppDataPath() {
-  constexpr int32_t commonAppData = 35;
-  const std::string folder = GetFolderPath(commonAppData);
+  const std::string folder = GetFolderPath(kCommonAppDataFolder);
   return folder.empty() ? "C:\\Documents and Settings\\All Users\\Application Data" : folder;
 }
 

@@ -7,5 +7,6 @@
 // one of these numbers and receives the text for standard output; ignores SIGPIPE and SIGXFSZ, so
 // that a closed pipe or a file size limit makes a write fail and does not end the process.
 // Windows: SetErrorMode, so that an empty drive or a missing disk makes a call fail and does not
-// open a message box.
+// open a message box; SetDefaultDllDirectories, where the system has it, so that libraries loaded
+// later come from the system folder.
 void PrepareProcess();

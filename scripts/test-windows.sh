@@ -16,7 +16,7 @@ imports=$(x86_64-w64-mingw32-objdump -p build/windows/ORXInstallEventLog.exe |
   sed -n 's/.*DLL Name: //p' | tr '[:upper:]' '[:lower:]')
 for import in $imports; do
   case $import in
-    advapi32.dll | kernel32.dll | msvcrt.dll | netapi32.dll | secur32.dll) ;;
+    advapi32.dll | kernel32.dll | msvcrt.dll) ;;
     *) echo "The program needs $import." >&2; exit 1 ;;
   esac
 done

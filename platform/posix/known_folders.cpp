@@ -5,8 +5,7 @@
 #include "platform/path.h"
 
 std::string GetFolderPath(int32_t csidl) {
-  constexpr int32_t commonAppData = 35;
-  if (csidl != commonAppData) {
+  if (csidl != kCommonAppDataFolder) {
     return "";
   }
   const char* folder = std::getenv("ORX_COMMON_APPDATA");

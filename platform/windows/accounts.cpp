@@ -1,16 +1,40 @@
 #include "platform/accounts.h"
 
 #define SECURITY_WIN32
-#include "platform/windows/system.h"
-// These two need what the header above defines.
+#include "platform/windows/system_library.h"
+// These two need windows.h.
 #include <lm.h>
 #include <security.h>
 
 namespace {
 
-// Frees what the network calls hand out.
+// Neither library is one that Windows takes from the system folder for every program, so both are
+// looked up at run time. Each is loaded once in a run.
+struct NetworkLibrary {
+  SystemLibrary File = SystemLibrary("netapi32.dll");
+  decltype(&::NetApiBufferFree) FreeBuffer = File.Find<decltype(FreeBuffer)>("NetApiBufferFree");
+  decltype(&::NetWkstaUserGetInfo) GetUserInfo =
+      File.Find<decltype(GetUserInfo)>("NetWkstaUserGetInfo");
+  decltype(&::NetLocalGroupEnum) ListLocal = File.Find<decltype(ListLocal)>("NetLocalGroupEnum");
+  decltype(&::NetLocalGroupGetMembers) ListLocalMembers =
+      File.Find<decltype(ListLocalMembers)>("NetLocalGroupGetMembers");
+  decltype(&::NetGroupEnum) ListGlobal = File.Find<decltype(ListGlobal)>("NetGroupEnum");
+  decltype(&::NetGroupGetUsers) ListGlobalMembers =
+      File.Find<decltype(ListGlobalMembers)>("NetGroupGetUsers");
+
+  bool IsComplete() const {
+    return FreeBuffer != nullptr && GetUserInfo != nullptr && ListLocal != nullptr &&
+           ListLocalMembers != nullptr && ListGlobal != nullptr && ListGlobalMembers != nullptr;
+  }
+};
+
+const NetworkLibrary& NetCalls() {
+  static const NetworkLibrary library;
+  return library;
+}
+
 struct NetBufferFreer {
-  void operator()(BYTE* buffer) const { ::NetApiBufferFree(buffer); }
+  void operator()(BYTE* buffer) const { NetCalls().FreeBuffer(buffer); }
 };
 using NetBuffer = std::unique_ptr<BYTE, NetBufferFreer>;
 
@@ -31,7 +55,8 @@ std::wstring NarrowToWide(const std::string& narrow) {
   return count == 0 ? L"" : wide;
 }
 
-// Where a network call puts a list: all of it at once, as the preferred length is the largest.
+// Receives the result of a network call: the whole list at once, as the calls ask for the largest
+// length.
 struct NetList {
   BYTE* Buffer = nullptr;
   DWORD Count = 0;
@@ -39,11 +64,20 @@ struct NetList {
   DWORD_PTR Resume = 0;
 };
 
-template <typename Entry>
-std::vector<std::string> NamesIn(const NetList& list, LPWSTR Entry::*name) {
-  const NetBuffer owner(list.Buffer);
-  const auto* entries = reinterpret_cast<const Entry*>(list.Buffer);
+// The names in what the call lists; empty if it returns false.
+template <typename Entry, typename Call>
+std::vector<std::string> ListNames(LPWSTR Entry::*name, Call call) {
   std::vector<std::string> names;
+  if (!NetCalls().IsComplete()) {
+    return names;
+  }
+  NetList list;
+  const bool isListed = call(list);
+  const NetBuffer owner(list.Buffer);
+  if (!isListed) {
+    return names;
+  }
+  const auto* entries = reinterpret_cast<const Entry*>(list.Buffer);
   for (DWORD i = 0; entries != nullptr && i < list.Count; ++i) {
     names.push_back(WideToNarrow(entries[i].*name));
   }
@@ -55,15 +89,20 @@ std::vector<std::string> NamesIn(const NetList& list, LPWSTR Entry::*name) {
 std::optional<std::string> DomainUserName() {
   char name[1025] = {};
   ULONG size = sizeof name;
-  if (::GetUserNameExA(NameSamCompatible, name, &size) == FALSE) {
+  static const SystemLibrary library("secur32.dll");
+  const auto getUserName = library.Find<decltype(&::GetUserNameExA)>("GetUserNameExA");
+  if (getUserName == nullptr || getUserName(NameSamCompatible, name, &size) == FALSE) {
     return std::nullopt;
   }
   return name;
 }
 
 std::optional<std::string> WorkstationUserName() {
+  if (!NetCalls().IsComplete()) {
+    return std::nullopt;
+  }
   BYTE* buffer = nullptr;
-  const NET_API_STATUS status = ::NetWkstaUserGetInfo(/*reserved=*/nullptr, /*level=*/1, &buffer);
+  const NET_API_STATUS status = NetCalls().GetUserInfo(/*reserved=*/nullptr, /*level=*/1, &buffer);
   const NetBuffer owner(buffer);
   if (status != NERR_Success || buffer == nullptr) {
     return std::nullopt;
@@ -72,37 +111,37 @@ std::optional<std::string> WorkstationUserName() {
 }
 
 std::vector<std::string> ListLocalGroups(const std::string& server) {
-  NetList list;
-  if (::NetLocalGroupEnum(NarrowToWide(server).c_str(), /*level=*/1, &list.Buffer,
-                          MAX_PREFERRED_LENGTH, &list.Count, &list.Total,
-                          &list.Resume) != NERR_Success) {
-    list.Count = 0;
-  }
-  return NamesIn(list, &LOCALGROUP_INFO_1::lgrpi1_name);
+  return ListNames(&LOCALGROUP_INFO_1::lgrpi1_name, [&server](NetList& list) {
+    return NetCalls().ListLocal(NarrowToWide(server).c_str(), /*level=*/1, &list.Buffer,
+                                MAX_PREFERRED_LENGTH, &list.Count, &list.Total,
+                                &list.Resume) == NERR_Success;
+  });
 }
 
 std::vector<std::string> ListLocalGroupMembers(const std::string& server,
                                                const std::string& group) {
-  NetList list;
-  ::NetLocalGroupGetMembers(NarrowToWide(server).c_str(), NarrowToWide(group).c_str(), /*level=*/2,
-                            &list.Buffer, MAX_PREFERRED_LENGTH, &list.Count, &list.Total,
-                            &list.Resume);
-  return NamesIn(list, &LOCALGROUP_MEMBERS_INFO_2::lgrmi2_domainandname);
+  return ListNames(&LOCALGROUP_MEMBERS_INFO_2::lgrmi2_domainandname, [&](NetList& list) {
+    NetCalls().ListLocalMembers(NarrowToWide(server).c_str(), NarrowToWide(group).c_str(),
+                                /*level=*/2, &list.Buffer, MAX_PREFERRED_LENGTH, &list.Count,
+                                &list.Total, &list.Resume);
+    return true;  // what could be read counts, whatever the status says
+  });
 }
 
 std::vector<std::string> ListGlobalGroups(const std::string& server) {
-  NetList list;
-  if (::NetGroupEnum(NarrowToWide(server).c_str(), /*level=*/2, &list.Buffer, MAX_PREFERRED_LENGTH,
-                     &list.Count, &list.Total, &list.Resume) != NERR_Success) {
-    list.Count = 0;
-  }
-  return NamesIn(list, &GROUP_INFO_2::grpi2_name);
+  return ListNames(&GROUP_INFO_2::grpi2_name, [&server](NetList& list) {
+    return NetCalls().ListGlobal(NarrowToWide(server).c_str(), /*level=*/2, &list.Buffer,
+                                 MAX_PREFERRED_LENGTH, &list.Count, &list.Total,
+                                 &list.Resume) == NERR_Success;
+  });
 }
 
 std::vector<std::string> ListGlobalGroupMembers(const std::string& server,
                                                 const std::string& group) {
-  NetList list;
-  ::NetGroupGetUsers(NarrowToWide(server).c_str(), NarrowToWide(group).c_str(), /*level=*/0,
-                     &list.Buffer, MAX_PREFERRED_LENGTH, &list.Count, &list.Total, &list.Resume);
-  return NamesIn(list, &GROUP_USERS_INFO_0::grui0_name);
+  return ListNames(&GROUP_USERS_INFO_0::grui0_name, [&](NetList& list) {
+    NetCalls().ListGlobalMembers(NarrowToWide(server).c_str(), NarrowToWide(group).c_str(),
+                                 /*level=*/0, &list.Buffer, MAX_PREFERRED_LENGTH, &list.Count,
+                                 &list.Total, &list.Resume);
+    return true;  // what could be read counts, whatever the status says
+  });
 }

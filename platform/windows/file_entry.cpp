@@ -14,10 +14,11 @@ std::optional<WIN32_FIND_DATAA> FindEntry(const std::string& path) {
 }
 
 bool IsLink(const WIN32_FIND_DATAA& entry) {
-  // Other reparse points stand for the file itself, stored elsewhere.
+  // The bit for tags that stand for another named file; symbolic links and junctions have it.
+  constexpr DWORD nameSurrogate = 0x20000000;
+  const DWORD tag = entry.dwReserved0;
   return (entry.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&
-         (entry.dwReserved0 == IO_REPARSE_TAG_SYMLINK ||
-          entry.dwReserved0 == IO_REPARSE_TAG_MOUNT_POINT);
+         ((tag & nameSurrogate) != 0 || tag == IO_REPARSE_TAG_RESERVED_ZERO);
 }
 
 void RemoveFile(const std::string& path) {

@@ -1,11 +1,11 @@
 #include "platform/known_folders.h"
 
-#include "platform/windows/system.h"
+#include "platform/windows/system_library.h"
 
 std::string GetFolderPath(int32_t csidl) {
   using Function = HRESULT(WINAPI*)(HWND, int, HANDLE, DWORD, LPSTR);
-  constexpr DWORD defaultPath = 1;  // SHGFP_TYPE_DEFAULT
-  const Library library("shfolder.dll");
+  constexpr DWORD defaultPath = 1;                     // SHGFP_TYPE_DEFAULT
+  static const SystemLibrary library("shfolder.dll");  // a run asks for many paths
   const auto getFolderPath = library.Find<Function>("SHGetFolderPathA");
   if (getFolderPath == nullptr) {
     return "";

@@ -1,15 +1,15 @@
 #include "platform/processes.h"
 
-#include "platform/windows/system.h"
-// These two need what the header above defines.
+#include "platform/windows/system_library.h"
+// These two need windows.h.
 #include <psapi.h>
 #include <tlhelp32.h>
 
 namespace {
 
-// Loaded at the first use and kept, as it is asked for every process anew.
+// Loaded once in a run: it is used for every process.
 struct ProcessLibrary {
-  Library File = Library("psapi.dll");
+  SystemLibrary File = SystemLibrary("psapi.dll");
   decltype(&::EnumProcesses) Enum = File.Find<decltype(Enum)>("EnumProcesses");
   decltype(&::EnumProcessModules) EnumModules =
       File.Find<decltype(EnumModules)>("EnumProcessModules");
@@ -29,7 +29,7 @@ struct ProcessLibrary {
 };
 
 struct SnapshotLibrary {
-  Library File = Library("kernel32.dll");
+  SystemLibrary File = SystemLibrary("kernel32.dll");
   decltype(&::CreateToolhelp32Snapshot) Create =
       File.Find<decltype(Create)>("CreateToolhelp32Snapshot");
   decltype(&::Process32First) First = File.Find<decltype(First)>("Process32First");
@@ -69,6 +69,7 @@ std::optional<ProcessModule> FirstModuleOf(uint32_t processID) {
   }
   char name[260] = {};
   library.GetBaseName(process.get(), modules[0], name, sizeof name);
+  name[sizeof name - 1] = '\0';  // a name that fills the buffer comes without an end
   return ProcessModule{name};
 }
 

@@ -1,7 +1,7 @@
 #pragma once
 
-// The system's own header, without the parts that nobody here needs, and the handles that it hands
-// out, each in a type that closes it with its owner. Empty owners hold null.
+// The system's header without the parts that are not used here, and an owning type for each kind of
+// handle. An empty owner holds null.
 
 #define WIN32_LEAN_AND_MEAN
 #ifndef NOMINMAX
@@ -16,7 +16,7 @@ struct HandleCloser {
 };
 using UniqueHandle = std::unique_ptr<void, HandleCloser>;
 
-// What the calls give that say "none" with all bits set.
+// For the calls that return INVALID_HANDLE_VALUE when they fail.
 inline UniqueHandle OwnIfValid(HANDLE handle) {
   return UniqueHandle(handle == INVALID_HANDLE_VALUE ? nullptr : handle);
 }
@@ -25,24 +25,3 @@ struct SearchCloser {
   void operator()(HANDLE search) const { ::FindClose(search); }
 };
 using UniqueSearch = std::unique_ptr<void, SearchCloser>;
-
-// A library that is looked for at run time. Without it no function is found.
-class Library {
- public:
-  explicit Library(const char* name) : Module(::LoadLibraryA(name)) {}
-
-  // Null if there is no function of that name.
-  template <typename Function>
-  Function Find(const char* name) const {
-    return Module == nullptr ? nullptr
-                             : reinterpret_cast<Function>(
-                                   reinterpret_cast<void*>(::GetProcAddress(Module.get(), name)));
-  }
-
- private:
-  struct Freer {
-    using pointer = HMODULE;
-    void operator()(HMODULE module) const { ::FreeLibrary(module); }
-  };
-  std::unique_ptr<HMODULE, Freer> Module;
-};

@@ -1,0 +1,28 @@
+#pragma once
+
+#include <memory>
+
+#include "platform/windows/system.h"
+
+// A library of the system, loaded at run time from the system folder and from nowhere else: the
+// program's own folder, which Windows searches first, is often a temporary one that others can
+// write to. Without the library no function is found.
+class SystemLibrary {
+ public:
+  explicit SystemLibrary(const char* name);
+
+  // Null if there is no function of that name.
+  template <typename Function>
+  Function Find(const char* name) const {
+    return Module == nullptr ? nullptr
+                             : reinterpret_cast<Function>(
+                                   reinterpret_cast<void*>(::GetProcAddress(Module.get(), name)));
+  }
+
+ private:
+  struct Freer {
+    using pointer = HMODULE;
+    void operator()(HMODULE module) const { ::FreeLibrary(module); }
+  };
+  std::unique_ptr<HMODULE, Freer> Module;
+};
