@@ -7,9 +7,9 @@
 
 #include "eventlog/logger.h"
 #include "inventory/user_list.h"
-#include "platform/profile_text.h"
 #include "platform/posix/registry_export.h"
 #include "platform/profile_file.h"
+#include "platform/profile_text.h"
 #include "report/zipper.h"
 
 // The parts whose cost grows with what a machine or a history holds.

@@ -1,10 +1,10 @@
 #!/usr/bin/env python3
-"""Measures whole processes side by side, and holds the ratios against what they are to reach.
+"""Measures whole processes side by side, and compares the ratios with their limits.
 
 The commands of one comparison take turns (A B A B ...), so that a change of the machine's speed
-meets all of them. CPU time, of program and system together, decides; elapsed time stands beside
-it. A ratio is that of the medians, the span behind it the lowest and highest ratio of one round.
-The exit result tells of nothing but what could not be measured.
+affects all of them. CPU time, of program and system together, decides; elapsed time is printed too.
+A ratio is that of the medians; the span after it is the lowest and highest ratio of one round.
+The exit result is not 0 only if something could not be measured.
 """
 import argparse
 import contextlib
@@ -18,10 +18,12 @@ import sys
 import tempfile
 import time
 
-TOP = pathlib.Path(__file__).resolve().parent.parent
-PROGRAMS = TOP / "build" / "bench" / "programs"
+from history import HISTORY, REPOSITORY
+from make_history import make_history
+from make_registry_export import make_registry_export
+
+PROGRAMS = REPOSITORY / "build" / "bench" / "programs"
 TOOL = PROGRAMS / "ORXInstallEventLog"
-HISTORY = pathlib.Path("ZEK", "ORXHistory")
 
 
 class Side:
@@ -48,7 +50,7 @@ class Side:
         wall = time.perf_counter() - begin
         os.chdir(home)
         if status != 0:
-            sys.exit("cannot measure: %s failed" % " ".join(self.command[:4]))
+            sys.exit(f"cannot measure: {' '.join(self.command[:4])} failed")
         if counts:
             self.cpu.append((usage.ru_utime + usage.ru_stime) / self.share)
             self.wall.append(wall / self.share)
@@ -87,19 +89,14 @@ def ratio(ours, beside):
 
 def show(work, ours, beside, limit):
     def figure(side):
-        return "%s %.3g ms" % (side.name, 1000 * statistics.median(side.cpu))
+        return f"{side.name} {1000 * statistics.median(side.cpu):.3g} ms"
 
     cpu = ratio(ours.cpu, beside.cpu)
     turns = [a / b for a, b in zip(ours.cpu, beside.cpu)]
-    print("| %s | %s | %s | %.3g (%.3g-%.3g) | %.3g | %s | %.3g |" %
-          (work, figure(ours), figure(beside), cpu, min(turns), max(turns), limit,
-           "met" if cpu <= limit else "missed", ratio(ours.wall, beside.wall)), flush=True)
-
-
-def make_history(root, events, *options):
-    subprocess.run([sys.executable, TOP / "scripts" / "make-history.py", root, str(events), *options],
-                   check=True)
-    return root
+    verdict = "met" if cpu <= limit else "missed"
+    print(f"| {work} | {figure(ours)} | {figure(beside)} | {cpu:.3g} "
+          f"({min(turns):.3g}-{max(turns):.3g}) | {limit:.3g} | {verdict} | "
+          f"{ratio(ours.wall, beside.wall):.3g} |", flush=True)
 
 
 def copy_to_disk(source, target):
@@ -122,14 +119,14 @@ def bench_message(folder, short):
 
 def bench_key(folder, short):
     for events in (10, 1000) if short else (10, 1000, 10000):
-        root = make_history(folder / str(events), events, "--log-bytes", "0")
+        root = make_history(folder / str(events), events, log_bytes=0)
         source = root / HISTORY / "History.ini"
         # git takes no "_" in the name of a key.
         source.write_text(source.read_text().replace("_", "-"))
         section = str(events // 2).zfill(4)
 
         def side(name, *command, end=(section, "Result", "Failed")):
-            own = folder / ("%s-%d.ini" % (name.split()[0], events))
+            own = folder / f"{name.split()[0]}-{events}.ini"
             words = [own if word == "FILE" else word for word in command]
             return Side(name, *words, *end, prepare=lambda: copy_to_disk(source, own))
 
@@ -139,22 +136,22 @@ def bench_key(folder, short):
                   side("GKeyFile", PROGRAMS / "set_key_glib", "FILE")]
         take_turns([ours, *others], 10 if short else 60)
         for other in others:
-            show("one key of %d events" % events, ours, other, 1)
+            show(f"one key of {events} events", ours, other, 1)
         # Takes seconds at its largest, so that it gets fewer turns.
         slow = side("crudini --set", "crudini", "--set", "FILE")
         ours = side("set_key", PROGRAMS / "set_key", "FILE")
         take_turns([ours, slow], 3 if short or events > 1000 else 20)
-        show("one key of %d events" % events, ours, slow, 1)
+        show(f"one key of {events} events", ours, slow, 1)
 
 
 def bench_start(folder, short):
     sides = []
     for events in (10, 1000, 10000):
-        root = make_history(folder / str(events), events, "--log-bytes", "0")
+        root = make_history(folder / str(events), events, log_bytes=0)
         ini = root / HISTORY / "History.ini"
         kept = root / "kept.ini"
         shutil.copyfile(ini, kept)
-        sides.append(tool("%d events" % events, root, "-start", "bench", "-Product", "Server",
+        sides.append(tool(f"{events} events", root, "-start", "bench", "-Product", "Server",
                           prepare=lambda kept=kept, ini=ini: copy_to_disk(kept, ini)))
     take_turns(sides, 10 if short else 100)
     for side in sides[1:]:
@@ -167,8 +164,8 @@ def first_report(folder, events):
     The copies stay until the end: a file system that has just removed thousands of files is slow to
     make new ones.
     """
-    source = make_history(folder / ("source-%d" % events), events, "--collect")
-    roots = (folder / ("%d-%d" % (events, turn)) for turn in itertools.count())
+    source = make_history(folder / f"source-{events}", events, collect=True)
+    roots = (folder / f"{events}-{turn}" for turn in itertools.count())
 
     def prepare():
         root = next(roots)
@@ -176,14 +173,14 @@ def first_report(folder, events):
         os.sync()
         side.environment["ORX_COMMON_APPDATA"] = str(root)
 
-    side = tool("%d events, each" % events, "", "-report", folder / "history.zip", share=events,
+    side = tool(f"{events} events, each", "", "-report", folder / "history.zip", share=events,
                 prepare=prepare)
     return side
 
 
 def repeated_report(folder, events):
     """A report over a history of which there was one."""
-    return tool("%d events, each" % events, folder / ("%d-0" % events), "-report",
+    return tool(f"{events} events, each", folder / f"{events}-0", "-report",
                 folder / "history.zip", share=events)
 
 
@@ -200,17 +197,17 @@ def bench_report(folder, short):
 def bench_archive(folder, short):
     events = 100 if short else 1000
     size = 200000
-    make_history(folder, events, "--log-bytes", str(size))
-    history = folder / HISTORY
-    (history / "History.ini").unlink()  # a report without it makes the archive and no summaries
-    files = sorted(path.relative_to(history) for path in history.rglob("*") if path.is_file())
+    make_history(folder, events, log_bytes=size)
+    tree = folder / HISTORY
+    (tree / "History.ini").unlink()  # a report without it makes the archive and no summaries
+    files = sorted(path.relative_to(tree) for path in tree.rglob("*") if path.is_file())
     ours = tool("-report", folder, "-report", folder / "ours.zip")
-    others = [Side("zip -r -6", "zip", "-q", "-r", "-6", folder / "zip.zip", ".", cwd=history,
+    others = [Side("zip -r -6", "zip", "-q", "-r", "-6", folder / "zip.zip", ".", cwd=tree,
                    prepare=lambda: (folder / "zip.zip").unlink(missing_ok=True)),
-              Side("minizip -6", "minizip", "-o", "-6", folder / "minizip.zip", *files, cwd=history)]
+              Side("minizip -6", "minizip", "-o", "-6", folder / "minizip.zip", *files, cwd=tree)]
     take_turns([ours, *others], 2 if short else 5)
     for other in others:
-        show("archive of %d MB" % (events * size // 1000000), ours, other, 1.05)
+        show(f"archive of {events * size // 1000000} MB", ours, other, 1.05)
 
 
 def bench_registry(folder, short):
@@ -219,8 +216,7 @@ def bench_registry(folder, short):
         root = folder / code
         (root / "ZEK").mkdir(parents=True)
         export = root / "ZEK" / "Registry.reg"
-        subprocess.run([sys.executable, TOP / "scripts" / "make-registry-export.py", str(megabytes),
-                        code, export], check=True)
+        make_registry_export(megabytes, code, export)
         os.sync()
         whole = tool("a whole -start", root, "-start", "bench")
         alone = Side("its questions alone", PROGRAMS / "registry_questions",
@@ -228,7 +224,7 @@ def bench_registry(folder, short):
         cat = Side("cat", "cat", export)
         take_turns([whole, alone, cat], 5 if short else 20)
         for ours in whole, alone:
-            show("registry export of %d MB, %s" % (megabytes, code), ours, cat, 5)
+            show(f"registry export of {megabytes} MB, {code}", ours, cat, 5)
 
 
 @contextlib.contextmanager
@@ -244,14 +240,14 @@ def sleepers(count):
 
 def bench_snapshot(folder, short):
     processes, members = (200, 500) if short else (2000, 5000)
-    users = [("user%05d" % i, 1000 + i // 10) for i in range(members)]
+    users = [(f"user{i:05}", 1000 + i // 10) for i in range(members)]
     passwd = folder / "passwd"
     passwd.write_text("root:x:0:0:root:/root:/bin/sh\n" + "".join(
-        "%s:x:%d:%d::/home/%s:/bin/sh\n" % (name, 10000 + i, group, name)
+        f"{name}:x:{10000 + i}:{group}::/home/{name}:/bin/sh\n"
         for i, (name, group) in enumerate(users)))
     groups = folder / "group"
     groups.write_text("root:x:0:\n" + "".join(
-        "group%04d:x:%d:%s\n" % (i, 1000 + i, ",".join(n for n, _ in users[i * 10:i * 10 + 10]))
+        f"group{i:04}:x:{1000 + i}:{','.join(n for n, _ in users[i * 10:i * 10 + 10])}\n"
         for i in range(members // 10)))
     names = {"LD_PRELOAD": "libnss_wrapper.so", "NSS_WRAPPER_PASSWD": str(passwd),
              "NSS_WRAPPER_GROUP": str(groups)}
@@ -260,7 +256,7 @@ def bench_snapshot(folder, short):
     with sleepers(processes):
         take_turns([ours, *others], 5 if short else 40)
     both = together("ps -e and getent group", others)
-    show("snapshot of %d processes, %d members" % (processes, members), ours, both, 1)
+    show(f"snapshot of {processes} processes, {members} members", ours, both, 1)
 
 
 WORKS = {"message": bench_message, "key": bench_key, "start": bench_start, "report": bench_report,
@@ -272,10 +268,10 @@ def main():
                                      formatter_class=argparse.RawDescriptionHelpFormatter)
     parser.add_argument("--short", action="store_true", help="smaller sizes and fewer turns")
     parser.add_argument("works", nargs="*", metavar="WORK",
-                        help="%s; all of them without any" % ", ".join(WORKS))
+                        help=f"{', '.join(WORKS)}; all of them without any")
     options = parser.parse_args()
     if not set(options.works) <= set(WORKS):
-        parser.error("a work is one of %s" % ", ".join(WORKS))
+        parser.error(f"a work is one of {', '.join(WORKS)}")
     heading()
     for name in options.works or WORKS:
         with tempfile.TemporaryDirectory(prefix="orx-bench-") as folder:

@@ -4,12 +4,11 @@
 set -eu
 cd "$(dirname "$0")/.."
 
-scripts/install-packages.sh g++ cmake ninja-build pkg-config zlib1g-dev libminizip-dev \
-  libsystemd-dev libbenchmark-dev libglib2.0-dev crudini git zip minizip libnss-wrapper procps python3
+scripts/install-packages.sh build bench
 cmake --preset bench > /dev/null
 cmake --build --preset bench > /dev/null
-# Copies, as an installed program is one: what the linker has just written lies in memory in smaller
-# pieces, and its pages cost more to map.
+# Copies, as an installed program is one: the linker leaves a file in small pieces of memory, whose
+# pages cost more to map.
 programs=build/bench/programs
 rm -rf "$programs"
 mkdir "$programs"

@@ -4,6 +4,6 @@ set -eu
 cd "$(dirname "$0")/.."
 preset=$1
 
-scripts/install-packages.sh g++ cmake ninja-build libgtest-dev zlib1g-dev libminizip-dev libsystemd-dev
+scripts/install-packages.sh build
 cmake --preset "$preset"
 cmake --build --preset "$preset"

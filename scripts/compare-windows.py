@@ -136,7 +136,6 @@ def limits_export():
     """All kinds of values, and texts and names at the limits. In the order of the names, as the
     registry keeps keys; Wine keeps values so too, Windows in the order of their writing. No key's
     whole path is longer than 260 characters: Wine opens none by the narrow calls, Windows does."""
-    long_name = lambda letter, length: letter * length
     kinds = [
         ("a text", '"plain"'), ("b empty", '""'), ("c quoted", '"\\"a\\" \\\\ b"'),
         ("d number", "dword:0000002a"), ("e zero", "dword:00000000"),
@@ -145,8 +144,8 @@ def limits_export():
         ("j quad", "hex(b):01,00,00,00,00,00,00,00"),
         ("k two texts", "hex(1):61,00,00,00,62,00,00,00"),
         ("l 99 bytes", '"%s"' % ("x" * 99)), ("m 100 bytes", '"%s"' % ("x" * 100)),
-        (long_name("n", 29), '"fills its field"'), (long_name("o", 255), '"longest name"'),
-        (long_name("p", 256), '"ends the list"'), ("q", '"behind the end"'),
+        ("n" * 29, '"fills its field"'), ("o" * 255, '"longest name"'),
+        ("p" * 256, '"ends the list"'), ("q", '"behind the end"'),
     ]
     copies = SOFTWARE + "ZEK\\ORX\\InstalledCopies\\"
     version = [("Last Modified Date", '"20260102"'), ("Modification", "dword:00000003"),
@@ -167,10 +166,10 @@ def limits_export():
         (copies + "C1\\ADM_PROFILES\\ADM1", kinds[:2]),
         (copies + "C1\\CurrentVersion", version),
         (copies + "C1\\GLOBAL_PROFILE", kinds),
-        (copies + "C1\\ORX " + long_name("k", 190) + "\\CurrentVersion", version),
+        (copies + "C1\\ORX " + "k" * 190 + "\\CurrentVersion", version),
         (copies + "C1\\ORX Server\\CurrentVersion", version),
         (copies + "C1\\ORXNone\\CurrentVersion", version),
-        (copies + "C1\\PROFILES\\" + long_name("i", 200), kinds),
+        (copies + "C1\\PROFILES\\" + "i" * 200, kinds),
         (copies + "C1\\PROFILES\\ORX1", []),
         (copies + "no product", []),
     ]

@@ -9,7 +9,7 @@ folder=$PWD
 
 mkdir -p sources lists/partial cache/archives/partial
 lists=/etc/apt/sources.list
-for list in $lists $lists.d/*.list $lists.d/*.sources; do
+for list in "$lists" "$lists".d/*.list "$lists".d/*.sources; do
   if [ -e "$list" ]; then
     # The first one is only read among the others if it ends as they do.
     name=$(basename "$list" | sed 's/^sources.list$/machine.list/')

@@ -1,15 +1,15 @@
 #!/bin/sh
-# Runs every fuzz target for so many seconds (30 unless told) over its seeds. What it finds lies in
-# build/fuzz; a finding ends the script with a failure. docs/fuzzing.md tells what each looks at.
+# Runs every fuzz target for N seconds (default 30) over its seeds. A finding ends the script with a
+# failure; its input is in build/fuzz. docs/fuzzing.md describes the targets.
 set -eu
 cd "$(dirname "$0")/.."
 seconds=${1:-30}
 
-scripts/install-packages.sh clang libclang-rt-dev cmake ninja-build zlib1g-dev libminizip-dev libsystemd-dev
+scripts/install-packages.sh fuzz
 cmake --preset fuzz
 cmake --build --preset fuzz
 
-# Histories come and go by the thousand: in memory, where there is such a place.
+# Thousands of histories are made and removed: in memory, if possible.
 [ -d /dev/shm ] && TMPDIR=/dev/shm
 TMPDIR=$(mktemp -d "${TMPDIR:-/tmp}/orx-fuzz.XXXXXX")
 export TMPDIR

@@ -28,9 +28,8 @@ def check(holds, message):
 def event(identity, log="", **keys):
     """An event's keys as a start leaves them, with those given in place of the usual values."""
     values = dict.fromkeys(EVENT_KEYS, "")
-    values.update(Event_ID=identity, Copy_Name="(Unknown)", Complete_Flag="FALSE",
-                  Event_Log_File=str(log), **keys)
-    return values
+    return values | {"Event_ID": identity, "Copy_Name": "(Unknown)", "Complete_Flag": "FALSE",
+                     "Event_Log_File": log} | keys
 
 
 def format_history(sections):

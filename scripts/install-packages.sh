@@ -1,13 +1,34 @@
 #!/bin/sh
-# Installs those of the named Debian packages that are missing.
+# Installs those of the named Debian packages that are missing. A name may be that of a group below:
+# this is the one list of what the scripts need. A script that needs one more package by itself may
+# name it.
 set -eu
 
+packages_of() {
+  case $1 in
+    build) echo "g++ cmake ninja-build pkg-config zlib1g-dev libminizip-dev libsystemd-dev \
+      libcli11-dev nlohmann-json3-dev libgtest-dev" ;;
+    tests) echo "libnss-wrapper" ;;
+    style) echo "git clang-format clang-tidy python3 pycodestyle pyflakes3 shellcheck" ;;
+    reliability) echo "acl attr binutils python3 strace unzip" ;;
+    fuzz) echo "clang libclang-rt-dev cmake ninja-build zlib1g-dev libminizip-dev libsystemd-dev \
+      libcli11-dev nlohmann-json3-dev" ;;
+    windows) echo "cmake dpkg-dev googletest g++-mingw-w64-x86-64-posix libcli11-dev \
+      libz-mingw-w64-dev ninja-build nlohmann-json3-dev python3 wine wine64" ;;
+    bench) echo "libbenchmark-dev libglib2.0-dev pkg-config crudini git zip unzip minizip \
+      libnss-wrapper procps python3" ;;
+    *) echo "$1" ;;
+  esac
+}
+
 missing=""
-for package in "$@"; do
-  if ! dpkg-query --show --showformat='${db:Status-Status}\n' "$package" 2>/dev/null |
-      grep -q '^installed$'; then
-    missing="$missing $package"
-  fi
+for name in "$@"; do
+  for package in $(packages_of "$name"); do
+    if ! dpkg-query --show --showformat='${db:Status-Status}\n' "$package" 2>/dev/null |
+        grep -q '^installed$'; then
+      missing="$missing $package"
+    fi
+  done
 done
 [ -n "$missing" ] || exit 0
 

@@ -4,8 +4,7 @@
 set -eu
 cd "$(dirname "$0")/.."
 
-scripts/install-packages.sh cmake dpkg-dev googletest g++-mingw-w64-x86-64-posix \
-  libz-mingw-w64-dev ninja-build python3 wine wine64
+scripts/install-packages.sh windows
 scripts/build.sh release  # one side of the comparison
 cmake --preset windows
 cmake --build --preset windows

@@ -48,7 +48,8 @@ def check_shell_script(programs, scratch, status):
     setup.write_text(f"#!/bin/sh\necho output of setup\nexit {status}\n")
     setup.chmod(0o755)
     run = subprocess.run(["sh", "install.sh"], cwd=scratch, env=environment, stderr=subprocess.PIPE)
-    check(run.returncode == status, f"install.sh returned {run.returncode}, not {status}", run.stderr)
+    check(run.returncode == status, f"install.sh returned {run.returncode}, not {status}",
+          run.stderr)
     if programs:
         subprocess.run([programs / "ORXInstallEventLog", "-report", "history.zip"], cwd=scratch,
                        env=environment, check=True)
@@ -64,7 +65,8 @@ def check_batch_file(programs, scratch, status):
                    input=setup.encode(), check=True)
     run = subprocess.run([wine, "cmd", "/c", "install.bat"], cwd=scratch)
     check(run.returncode == status, f"install.bat returned {run.returncode}, not {status}")
-    subprocess.run([wine, "ORXInstallEventLog.exe", "-report", "history.zip"], cwd=scratch, check=True)
+    subprocess.run([wine, "ORXInstallEventLog.exe", "-report", "history.zip"], cwd=scratch,
+                   check=True)
     prefix = os.environ.get("WINEPREFIX") or REPOSITORY / "build/wine"
     check_recorded(scratch, pathlib.Path(prefix) / "drive_c/ProgramData/ZEK/ORXHistory", status)
 

@@ -129,7 +129,7 @@ class Bench:
         counts = sections.setdefault("History", {"Count": "0"})
         counts["Count"] = str(int(counts["Count"]) + 1)
         sections[identity] = history.event(
-            identity, self.machine.history / identity / history.LOG,
+            identity, str(self.machine.history / identity / history.LOG),
             Log_File_Name="(none)", Trace_File="(none)", Response_File="(none)")
 
     def collect(self, section, key, folder):

@@ -125,11 +125,13 @@ class Crowd:
         self.judge(outcome)
 
     def judge(self, outcome):
-        sections = outcome.attempt("overlap, history", self.machine.sections) or {"History": {"Count": "0"}}
+        sections = (outcome.attempt("overlap, history", self.machine.sections)
+                    or {"History": {"Count": "0"}})
         outcome.attempt("overlap, count", lambda: self.check_count(sections))
         for event in self.started:
-            outcome.attempt(f"overlap, event {event}", lambda e=event: self.check_event(sections, e))
-            outcome.attempt(f"overlap, log {event}", lambda e=event: self.check_log(sections, e))
+            for check_part in self.check_event, self.check_log:
+                outcome.attempt(f"overlap, event {event}",
+                                lambda f=check_part, e=event: f(sections, e))
         outcome.attempt("overlap, last report", self.check_last_report)
 
     def check_count(self, sections):

@@ -1,6 +1,8 @@
 #!/bin/sh
 # Records a whole event of a sample machine in a scratch folder, packs the history.
 # Needs ORXInstallEventLog and the export of the sample's registry beside this script.
+# The commands that are shown are expanded when they run.
+# shellcheck disable=SC2016
 set -eu
 sample=$(cd "$(dirname "$0")" && pwd)
 scratch=$(mktemp -d)
