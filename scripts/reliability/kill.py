@@ -178,7 +178,6 @@ class Bench:
         file = self.machine.scratch / scenario.base / history.HISTORY / "History.ini"
         length = file.stat().st_size if file.exists() else 0
         for size in sorted({0, 1, 17, *range(100, length + 1500, 150)}):
-            yield Point(scenario, size, "kill")
             yield Point(scenario, size, "EFBIG")
 
     def disturb(self, point):
@@ -192,17 +191,14 @@ class Bench:
         return (None if result == -signal.SIGKILL else result), output
 
     def limit_size(self, point):
-        """No file grows beyond the size: the write up to it is done, the next one fails or
-        kills."""
+        """No file grows beyond the size: the write up to it is done, and the next one fails. The
+        signal that the system sends then ends every program that does not expect it."""
         def set_limit():
             resource.setrlimit(resource.RLIMIT_CORE, (0, 0))
             resource.setrlimit(resource.RLIMIT_FSIZE, (point.call, point.call))
-            kills = point.fault == "kill"
-            signal.signal(signal.SIGXFSZ, signal.SIG_DFL if kills else signal.SIG_IGN)
+            signal.signal(signal.SIGXFSZ, signal.SIG_DFL)
         # Python ignores this signal; restore_signals would overrule set_limit.
-        result, output = self.machine.run(*point.scenario.words, preexec_fn=set_limit,
-                                          restore_signals=False)
-        return (None if result == -signal.SIGXFSZ else result), output
+        return self.machine.run(*point.scenario.words, preexec_fn=set_limit, restore_signals=False)
 
     def check_point(self, point):
         scenario = point.scenario

@@ -1,6 +1,7 @@
-"""The program file itself."""
+"""The program file itself, and what its caller leaves it."""
 
 import json
+import os
 import subprocess
 
 from harness import attack
@@ -24,3 +25,29 @@ def hardening(machine):
     commands = json.loads((machine.built.parent / "compile_commands.json").read_text())
     check(all("-D_FORTIFY_SOURCE=2" in command["command"] and " -O" in command["command"]
               for command in commands), "compiled without FORTIFY")
+
+
+@attack(("input and output", "<&- >&-"), ("all", "<&- >&- 2>&-"), ("output", ">&-"))
+def closed_descriptors(machine, closing):
+    """No file may get the number of a standard stream, as it would receive that stream's text."""
+    trace = machine.scratch / "trace"
+    caller = ("strace", "-f", "-o", trace, "-e", "trace=openat", "sh", "-c",
+              f'exec "$@" {closing}', "sh")
+    for words in (("-start", "7", "-l", str(machine.source)), ("-start", "../x"),
+                  ("-report", str(machine.archive))):
+        machine.must(*words, before=caller)
+        taken = [line for line in trace.read_text().splitlines()
+                 if str(machine.root) in line and line.endswith((" = 0", " = 1", " = 2"))]
+        check(not taken, f"opened as a standard stream: {taken[:1]}")
+    check(len(machine.sections()) == 3, "not recorded")
+
+
+@attack(("start", 0, "-start", "../x"), ("start", 0, "-start", "7"), ("report", 0, "-report"),
+        ("help", 0, "-help"))
+def closed_pipe_on_standard_output(machine, result, *words):
+    reader, writer = os.pipe()
+    os.close(reader)
+    machine.callback(os.close, writer)
+    machine.must("-start", "6")
+    extra = (str(machine.archive),) if words == ("-report",) else ()
+    machine.must(*words, *extra, result=result, stdout=writer)

@@ -1,0 +1,59 @@
+"""The history file: who may read it, who holds its lock, what the file system refuses."""
+
+import fcntl
+import os
+import stat
+import time
+
+from harness import attack
+from history import check
+
+
+def injecting(call, fault):
+    return ("strace", "-f", "-o", "/dev/null", "-e", f"trace={call}", "-e", f"inject={call}:{fault}")
+
+
+@attack(*((call, call) for call in ("fchown", "fchmod")))
+def temporary_file_of_a_closed_history(machine, call):
+    """Killed at that call, the run leaves its temporary file as everybody could have seen it."""
+    machine.must("-start", "7")
+    machine.ini.chmod(0o600)
+    machine.run("-start", "8", before=injecting(call, "signal=SIGKILL"))
+    left = list(machine.history.glob(".*.tmp"))
+    check(left, "no temporary file")
+    check(all(stat.S_IMODE(file.stat().st_mode) == 0o600 for file in left), "others could read it")
+
+
+@attack(*((f"{call} {error}", call, error) for call, error in (
+    ("fdatasync", "EINVAL"), ("fdatasync", "EOPNOTSUPP"), ("fdatasync", "ENOSYS"),
+    ("fchmod", "EPERM"), ("fchown", "EPERM"), ("fgetxattr", "EOPNOTSUPP"))))
+def refused_by_the_file_system(machine, call, error):
+    for name in ("7", "8"):
+        machine.must("-start", name, before=injecting(call, f"error={error}"))
+    check(machine.sections()["History"]["Count"] == "2", "not recorded")
+
+
+@attack()
+def lock_that_is_never_freed(machine):
+    """Any program that may open the folder can hold its lock."""
+    machine.must("-start", "7")
+    holder = os.open(machine.history, os.O_RDONLY)
+    machine.callback(os.close, holder)
+    fcntl.flock(holder, fcntl.LOCK_EX)
+    began = time.monotonic()
+    runs = [machine.start(*words) for words in (("-start", "8"), ("-unknown",))]
+    results = [run.wait(timeout=20) for run in runs]
+    check(results == [0, 2], f"results {results}")
+    check(time.monotonic() - began < 15, "waits again")
+    check(machine.sections()["History"]["Count"] == "2", "not recorded")
+
+
+@attack(("first start", "-start", "7"), ("start", "-start", "8"), ("restart", "-start", "8"),
+        ("end", "-end", "8"))
+def one_replacement(machine, *words):
+    if words != ("-start", "7"):
+        machine.record("8")
+    trace = machine.scratch / "trace"
+    machine.must(*words, before=("strace", "-f", "-o", trace, "-e", "trace=/^rename"))
+    count = trace.read_text().count('History.ini"')
+    check(count == 1, f"{count} replacements")
