@@ -160,6 +160,7 @@ class RunReader {
       Identity = *Facts.Identity;
     }
     if (AllMarks.empty() || AllMarks.front().Kind != MarkKind::kStart) {
+      Cursor = kStartTitle.starts_with(Text) ? Text.size() : Cursor;
       return;
     }
     const Mark& start = AllMarks.front();
@@ -178,15 +179,24 @@ class RunReader {
     Run.IsWhole = box != AllMarks.end() && Run.Computer && box->Begin == Cursor &&
                   IsOfEvent(box->Text, words);
     if (!Run.IsWhole) {
-      // The run broke off here: the rest of a line is no message.
-      const size_t lineEnd = Text.find('\n', Cursor);
-      Cursor = lineEnd == Text.npos ? Text.size() : Cursor;
+      SkipBrokenBox(lines);
       return;
     }
     const std::string_view action = box->Text.substr(Identity->size() + words.size());
     Run.StartAction = action.substr(0, action.rfind(" Starts "));
     ReadBefore(Marks(box, AllMarks.end()));
   }
+
+  void SkipBrokenBox(LineReader lines) {
+    if (lines.Skip(std::string(94, '*')) && lines.Labelled("*  Snapshoot for EventID: ")) {
+      lines.Skip('*' + std::string(93, ' '));
+    }
+    Cursor = Text.size() - lines.Remaining().size();
+    SkipBrokenLine();
+  }
+
+  // After a block that breaks off, the rest of a line at the end of the text is no message.
+  void SkipBrokenLine() { Cursor = Text.find('\n', Cursor) == Text.npos ? Text.size() : Cursor; }
 
   void ReadBefore(Marks marks) {
     const auto end = std::find_if(marks.begin(), marks.end(), [this](const Mark& mark) {
@@ -231,6 +241,15 @@ class RunReader {
     if (BrokenPart > 0 && Cursor < limit) {
       Cursor += TableLength(Text.substr(Cursor, limit - Cursor), BrokenPart - 1);
     }
+    if (IsBrokenHead(Text.substr(Cursor), HeadOfPart(BrokenPart))) {
+      Cursor = Text.size();
+    }
+    SkipBrokenLine();
+  }
+
+  // True if the text is the start of a block that begins with the head and breaks off.
+  static bool IsBrokenHead(std::string_view text, std::string_view head) {
+    return head.starts_with(text) || text.starts_with(head);
   }
 
   std::optional<Ending> FindEnding() const {
@@ -313,19 +332,20 @@ class RunReader {
     if (!Facts.MayHaveEnded) {
       return Text.size();
     }
-    const std::string head = std::string(AfterBoxHead()) + std::string(Identity.value_or("")) +
-                             (Identity ? " -- After " : "");
-    size_t begin = Text.size();
+    const std::string head =
+        HeadOfAfterBox() + std::string(Identity.value_or("")) + (Identity ? " -- After " : "");
+    size_t end = Text.size();
+    size_t begin = end;
     for (int lines = 0; lines < 5 && begin > Cursor; ++lines) {
       const size_t lineEnd = begin > 1 ? Text.rfind('\n', begin - 2) : Text.npos;
       begin = lineEnd == Text.npos ? 0 : lineEnd + 1;
       const std::string_view tail = Text.substr(begin);
-      if (begin >= Cursor && (head.starts_with(tail) || tail.starts_with(head))) {
-        Run.IsWhole = false;
-        return begin;
+      if (begin >= Cursor && IsBrokenHead(tail, head)) {
+        end = begin;
       }
     }
-    return Text.size();
+    Run.IsWhole = Run.IsWhole && end == Text.size();
+    return end;
   }
 
   std::string_view Text;

@@ -87,7 +87,8 @@ std::vector<Mark> FindMarks(std::string_view text) {
   return marks;
 }
 
-std::string_view AfterBoxHead() {
-  static const std::string head = starsLine + blankLine + "*  Snapshoot for EventID: ";
-  return head;
+std::string HeadOfAfterBox() { return starsLine + boxForms[2].Head; }
+
+std::string HeadOfPart(size_t part) {
+  return part < headings.size() ? '\n' + std::string(headings[part]) : starsLine + boxForms[1].Head;
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -33,4 +34,8 @@ struct Mark {
 std::vector<Mark> FindMarks(std::string_view text);
 
 // What a box of the second snapshot begins with, up to the identity.
-std::string_view AfterBoxHead();
+std::string HeadOfAfterBox();
+
+// What the first snapshot has before a part: an empty line and the heading, or after the last part
+// what the box at the end begins with.
+std::string HeadOfPart(size_t part);

@@ -1,0 +1,29 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "reader/item.h"
+
+// "section path/path name field=value ...", the parts separated by '|'.
+inline std::string ItemText(const Item& item) {
+  std::string text(SectionName(item.Where));
+  for (size_t i = 0; i < item.PathSize; ++i) {
+    text += (i == 0 ? '|' : '/') + std::string(item.Path[i]);
+  }
+  text += '|' + std::string(item.Name);
+  for (size_t i = 0; i < item.FieldCount; ++i) {
+    text += '|' + std::string(FieldNames(item.Where)[i]) + '=';
+    text += item.Where == Section::kProcesses ? std::to_string(item.Count)
+                                              : std::string(item.Values[i]);
+  }
+  return text;
+}
+
+inline std::vector<std::string> ItemTexts(const std::vector<Item>& items) {
+  std::vector<std::string> texts;
+  for (const Item& item : items) {
+    texts.push_back(ItemText(item));
+  }
+  return texts;
+}

@@ -1,0 +1,223 @@
+// A story: the recorder records a dozen events, between whose start and end known things change on
+// the machine. The reader finds these changes in the archive, and nothing else.
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <functional>
+
+#include "app/install_history.h"
+#include "reader/check.h"
+#include "reader/history.h"
+#include "reader/json.h"
+#include "tests/support/fake_machine.h"
+#include "tests/support/file_text.h"
+#include "tests/support/run_tool.h"
+#include "tests/support/scratch_history.h"
+
+namespace {
+
+const std::string copies = "SOFTWARE\\ZEK\\ORX\\InstalledCopies\\";
+const std::string drivers = "SOFTWARE\\ODBC\\ODBCINST.INI\\";
+const std::string software =
+    "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Installer\\UserData\\S-1-5-18\\Products\\";
+
+void Remove(const std::string& key, const std::string& name = "") {
+  std::erase_if(Machine().Registry, [&](const FakeMachine::RegistryEntry& entry) {
+    return entry.KeyPath.starts_with(key) && (name.empty() || entry.ValueName == name);
+  });
+}
+
+void Set(const std::string& key, const std::string& name, const std::string& value) {
+  Remove(key, name);
+  Machine().SetText(key, name, value);
+}
+
+void SetSoftware(const std::string& key, const std::string& name, const std::string& version) {
+  Set(software + key + "\\InstallProperties", "DisplayName", name);
+  Set(software + key + "\\InstallProperties", "DisplayVersion", version);
+  Set(software + key + "\\InstallProperties", "Publisher", "ZEK");
+}
+
+void SetProcesses(const std::vector<std::string>& names) {
+  static uint32_t next = 100;  // no process has the number of an earlier one
+  Machine().ProcessIDs.emplace();
+  Machine().Modules.clear();
+  for (const std::string& name : names) {
+    Machine().ProcessIDs->push_back(next);
+    Machine().Modules[next++] = {name};
+  }
+}
+
+void SetState(size_t service, uint32_t state) {
+  Machine().Services.Entries.at(service).CurrentState = state;
+}
+
+struct Step {
+  const char* Action;
+  const char* Copy;
+  const char* Result;
+  std::function<void()> Change;
+  std::vector<std::string> Changes;  // as JSON, without the event and the source
+};
+
+const std::vector<Step> story = {
+    {"Install",
+     "Prod",
+     "Successful",
+     [] {
+       Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "4096");
+       Set(copies + "Prod\\PROFILES\\ORX", "Port", "50000");
+       Set(copies + "Prod\\ORX Server\\CurrentVersion", "Version", "9");
+       Set(copies + "Prod\\ORX Server\\CurrentVersion", "ProductCode", "{1}");
+       SetSoftware("A", "ORX Server", "9.4");
+       Machine().Services.Entries.push_back({"p", "ORX Server - Prod", 1});
+     },
+     {R"("added","section":"software","path":["ZEK"],"name":"ORX Server","fields":{"version":{"before":null,"after":"9.4"},"date":{"before":null,"after":""},"language":{"before":null,"after":"0"},"location":{"before":null,"after":""}})",
+      R"("added","section":"services","path":[],"name":"ORX Server - Prod","fields":{"state":{"before":null,"after":"Stopped"}})",
+      R"("added","section":"copies","path":[],"name":"Prod","fields":{})",
+      R"("added","section":"products","path":["Prod"],"name":"ORX Server","fields":{"code":{"before":null,"after":"{1}"},"version":{"before":null,"after":"9.."},"service_level":{"before":null,"after":""},"modified":{"before":null,"after":""}})",
+      R"("added","section":"profile","path":["Prod"],"name":"LogSize","fields":{"value":{"before":null,"after":"4096"}})",
+      R"("added","section":"instances","path":["Prod"],"name":"ORX","fields":{})",
+      R"("added","section":"instance_profile","path":["Prod","ORX"],"name":"Port","fields":{"value":{"before":null,"after":"50000"}})"}},
+    {"Start",
+     "Prod",
+     "0",
+     [] { SetState(2, 4); },
+     {R"("changed","section":"services","path":[],"name":"ORX Server - Prod","fields":{"state":{"before":"Stopped","after":"Started"}})"}},
+    {"Configure",
+     "Prod",
+     "0",
+     [] { Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "8192"); },
+     {R"("changed","section":"profile","path":["Prod"],"name":"LogSize","fields":{"value":{"before":"4096","after":"8192"}})"}},
+    {"Configure",
+     "Prod",
+     "1603",
+     [] { Set(copies + "Prod\\PROFILES\\ORX", "Port", "50010"); },
+     {R"("changed","section":"instance_profile","path":["Prod","ORX"],"name":"Port","fields":{"value":{"before":"50000","after":"50010"}})"}},
+    {"Start",
+     "Prod",
+     "0",
+     [] {
+       SetProcesses({"init", "orxserver", "orxserver", "orxserver", "orxlistener"});
+     },
+     {R"("changed","section":"processes","path":[],"name":"orxserver","fields":{"count":{"before":"1","after":"3"}})",
+      R"("removed","section":"processes","path":[],"name":"editor","fields":{"count":{"before":"1","after":null}})",
+      R"("added","section":"processes","path":[],"name":"orxlistener","fields":{"count":{"before":null,"after":"1"}})"}},
+    {"Configure",
+     "Prod",
+     "0",
+     [] {
+       Machine().LocalGroups[0].second = {"H\\ana"};
+       Machine().LocalGroups.push_back({"orx operators", {"H\\bob"}});
+       Machine().DomainUser = "H\\bob";
+     },
+     {R"("removed","section":"user","path":[],"name":"H\\ana","fields":{})",
+      R"("added","section":"user","path":[],"name":"H\\bob","fields":{})",
+      R"("added","section":"groups","path":[],"name":"orx operators","fields":{})",
+      R"("removed","section":"members","path":["Administrators"],"name":"H\\bob","fields":{})",
+      R"("added","section":"members","path":["orx operators"],"name":"H\\bob","fields":{})"}},
+    {"Install",
+     "Prod",
+     "0",
+     [] {
+       Set(drivers + "ODBC Drivers", "ZEK ORX", "Installed");
+       Set(drivers + "ZEK ORX", "Driver", "C:\\ZEK\\orx.dll");
+     },
+     {R"("added","section":"drivers","path":[],"name":"ZEK ORX","fields":{})",
+      R"("added","section":"driver_parameters","path":["ZEK ORX"],"name":"Driver","fields":{"value":{"before":null,"after":"C:\\ZEK\\orx.dll"}})"}},
+    {"Upgrade",
+     "Prod",
+     "Successful",
+     [] {
+       SetSoftware("A", "ORX Server", "9.5");
+       Remove(software + "T");
+       Set(copies + "Prod\\ORX Server\\CurrentVersion", "Version", "10");
+     },
+     {R"("changed","section":"software","path":["ZEK"],"name":"ORX Server","fields":{"version":{"before":"9.4","after":"9.5"}})",
+      R"("removed","section":"software","path":["ZEK"],"name":"Tools","fields":{"version":{"before":"1.0","after":null},"date":{"before":"","after":null},"language":{"before":"0","after":null},"location":{"before":"","after":null}})",
+      R"("changed","section":"products","path":["Prod"],"name":"ORX Server","fields":{"version":{"before":"9..","after":"10.."}})"}},
+    {"Install",
+     "Test",
+     "0",
+     [] { Set(copies + "Test", "", ""); },
+     {R"("added","section":"copies","path":[],"name":"Test","fields":{})"}},
+    {"Verify",
+     "Test",
+     "Nothing to do",
+     [] {
+       SetProcesses({"orxserver", "init", "orxserver", "orxserver", "orxlistener"});
+     },
+     {}},
+    // Of two services with one name one stops: which, nobody can see.
+    {"Stop",
+     "Test",
+     "Failed (1603), rolled back",
+     [] { SetState(0, 1); },
+     {R"("changed","section":"services","path":[],"name":"ORX Listener","fields":{"state":{"before":"Started","after":"Stopped"}})"}},
+    {"Remove",
+     "Test",
+     "0",
+     [] { Remove(copies + "Test"); },
+     {R"("removed","section":"copies","path":[],"name":"Test","fields":{})"}},
+};
+
+void SetMachine() {
+  Machine().ComputerName = "ORXHOST";
+  Machine().ExtendedVersion = SystemVersion{5, 2, 3790, 2, "", 1, 0, 0, 3};
+  Machine().DomainUser = "H\\ana";
+  Machine().LocalGroups = {{"Administrators", {"H\\ana", "H\\bob"}}};
+  Machine().Services.Entries = {{"a", "ORX Listener", 4}, {"b", "ORX Listener", 4}};
+  SetSoftware("T", "Tools", "1.0");
+  // The key above the copies, which the recorder lists as a copy prior to V9.
+  Set("SOFTWARE\\ZEK\\ORX", "", "");
+  SetProcesses({"init", "orxserver", "editor"});
+}
+
+void Record(size_t number, const Step& step) {
+  const std::string identity = std::to_string(1000 + number);
+  RunTool({"-start", identity, "-Action", step.Action, "-Type", "Silent"});
+  RunTool({"-logmessage", identity, "-message", std::string("Message of ") + step.Action});
+  step.Change();
+  RunTool({"-end", identity, "-CopyName", step.Copy, "-Result", step.Result});
+}
+
+TEST(Story, ReadsBackWhatWasDoneAndNothingElse) {
+  const ScratchHistory scratch;
+  SetMachine();
+  for (size_t i = 0; i < story.size(); ++i) {
+    Record(i, story[i]);
+  }
+  const std::string archive = scratch.In("story.zip");
+  ASSERT_EQ(CInstallHistory().Report(archive), 1);
+
+  std::string error;
+  const std::unique_ptr<Source> source = OpenSource(archive, error);
+  ASSERT_TRUE(source) << error;
+  const History history = ReadHistory(*source, TextDecoder(), Detail::kAll);
+  ASSERT_EQ(history.Events.size(), story.size());
+  for (size_t i = 0; i < story.size(); ++i) {
+    const Event& event = history.Events[i];
+    const std::string identity = std::to_string(1000 + i);
+    std::vector<std::string> changes;
+    for (const Change& change : event.Differences.List) {
+      changes.push_back(ChangeJson("story.zip", event, change));
+    }
+    std::vector<std::string> expected;
+    for (const std::string& change : story[i].Changes) {
+      expected.push_back(R"({"event":")" + identity + R"(","change":)" + change +
+                         R"(,"source":"story.zip"})");
+    }
+    EXPECT_EQ(changes, expected);
+    EXPECT_EQ(event.Messages, std::string("Message of ") + story[i].Action + '\n');
+    EXPECT_EQ(event.Computer, "ORXHOST");
+    EXPECT_TRUE(std::all_of(event.Differences.Compared.begin(), event.Differences.Compared.end(),
+                            [](bool isCompared) { return isCompared; }));
+  }
+  EXPECT_TRUE(source->Findings.empty());
+  for (const Finding& finding : CheckHistory(history)) {
+    ADD_FAILURE() << finding.Code << ' ' << finding.Event << ' ' << finding.Text;
+  }
+}
+
+}  // namespace
