@@ -20,8 +20,9 @@ class CInstallHistory {
   int Run(int argc, char** argv);
 
   // Writes the summaries, collects the installer's files, and packs the history folder into the
-  // archive of that name, absolute or relative to the working directory. Gives 1 when the archive
-  // is there, 0 when not, and says so on standard output. (report/archive.cpp)
+  // archive of that name, absolute or relative to the working directory. Returns 1 when it prints
+  // that the archive was created, else 0; IsArchiveComplete can still be false after a 1.
+  // (report/archive.cpp)
   int Report(const std::string& archiveName);
 
   // 0 when there is no history file and nothing was written, else 1. (report/summary.cpp)
@@ -35,6 +36,10 @@ class CInstallHistory {
   // events. (report/copy_events.cpp)
   void GroupEvents(const std::vector<std::string>& sections,
                    std::vector<std::unique_ptr<CCopyEvents>>& groups) const;
+
+  // After Report: false if the archive was not put in place, or lacks what the zip format has no
+  // room for.
+  bool IsArchiveComplete = false;
 
   int32_t EventCount = 0;  // the starts so far; told to no one but the history file
 
@@ -50,5 +55,5 @@ class CInstallHistory {
   void ResetCount();
 
   bool HistoryFileExists() const;
-  int CreateArchive(const std::string& archiveName) const;
+  int CreateArchive(const std::string& archiveName);
 };

@@ -14,7 +14,8 @@ static bool IsHelp(std::string_view argument) {
   });
 }
 
-// Exit results: 0 to 2 as CInstallHistory::Run returns them, 3 for an archive that is not there.
+// Exit results: 0 to 2 as CInstallHistory::Run returns them, 3 for an archive that is not
+// complete.
 int main(int argc, char** argv) {
   PrepareProcess();
   if (argc == 2 && IsHelp(argv[1])) {
@@ -32,7 +33,8 @@ int main(int argc, char** argv) {
   }
   CInstallHistory history;
   if (isReport && argc == 3) {
-    return history.Report(argv[2]) == 1 ? 0 : 3;
+    history.Report(argv[2]);
+    return history.IsArchiveComplete ? 0 : 3;
   }
   return history.Run(argc, argv);
 }

@@ -5,9 +5,10 @@
 #include <string>
 
 // A regular file opened for reading, for as long as the object lives. On Windows nobody else may
-// have it open at the same time; POSIX has no such lock. A symbolic link is not followed, and
-// opening a pipe or device neither succeeds nor waits.
-// Windows: CreateFileA with share mode 0. POSIX: open.
+// have it open at the same time, and another program's opening of it is waited for, up to 0.2
+// seconds; POSIX has no such lock. A symbolic link is not followed, and opening a pipe or device
+// neither succeeds nor waits.
+// Windows: CreateFileA with share mode 0, ReadFile. POSIX: open with O_NOFOLLOW, read.
 class ExclusiveFile {
  public:
   explicit ExclusiveFile(const std::string& path);
@@ -17,10 +18,16 @@ class ExclusiveFile {
 
   bool IsOpen() const;
 
-  // Fills at most size bytes of the buffer and gives how many; 0 at the end, on a failure, and
-  // without an open file.
+  // In bytes, when it was opened; 0 without an open file.
+  uint64_t Size() const { return SizeInBytes; }
+
+  // Fills at most size bytes of the buffer with the next ones of the file and returns how many; 0
+  // at the end, after a failure and without an open file. The end is where it was when the file was
+  // opened: a file that grows all the time has one, too.
   size_t Read(char* buffer, size_t size);
 
  private:
   intptr_t Handle = -1;
+  uint64_t SizeInBytes = 0;
+  uint64_t Offset = 0;
 };

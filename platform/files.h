@@ -2,7 +2,7 @@
 
 #include <string>
 
-// Single operations on files and folders. A failure is a false or a "none", without a reason.
+// Single operations on files and folders. A failure is a false or kNone, without a reason.
 
 enum class FileKind {
   kNone,    // nothing of that name, or its status cannot be read
@@ -11,28 +11,36 @@ enum class FileKind {
   kOther,   // a device, a pipe, a socket
 };
 
-// What stands at the path. A symbolic link counts as what it leads to.
-// Windows: _stat. POSIX: stat.
+// The kind of the file at the path; of a symbolic link, that of its target.
+// Windows: _stat64, and CreateFileA to tell a file from a device. POSIX: stat.
 FileKind KindOf(const std::string& path);
 
-// True if the last part of the path is a link to another place: a symbolic link, on Windows also a
-// junction. False if there is nothing of that name.
+// True if the last part of the path is a symbolic link or, on Windows, a junction. False if nothing
+// of that name exists.
+// Windows: FindFirstFileA. POSIX: lstat.
 bool IsSymbolicLink(const std::string& path);
 
-// True if both paths lead to one and the same existing file, whatever their spelling.
+// True if both paths lead to the same existing file or folder: in another spelling, through a link,
+// by another hard link. False for a device.
+// Windows: CreateFileA, GetFileInformationByHandle (volume and file index). POSIX: stat (device and
+// inode).
 bool IsSameFile(const std::string& first, const std::string& second);
 
-// Makes one folder; the folder above it must exist. False if anything of that name exists.
-// Windows: CreateDirectoryA with default security. POSIX: mkdir.
+// Makes one folder; its parent must exist. False if anything of that name exists.
+// Windows: CreateDirectoryA with default security. POSIX: mkdir with mode 0777.
 bool CreateFolder(const std::string& path);
 
-// Moves a folder with all it holds in one step. False, with nothing moved, if anything of the
-// target's name exists (an empty folder too) or the source does not.
-// Windows: MoveFileA. POSIX: renameat2 with RENAME_NOREPLACE.
+// Moves a folder with its contents in one step. False, with nothing moved, if anything of the
+// target's name exists (an empty folder too), or the source is not a folder or is a link to one.
+// Windows: MoveFileA; a folder with a file in use is waited for, up to 0.2 seconds. POSIX:
+// renameat2 with RENAME_NOREPLACE.
 bool MoveFolder(const std::string& source, const std::string& target);
 
-// Copies a file to a name that nothing has yet, and keeps its last-write time. The target comes
-// into being whole or not at all; while it grows it has a name that begins with a dot. False if
-// anything of the target's name exists (a dangling link too) or any step fails.
-// Windows: CopyFileA, refusing an existing target. POSIX: copy_file_range beside it, then link.
+// Copies a regular file to a name that nothing has yet, with its last-write time and permissions
+// (Windows: attributes) where the file system can. A source that grows is copied up to the size
+// that it had when it was opened. The target appears whole or not at all: it is a TemporaryFile
+// until then. False if anything of the target's name exists (a dangling link too) or the contents
+// cannot be copied.
+// Windows: ReadFile, WriteFile, SetFileTime, SetFileAttributesA; a source that is in use is waited
+// for, up to 0.2 seconds. POSIX: sendfile, fchmod, futimens.
 bool CopyToNewFile(const std::string& source, const std::string& target);

@@ -3,9 +3,10 @@
 #include <algorithm>
 #include <ctime>
 
-#include "platform/exclusive_file.h"
+#include "platform/ascii_case.h"
 #include "platform/files.h"
 #include "platform/path.h"
+#include "platform/profile_file.h"
 #include "report/zip_names.h"
 
 static constexpr size_t chunkSize = 2048;
@@ -26,6 +27,16 @@ static CalendarTime UTCNow() {
           utc->tm_hour,        utc->tm_min,     utc->tm_sec};
 }
 
+// The time itself, or the first or last one that an archive can store.
+static CalendarTime Storable(const CalendarTime& time) {
+  constexpr CalendarTime first = {1980, 1, 1, 0, 0, 0};
+  constexpr CalendarTime last = {2107, 12, 31, 23, 59, 59};
+  const bool isNone = time.Year == 0;
+  return isNone || (time.Year >= first.Year && time.Year <= last.Year) ? time
+         : time.Year < first.Year                                      ? first
+                                                                       : last;
+}
+
 static bool BeginsWithPart(const std::string& path, const char* part) {
   return path.starts_with(std::string(part) + kPathSeparator);
 }
@@ -41,25 +52,41 @@ CZipper::~CZipper() { Close(); }
 bool CZipper::Open(const char* archivePath, const char* rootFolder, bool append) {
   Close();
   Counters = {};
+  EntryCount = 0;
+  WithinLimits = true;
   const std::optional<std::string> path = AbsolutePath(archivePath == nullptr ? "" : archivePath);
-  if (!path) {
+  if (!path || IsSymbolicLink(*path)) {
     return false;
   }
-  const bool adds = append && KindOf(*path) != FileKind::kNone;
-  ZipHandle = zipOpen(path->c_str(), adds ? APPEND_STATUS_ADDINZIP : APPEND_STATUS_CREATE);
+  const FileKind kind = KindOf(*path);
+  if (kind != FileKind::kNone && kind != FileKind::kFile) {
+    return false;
+  }
+  if (append && kind == FileKind::kFile) {
+    ZipHandle = zipOpen(path->c_str(), APPEND_STATUS_ADDINZIP);
+  } else if (NewArchive.emplace(*path).Exists()) {
+    ZipHandle = zipOpen(NewArchive->Path().c_str(), APPEND_STATUS_CREATE);
+  }
   if (ZipHandle == nullptr) {
+    NewArchive.reset();
     return false;
   }
+  IsWritten = true;
   ArchivePath = *path;
   RootFolder = TrimTail(rootFolder == nullptr ? FolderPart(*path) : JoinPath(rootFolder, ""));
   return true;
 }
 
 bool CZipper::Close() {
-  const bool closed = ZipHandle == nullptr || zipClose(ZipHandle, nullptr) == ZIP_OK;
-  ZipHandle = nullptr;
   RootFolder.clear();
-  return closed;
+  if (ZipHandle == nullptr) {
+    return true;
+  }
+  IsWritten = zipClose(ZipHandle, nullptr) == ZIP_OK && IsWritten;
+  ZipHandle = nullptr;
+  const bool isInPlace = IsWritten && (!NewArchive || NewArchive->Replace());
+  NewArchive.reset();
+  return isInPlace;
 }
 
 bool CZipper::AddFile(const std::string& path, bool ignorePath) {
@@ -79,20 +106,19 @@ bool CZipper::AddFileWithFolder(const std::string& path, const std::string& fold
 }
 
 bool CZipper::AddBuffer(const void* data, uint32_t size, const std::string& name) {
-  if (ZipHandle == nullptr || IsRootedPath(name)) {
+  constexpr uint32_t normalAttributes = 128;
+  if (ZipHandle == nullptr || IsRootedPath(name) ||
+      !BeginEntry(TrimEntryName(name), normalAttributes, UTCNow())) {
     return false;
   }
-  constexpr uint32_t normalAttributes = 128;
-  int error = OpenEntry(TrimEntryName(name), normalAttributes, UTCNow());
-  if (error == ZIP_OK) {
-    ++Counters.FileCount;
-  }
+  ++Counters.FileCount;
   const std::string_view bytes(static_cast<const char*>(data), size);
-  for (size_t place = 0; error == ZIP_OK && place < size; place += chunkSize) {
-    error = WriteToEntry(bytes.substr(place, chunkSize));
+  bool isWritten = true;
+  for (size_t offset = 0; isWritten && offset < size; offset += chunkSize) {
+    isWritten = WriteToEntry(bytes.substr(offset, chunkSize));
   }
-  zipCloseFileInZip(ZipHandle);
-  return error == ZIP_OK;
+  EndEntry();
+  return isWritten;
 }
 
 bool CZipper::AddFolder(const std::string& path, bool ignorePath) {
@@ -106,9 +132,9 @@ bool CZipper::AddFolder(const std::string& path, bool ignorePath) {
   if (!name) {
     return false;
   }
-  if (const std::string entryName = TrimEntryName(*name); !entryName.empty()) {
-    OpenEntry(entryName, AttributeWord(folder), TimeOf(folder));
-    zipCloseFileInZip(ZipHandle);
+  const std::string entryName = TrimEntryName(*name);
+  if (!entryName.empty() && BeginEntry(entryName, AttributeWord(folder), TimeOf(folder))) {
+    EndEntry();
   }
   AddContents(folder, ignorePath);
   return true;
@@ -131,7 +157,7 @@ void CZipper::AddContents(const std::string& folder, bool ignorePath) {
 void CZipper::GetFileInfo(ZipFileInfo& info) const { info = Counters; }
 
 bool CZipper::ZipFolder(const std::string& folder, bool ignorePath) {
-  // Absolute, as a relative path would lie below the root folder, which is the folder itself.
+  // Absolute, as a relative path would be below the root folder, which is the folder itself.
   const std::optional<std::string> path = AbsolutePath(folder);
   if (!path) {
     return false;
@@ -148,7 +174,7 @@ bool CZipper::ZipFile(const std::string& path) {
   }
   const std::string archive = ReplaceExtension(*file, ".zip");
   CZipper zipper;
-  // Opened, the archive of an archive would have replaced it before it is packed.
+  // An archive cannot contain the file that it replaces.
   return !IsSameFile(*file, archive) && zipper.Open(archive.c_str(), FolderPart(*file).c_str()) &&
          zipper.AddFile(*file);
 }
@@ -167,51 +193,78 @@ std::optional<std::string> CZipper::FileEntryName(const std::string& path, bool 
   return BeginsWithPart(path, ".") ? path.substr(2) : path;
 }
 
-int CZipper::OpenEntry(const std::string& name, uint32_t attributes, const CalendarTime& time) {
+bool CZipper::BeginEntry(const std::string& name, uint32_t attributes, const CalendarTime& time) {
+  if (EntryCount == Limits.Entries) {
+    WithinLimits = false;
+    return false;
+  }
   // Signed in some versions of minizip, unsigned in others.
   using Field = decltype(tm_zip::tm_sec);
+  const CalendarTime stored = Storable(time);
   zip_fileinfo info = {};
-  info.tmz_date.tm_sec = static_cast<Field>(time.Second);
-  info.tmz_date.tm_min = static_cast<Field>(time.Minute);
-  info.tmz_date.tm_hour = static_cast<Field>(time.Hour);
-  info.tmz_date.tm_mday = static_cast<Field>(time.Day);
-  info.tmz_date.tm_mon = static_cast<Field>(std::max(time.Month - 1, 0));  // 0 without a time
-  info.tmz_date.tm_year = static_cast<Field>(time.Year);
+  info.tmz_date.tm_sec = static_cast<Field>(stored.Second);
+  info.tmz_date.tm_min = static_cast<Field>(stored.Minute);
+  info.tmz_date.tm_hour = static_cast<Field>(stored.Hour);
+  info.tmz_date.tm_mday = static_cast<Field>(stored.Day);
+  info.tmz_date.tm_mon = static_cast<Field>(std::max(stored.Month - 1, 0));  // 0 without a time
+  info.tmz_date.tm_year = static_cast<Field>(stored.Year);
   info.external_fa = attributes;
-  return zipOpenNewFileInZip(ZipHandle, name.c_str(), &info, nullptr, 0, nullptr, 0, nullptr,
-                             Z_DEFLATED, Z_DEFAULT_COMPRESSION);
+  if (zipOpenNewFileInZip(ZipHandle, name.c_str(), &info, nullptr, 0, nullptr, 0, nullptr,
+                          Z_DEFLATED, Z_DEFAULT_COMPRESSION) != ZIP_OK) {
+    EndEntry();  // part of it may be written
+    IsWritten = false;
+    return false;
+  }
+  ++EntryCount;
+  return true;
 }
 
-int CZipper::WriteToEntry(std::string_view bytes) {
-  const int error =
-      zipWriteInFileInZip(ZipHandle, bytes.data(), static_cast<unsigned>(bytes.size()));
-  if (error == ZIP_OK) {
-    Counters.UncompressedSize += static_cast<uint32_t>(bytes.size());
+bool CZipper::WriteToEntry(std::string_view bytes) {
+  if (zipWriteInFileInZip(ZipHandle, bytes.data(), static_cast<unsigned>(bytes.size())) != ZIP_OK) {
+    IsWritten = false;
+    return false;
   }
-  return error;
+  Counters.UncompressedSize += static_cast<uint32_t>(bytes.size());
+  return true;
+}
+
+void CZipper::EndEntry() {
+  if (zipCloseFileInZip(ZipHandle) != ZIP_OK) {
+    IsWritten = false;
+  }
 }
 
 bool CZipper::PackFile(const std::string& source, const std::string& name, uint32_t attributes) {
-  // Where nothing keeps an open file from being opened again, the archive would swallow itself.
   if (IsSameFile(source, ArchivePath)) {
     return false;
   }
+  std::optional<ProfileGuard> guard;
+  if (!GuardedFile.empty() && EqualsIgnoringCase(source, GuardedFile)) {
+    guard.emplace(GuardedFile);
+  }
   ExclusiveFile file(source);
-  if (!file.IsOpen()) {
+  if (!file.IsOpen() || !BeginEntry(TrimEntryName(name), attributes, TimeOf(source))) {
     return false;
   }
-  int error = OpenEntry(TrimEntryName(name), attributes, TimeOf(source));
-  if (error == ZIP_OK) {
-    ++Counters.FileCount;
-  }
+  ++Counters.FileCount;
+  const bool isWritten = CopyToEntry(file);
+  EndEntry();
+  return isWritten;
+}
+
+// False if a write fails; a failed read ends the entry.
+bool CZipper::CopyToEntry(ExclusiveFile& file) {
+  WithinLimits = WithinLimits && file.Size() <= Limits.EntrySize;
   char buffer[chunkSize];
-  while (error == ZIP_OK) {
-    const size_t size = file.Read(buffer, sizeof buffer);
+  for (uint64_t rest = Limits.EntrySize; rest > 0;) {
+    const size_t size = file.Read(buffer, std::min<uint64_t>(rest, sizeof buffer));
     if (size == 0) {
       break;
     }
-    error = WriteToEntry({buffer, size});
+    if (!WriteToEntry({buffer, size})) {
+      return false;
+    }
+    rest -= size;
   }
-  zipCloseFileInZip(ZipHandle);
-  return error == ZIP_OK;
+  return true;
 }

@@ -9,15 +9,14 @@
 
 #include "platform/posix/descriptor.h"
 
-// System calls that more than one file here needs, repeated as long as a signal interrupts them.
-// False, with the reason in errno, if one fails.
+// System calls that several files here need, repeated while a signal interrupts them. They return
+// false, with the reason in errno, if a call fails.
 
-enum class Links { kFollow, kTell };
+enum class Links { kFollow, kNoFollow };
 
-// The status of what stands at the path. A symbolic link there counts as what it leads to, or is
-// told of itself.
+// The status of the file at the path; with kNoFollow that of a symbolic link itself.
 inline bool StatusOf(const std::string& path, Links links, struct stat& status) {
-  const int flags = links == Links::kTell ? AT_SYMLINK_NOFOLLOW : 0;
+  const int flags = links == Links::kNoFollow ? AT_SYMLINK_NOFOLLOW : 0;
   return RetryOnInterrupt([&] { return ::fstatat(AT_FDCWD, path.c_str(), &status, flags); }) == 0;
 }
 
@@ -29,6 +28,15 @@ inline bool RenameOver(const std::string& source, const std::string& target) {
   return RetryOnInterrupt([&] { return ::rename(source.c_str(), target.c_str()); }) == 0;
 }
 
+// Renames to a name that nothing has.
+bool RenameToNew(const std::string& source, const std::string& target);
+
 inline bool RemoveFile(const std::string& path) {
   return RetryOnInterrupt([&] { return ::unlink(path.c_str()); }) == 0;
+}
+
+// Forces the data of a file to the disk. True also on a file system that cannot do that.
+inline bool FlushToDisk(const Descriptor& file) {
+  return RetryOnInterrupt([&] { return ::fdatasync(file.Get()); }) == 0 || errno == EINVAL ||
+         errno == ENOTSUP || errno == ENOSYS || errno == EROFS;
 }

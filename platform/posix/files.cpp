@@ -5,11 +5,12 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cstdio>
 
-#include "platform/path.h"
 #include "platform/posix/descriptor.h"
 #include "platform/posix/file_calls.h"
+#include "platform/temporary_file.h"
 
 FileKind KindOf(const std::string& path) {
   struct stat status = {};
@@ -23,7 +24,7 @@ FileKind KindOf(const std::string& path) {
 
 bool IsSymbolicLink(const std::string& path) {
   struct stat status = {};
-  return StatusOf(path, Links::kTell, status) && S_ISLNK(status.st_mode);
+  return StatusOf(path, Links::kNoFollow, status) && S_ISLNK(status.st_mode);
 }
 
 bool IsSameFile(const std::string& first, const std::string& second) {
@@ -37,8 +38,7 @@ bool CreateFolder(const std::string& path) {
   return RetryOnInterrupt([&] { return ::mkdir(path.c_str(), 0777); }) == 0;
 }
 
-// Renames only to a name that nothing has.
-static bool RenameToNew(const std::string& source, const std::string& target) {
+bool RenameToNew(const std::string& source, const std::string& target) {
   const int result = RetryOnInterrupt([&] {
     return ::renameat2(AT_FDCWD, source.c_str(), AT_FDCWD, target.c_str(), RENAME_NOREPLACE);
   });
@@ -48,35 +48,41 @@ static bool RenameToNew(const std::string& source, const std::string& target) {
   if (errno != EINVAL && errno != ENOSYS) {
     return false;
   }
-  // A file system without that flag: what comes into being between the look and the renaming can
-  // be lost if it is an empty folder or a file.
+  // The file system does not know that flag. A file or an empty folder that is created between
+  // these two calls is lost.
   struct stat status = {};
-  return !StatusOf(target, Links::kTell, status) && errno == ENOENT && RenameOver(source, target);
+  return !StatusOf(target, Links::kNoFollow, status) && errno == ENOENT &&
+         RenameOver(source, target);
 }
 
 bool MoveFolder(const std::string& source, const std::string& target) {
   struct stat status = {};
-  return StatusOf(source, Links::kTell, status) && S_ISDIR(status.st_mode) &&
+  return StatusOf(source, Links::kNoFollow, status) && S_ISDIR(status.st_mode) &&
          RenameToNew(source, target);
 }
 
-// Copies all bytes, the last-write time and the permissions.
-static bool CopyContents(const Descriptor& source, const Descriptor& target,
-                         const struct stat& status) {
-  constexpr size_t most = 1 << 30;
-  for (;;) {
-    const ssize_t count = RetryOnInterrupt(
-        [&] { return ::sendfile(target.Get(), source.Get(), /*offset=*/nullptr, most); });
+// Copies the bytes that the source has by its status, or fewer if it is cut meanwhile, and then its
+// last-write time and permissions, where the file system can.
+static bool CopyContents(const Descriptor& source, const struct stat& status,
+                         const Descriptor& target) {
+  constexpr off_t most = 1 << 30;
+  for (off_t rest = status.st_size; rest > 0;) {
+    const ssize_t count = RetryOnInterrupt([&] {
+      return ::sendfile(target.Get(), source.Get(), /*offset=*/nullptr,
+                        static_cast<size_t>(std::min(rest, most)));
+    });
     if (count < 0) {
       return false;
     }
     if (count == 0) {
       break;
     }
+    rest -= count;
   }
   const timespec times[] = {status.st_atim, status.st_mtim};
-  return RetryOnInterrupt([&] { return ::fchmod(target.Get(), status.st_mode & 0777); }) == 0 &&
-         RetryOnInterrupt([&] { return ::futimens(target.Get(), times); }) == 0;
+  RetryOnInterrupt([&] { return ::fchmod(target.Get(), status.st_mode & 0777); });
+  RetryOnInterrupt([&] { return ::futimens(target.Get(), times); });
+  return true;
 }
 
 bool CopyToNewFile(const std::string& source, const std::string& target) {
@@ -87,17 +93,8 @@ bool CopyToNewFile(const std::string& source, const std::string& target) {
   if (!from.IsOpen() || !StatusOf(from, status) || !S_ISREG(status.st_mode)) {
     return false;
   }
-  const std::string folder = FolderPart(target);
-  const std::string growing = folder + ".copy-" + std::to_string(::getpid()) + ".tmp";
-  RemoveFile(growing);  // of a killed process that had the same ID
+  TemporaryFile copy(target);
   const Descriptor to(RetryOnInterrupt(
-      [&] { return ::open(growing.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600); }));
-  if (!to.IsOpen()) {
-    return false;
-  }
-  if (CopyContents(from, to, status) && RenameToNew(growing, target)) {
-    return true;
-  }
-  RemoveFile(growing);
-  return false;
+      [&] { return ::open(copy.Path().c_str(), O_WRONLY | O_NOFOLLOW | O_CLOEXEC); }));
+  return to.IsOpen() && CopyContents(from, status, to) && copy.MoveToNew();
 }

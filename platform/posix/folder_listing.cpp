@@ -20,10 +20,10 @@ static uint32_t AttributesFromMode(mode_t mode) {
   return (mode & anyWrite) == 0 ? readOnly : plain;
 }
 
-// Null behind the last one, and without a folder.
+// Null after the last entry, and without a folder.
 static const dirent* NextEntry(DIR* folder) {
   return folder == nullptr ? nullptr : RetryOnInterrupt([folder] {
-    errno = 0;  // the end is told by a null and no error
+    errno = 0;  // at the end of the folder readdir returns null and leaves it as it is
     return ::readdir(folder);
   });
 }
@@ -52,14 +52,15 @@ std::vector<FolderEntry> ListFolder(const std::string& path) {
 
 std::optional<uint32_t> FileAttributes(const std::string& path) {
   struct stat status = {};
-  return StatusOf(path, Links::kTell, status) ? std::optional(AttributesFromMode(status.st_mode))
-                                              : std::nullopt;
+  return StatusOf(path, Links::kNoFollow, status)
+             ? std::optional(AttributesFromMode(status.st_mode))
+             : std::nullopt;
 }
 
 std::optional<CalendarTime> LastWriteTime(const std::string& path) {
   struct stat status = {};
   tm local = {};
-  if (!StatusOf(path, Links::kTell, status) ||
+  if (!StatusOf(path, Links::kNoFollow, status) ||
       ::localtime_r(&status.st_mtim.tv_sec, &local) == nullptr) {
     return std::nullopt;
   }

@@ -114,12 +114,6 @@ static Descriptor CreateFile(const std::string& path, mode_t mode) {
   }));
 }
 
-// A file system that cannot do it is no reason to lose the text.
-static bool FlushToDisk(const Descriptor& file) {
-  return RetryOnInterrupt([&] { return ::fdatasync(file.Get()); }) == 0 || errno == EINVAL ||
-         errno == ENOTSUP || errno == ENOSYS || errno == EROFS;
-}
-
 // Writes the text to a temporary file and renames it over the profile file.
 bool ProfileStore::Store(const std::string& path, File& file) const {
   const bool isReplacement = file.Status.st_mode != 0;

@@ -20,13 +20,13 @@ static UniqueHandle OpenPatiently(const std::string& path, DWORD access) {
   return file;
 }
 
-static bool Flush(const std::string& path) {
+bool FlushToDisk(const std::string& path) {
   const UniqueHandle file = OpenPatiently(path, GENERIC_WRITE);
   return file && CallWithPatience(25, AccessDenied::kIsFinal,
                                   [&] { return ::FlushFileBuffers(file.get()) != FALSE; });
 }
 
-static bool RenameOver(const std::string& source, const std::string& target) {
+bool RenameOver(const std::string& source, const std::string& target) {
   return CallWithPatience(25, AccessDenied::kMayPass, [&] {
     return ::MoveFileExA(source.c_str(), target.c_str(),
                          MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != FALSE;
@@ -79,5 +79,5 @@ static bool WriteInto(const std::string& source, const std::string& target) {
 }
 
 bool ReplaceFileBy(const std::string& source, const std::string& target) {
-  return Flush(source) && (RenameOver(source, target) || WriteInto(source, target));
+  return FlushToDisk(source) && (RenameOver(source, target) || WriteInto(source, target));
 }

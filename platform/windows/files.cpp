@@ -2,12 +2,16 @@
 
 #include <sys/stat.h>
 
-#include "platform/path.h"
-#include "platform/windows/file_entry.h"
-#include "platform/windows/system.h"
+#include <algorithm>
+#include <cstdint>
 
-// Nothing for what has none, as a device. Zero access is enough to ask for it; a folder needs the
-// flag for backups.
+#include "platform/temporary_file.h"
+#include "platform/windows/file_entry.h"
+#include "platform/windows/file_replacement.h"
+#include "platform/windows/patience.h"
+
+// Empty for what has no identity, as a device. The query needs no access rights; a folder can only
+// be opened with the flag for backups.
 static std::optional<BY_HANDLE_FILE_INFORMATION> IdentityOf(const std::string& path) {
   const UniqueHandle file = OwnIfValid(::CreateFileA(
       path.c_str(), /*dwDesiredAccess=*/0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
@@ -56,17 +60,60 @@ static bool IsNameTaken(const std::string& path) {
 bool MoveFolder(const std::string& source, const std::string& target) {
   // The system itself refuses every target but the source, in another spelling of its name.
   return KindOf(source) == FileKind::kFolder && !IsSymbolicLink(source) && !IsNameTaken(target) &&
-         ::MoveFileA(source.c_str(), target.c_str()) != FALSE;
+         CallWithPatience(10, AccessDenied::kMayPass,
+                          [&] { return ::MoveFileA(source.c_str(), target.c_str()) != FALSE; });
+}
+
+static bool CopyBytes(HANDLE source, uint64_t size, HANDLE target) {
+  char buffer[65536];
+  while (size > 0) {
+    const auto most = static_cast<DWORD>(std::min<uint64_t>(size, sizeof buffer));
+    DWORD count = 0;
+    DWORD written = 0;
+    if (::ReadFile(source, buffer, most, &count, /*lpOverlapped=*/nullptr) == FALSE ||
+        ::WriteFile(target, buffer, count, &written, /*lpOverlapped=*/nullptr) == FALSE ||
+        written != count) {
+      return false;
+    }
+    if (count == 0) {
+      break;
+    }
+    size -= count;
+  }
+  return true;
+}
+
+static UniqueHandle OpenSource(const std::string& path) {
+  UniqueHandle file;
+  CallWithPatience(10, AccessDenied::kIsFinal, [&] {
+    file = OpenShared(path, GENERIC_READ);
+    return file != nullptr;
+  });
+  return file;
+}
+
+// Not CopyFileA, which goes on while the source grows.
+static bool CopyContents(const std::string& source, const std::string& target) {
+  const UniqueHandle from = OpenSource(source);
+  const UniqueHandle to = OpenShared(target, GENERIC_WRITE);
+  BY_HANDLE_FILE_INFORMATION status = {};
+  if (!from || !to || ::GetFileType(from.get()) != FILE_TYPE_DISK ||
+      ::GetFileInformationByHandle(from.get(), &status) == FALSE) {
+    return false;
+  }
+  const uint64_t size = uint64_t{status.nFileSizeHigh} << 32 | status.nFileSizeLow;
+  if (!CopyBytes(from.get(), size, to.get())) {
+    return false;
+  }
+  ::SetFileTime(to.get(), /*lpCreationTime=*/nullptr, /*lpLastAccessTime=*/nullptr,
+                &status.ftLastWriteTime);
+  constexpr DWORD kept = FILE_ATTRIBUTE_READONLY | FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM |
+                         FILE_ATTRIBUTE_ARCHIVE;
+  ::SetFileAttributesA(target.c_str(), status.dwFileAttributes & kept);
+  return true;
 }
 
 bool CopyToNewFile(const std::string& source, const std::string& target) {
-  const std::string growing =
-      FolderPart(target) + ".copy-" + std::to_string(::GetCurrentProcessId()) + ".tmp";
-  RemoveFile(growing);  // of a killed process that had the same ID
-  if (::CopyFileA(source.c_str(), growing.c_str(), /*bFailIfExists=*/1) != FALSE &&
-      ::MoveFileA(growing.c_str(), target.c_str()) != FALSE) {
-    return true;
-  }
-  RemoveFile(growing);
-  return false;
+  TemporaryFile copy(target);
+  return copy.Exists() && CopyContents(source, copy.Path()) && copy.MoveToNew();
 }
