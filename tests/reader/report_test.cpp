@@ -6,7 +6,7 @@
 
 #include "reader/change.h"
 #include "reader/report.h"
-#include "tests/reader/item_text.h"
+#include "tests/reader/change_text.h"
 #include "tests/support/file_text.h"
 
 namespace {
@@ -34,20 +34,6 @@ std::string Join(const std::vector<std::string_view>& pieces) {
   std::string text;
   for (const std::string_view piece : pieces) {
     text += piece;
-  }
-  return text;
-}
-
-std::string ChangeText(const Change& change) {
-  std::string text(ChangeName(change.Kind));
-  text += ' ' + std::string(SectionName(change.Where)) + ' ';
-  for (const std::string& part : change.Path) {
-    text += part + '/';
-  }
-  text += change.Name;
-  for (const FieldChange& field : change.Fields) {
-    text += '|' + std::string(field.Name) + ' ' + field.Before.value_or("-") + " > " +
-            field.After.value_or("-");
   }
   return text;
 }

@@ -1,0 +1,238 @@
+// The model of a history: states, times, all that can go wrong in the calls, and its JSON.
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <map>
+#include <set>
+
+#include "app/install_history.h"
+#include "inventory/service_list.h"
+#include "reader/check.h"
+#include "reader/history.h"
+#include "reader/json.h"
+#include "tests/reader/change_text.h"
+#include "tests/support/fake_machine.h"
+#include "tests/support/file_text.h"
+#include "tests/support/run_tool.h"
+#include "tests/support/scratch_history.h"
+
+namespace {
+
+TEST(Events, HaveTheStateOfTheirResult) {
+  const std::map<std::string, EventState> cases = {
+      {"Successful", EventState::kOk},
+      {"SUCCESS", EventState::kOk},
+      {"ok", EventState::kOk},
+      {"0", EventState::kOk},
+      {"1641", EventState::kOk},
+      {"3010", EventState::kOk},
+      {"1603", EventState::kFailed},
+      {"-1", EventState::kFailed},
+      {"Failed (1603), rolled back", EventState::kFailed},
+      {"Installation aborted", EventState::kFailed},
+      {"user CANCELLED it", EventState::kFailed},
+      {"fatal Error", EventState::kFailed},
+      {"was Rolled Back", EventState::kFailed},
+      {"", EventState::kEnded},
+      {"-", EventState::kEnded},
+      {"Successful with a remark", EventState::kEnded},
+      {"9.4", EventState::kEnded},
+  };
+  for (const auto& [result, state] : cases) {
+    EXPECT_EQ(StateOfResult(result), state) << result;
+  }
+}
+
+TEST(Events, HaveTheTimesThatExist) {
+  const std::map<std::string, std::string> cases = {{"20261114 22:00:03", "2026-11-14T22:00:03"},
+                                                    {"20240229 00:00:00", "2024-02-29T00:00:00"},
+                                                    {"00010101 23:59:59", "0001-01-01T23:59:59"},
+                                                    {"20230229 00:00:00", ""},
+                                                    {"20261301 00:00:00", ""},
+                                                    {"20261114 24:00:00", ""},
+                                                    {"20261114 22:60:00", ""},
+                                                    {"20261114 22:00:60", ""},
+                                                    {"20261114 22:00:0", ""},
+                                                    {"20261114  2:00:03", ""},
+                                                    {"2026-11-14T22:00:03", ""},
+                                                    {"", ""}};
+  for (const auto& [text, iso] : cases) {
+    const auto time = ParseLocalTime(text);
+    EXPECT_EQ(time ? IsoTime(*time) : "", iso) << text;
+  }
+}
+
+std::string Services(const std::vector<std::pair<std::string, std::string>>& services) {
+  return LoggedText([&services] {
+    CServicesList list;
+    for (const auto& [name, state] : services) {
+      list.Services.push_back({"", name, state});
+    }
+    list.Print();
+  });
+}
+
+// Items of one identity: the equal ones belong together, then the first of each with the other.
+TEST(Changes, PairItemsOfOneIdentity) {
+  using Rows = std::vector<std::pair<std::string, std::string>>;
+  struct Case {
+    Rows Before;
+    Rows After;
+    std::vector<std::string> Changes;
+  };
+  const std::string stopped = "changed services ORX|state Started > Stopped";
+  const Case cases[] = {
+      {{{"ORX", "Started"}, {"ORX", "Stopped"}}, {{"ORX", "Stopped"}, {"ORX", "Started"}}, {}},
+      {{{"ORX", "Started"}, {"ORX", "Started"}},
+       {{"ORX", "Stopped"}, {"ORX", "Started"}},
+       {stopped}},
+      {{{"ORX", "Started"}, {"ORX", "Paused"}},
+       {{"ORX", "Paused"}, {"ORX", "Stopped"}, {"ORX", "Stopped"}},
+       {stopped, "added services ORX|state - > Stopped"}},
+      {{{"ORX", "Started"}, {"ORX", "Started"}},
+       {{"ORX", "Started"}},
+       {"removed services ORX|state Started > -"}},
+      {{},
+       {{"ORX b", "Paused"}, {"ORX a", "Paused"}},
+       {"added services ORX b|state - > Paused", "added services ORX a|state - > Paused"}},
+  };
+  for (const Case& example : cases) {
+    const std::string before = Services(example.Before);
+    const std::string after = Services(example.After);
+    Snapshot old;
+    Snapshot now;
+    old.Parts[3] = before;
+    now.Parts[3] = after;
+    std::vector<std::string> texts;
+    for (const Change& change :
+         CompareSnapshots(old, now, TextDecoder(), ChangeDetail::kList).List) {
+      texts.push_back(ChangeText(change));
+    }
+    EXPECT_EQ(texts, example.Changes) << before << after;
+  }
+}
+
+class HistoryOf {
+ public:
+  explicit HistoryOf(const std::string& folder, const std::optional<std::string>& identity = {})
+      : From(OpenSource(folder, Error)) {
+    if (From) {
+      Result = ReadHistory(*From, TextDecoder(), Detail::kAll, identity);
+    }
+  }
+  std::string Error;
+  std::unique_ptr<Source> From;
+  History Result;
+};
+
+std::string FolderOf(const ScratchHistory& scratch) { return scratch.In("ZEK/ORXHistory"); }
+
+// A level, a code and an event for each finding.
+std::set<std::string> Codes(const History& history) {
+  std::set<std::string> codes;
+  for (const Finding& finding : CheckHistory(history)) {
+    EXPECT_FALSE(finding.Text.empty());
+    codes.insert(std::string(LevelName(finding.Level)) + ' ' + finding.Code + ' ' + finding.Event);
+  }
+  return codes;
+}
+
+// An identity, an origin, a state and a report for each event.
+std::set<std::string> Lines(const History& history) {
+  std::set<std::string> lines;
+  for (const Event& event : history.Events) {
+    const char* const origins[] = {"section", "earlier run", "orphan"};
+    lines.insert(event.Identity + ", " + origins[static_cast<int>(event.Origin)] + ", " +
+                 std::string(StateName(event.State)) + ", " + event.Report.value_or("-"));
+  }
+  return lines;
+}
+
+TEST(Check, FindsWhatWentWrongInTheCalls) {
+  const ScratchHistory scratch;
+  scratch.Make("setup.log");
+  RunTool({"-start", "fine", "-l", scratch.In("setup.log")});
+  RunTool({"-end", "fine", "-CopyName", "C1", "-Result", "0"});
+  RunTool({"-start", "open"});
+  RunTool({"-end", "unstarted", "-CopyName", "C1"});
+  for (int i = 0; i < 2; ++i) {
+    RunTool({"-start", "twice", "-Action", i == 0 ? "Install" : "Remove"});
+    RunTool({"-end", "twice", "-CopyName", "C1", "-Result", "0"});
+  }
+  RunTool({"-start", "lost"});
+  RunTool({"-end", "lost", "-CopyName", "C1"});
+  std::filesystem::remove_all(scratch.In("ZEK/ORXHistory/C1/lost"));
+  RunTool({"-start", "again"});
+  RunTool({"-start", "again", "-t", scratch.In("no.trc")});
+  RunTool({"-end", "again"});
+  EXPECT_TRUE(Codes(HistoryOf(FolderOf(scratch)).Result).contains("note file-missing fine"));
+
+  const std::string archive = scratch.In("history.zip");
+  CInstallHistory().Report(archive);
+  const HistoryOf history(archive);
+  EXPECT_EQ(Codes(history.Result),
+            (std::set<std::string>{"warning never-ended open", "warning no-start unstarted",
+                                   "warning started-again twice", "error report-missing lost",
+                                   "warning no-copy again", "warning file-missing again",
+                                   "warning started-again "}));
+  EXPECT_EQ(Lines(history.Result),
+            (std::set<std::string>{
+                "fine, section, ok, C1/fine/ORXInstallEvent.Log",
+                "open, section, open, open/ORXInstallEvent.Log", "unstarted, section, no start, -",
+                "twice, section, ok, twice/ORXInstallEvent.Log",
+                "twice, orphan, ok, C1/twice/ORXInstallEvent.Log", "lost, section, ended, -",
+                "again, section, ended, again/ORXInstallEvent.Log"}));
+  // One event by its name, with its earlier run.
+  EXPECT_EQ(Lines(HistoryOf(archive, "twice").Result).size(), 2U);
+  EXPECT_EQ(HistoryOf(archive, "nobody").Result.Events.size(), 0U);
+}
+
+TEST(Check, WarnsBeforeTheListOfNamesIsFull) {
+  const std::map<size_t, std::string> cases = {{8192, ""},
+                                               {8193, "warning names-limit "},
+                                               {10240, "warning names-limit "},
+                                               {10241, "error names-limit "}};
+  for (const auto& [bytes, code] : cases) {
+    const ScratchHistory scratch;
+    scratch.Make("ZEK/ORXHistory/History.ini");
+    // The names with their ends, and one more end.
+    const std::string name(bytes - std::string("History").size() - 3, 'n');
+    WriteFileText(InHistory("History.ini"), "[History]\nCount=0\n[" + name + "]\nEnd_Time=x\n");
+    const std::set<std::string> codes = Codes(HistoryOf(FolderOf(scratch)).Result);
+    EXPECT_EQ(codes.contains("warning names-limit ") || codes.contains("error names-limit "),
+              !code.empty());
+    EXPECT_TRUE(code.empty() || codes.contains(code)) << bytes;
+  }
+}
+
+// The facts as the history file has them: names without case, the first of two, no quotation marks;
+// bytes beyond UTF-8; a report in which the tool left none.
+TEST(History, IsReadFromFilesEditedByHand) {
+  const ScratchHistory scratch;
+  scratch.Make("ZEK/ORXHistory/History.ini");
+  WriteFileText(InHistory("History.ini"),
+                "[History]\r\nCount=2\r\n"
+                "[B\xFChne \"1\"]\r\nEVENT_ID=x\r\nstart_time = 20261114 22:00:03\r\n"
+                "Start_Time=20250101 00:00:00\r\nEnd_Time=never\r\nComplete_Flag=TRUE\r\n"
+                "Product=\"ORX\tServer\"\r\nResult=\x01\xE2\x82\xAC\r\nCopy_Name=C1\r\n"
+                "[b\xFChne \"1\"]\r\nEvent_ID=second\r\n"
+                "[late]\r\nEvent_ID=late\r\nStart_Time=\r\n"
+                "[early]\r\nStart_Time=20261114 22:00:02\r\n");
+  const HistoryOf history(FolderOf(scratch));
+  std::string lines;
+  for (const Event& event : history.Result.Events) {
+    lines += EventJson("s", event) + '\n';
+  }
+  const std::string changes = R"("changes":{"added":0,"removed":0,"changed":0},"source":"s"})";
+  EXPECT_EQ(
+      lines,
+      R"({"event":"early","computer":null,"started":"2026-11-14T22:00:02","ended":null,"state":"open","action":"","type":"","product":"","version":"","service_level":"","path":"","copy":"","result":"",)" +
+          changes + '\n' +
+          R"({"event":"Bühne \"1\"","computer":null,"started":"2026-11-14T22:00:03","ended":null,"state":"ended","action":"","type":"","product":"ORX\tServer","version":"","service_level":"","path":"","copy":"C1","result":"\u0001€",)" +
+          changes + '\n' +
+          R"({"event":"late","computer":null,"started":null,"ended":null,"state":"open","action":"","type":"","product":"","version":"","service_level":"","path":"","copy":"","result":"",)" +
+          changes + '\n');
+}
+
+}  // namespace
