@@ -28,8 +28,7 @@ void CInstallEvent::Dispatch() {
     WriteMessageBlock();
     CLogger::GetInstance().Close();
   } else if (Mode == "-end") {
-    // The keys come first, as the result block reads them back; the move comes last, as it takes
-    // the folder of the log.
+    // The result block reads the keys back; the log must be closed before its folder is moved.
     RecordEnd();
     WriteSnapshot();
     WriteResultBlock();
@@ -41,23 +40,23 @@ void CInstallEvent::Dispatch() {
 
 void CInstallEvent::OpenEventLog() const {
   if (LeadsOutOfHistory(JoinPath(EventID, "ORXInstallEvent.Log"))) {
-    return;  // a logger that was never opened drops all text, as one that failed to open does
+    return;  // like a log that cannot be opened: the text is dropped
   }
   if (KindOf(EventLogPath) == FileKind::kOther) {
-    return;  // a pipe would hold the run up until somebody reads from it
+    return;  // opening a pipe would wait for its reader
   }
   CLogger& log = CLogger::GetInstance();
   if (Mode == "-start") {
     log.Open(EventLogPath, std::ios::out);
   }
-  // A start appends as well, to the log that it has emptied: a message that another run sends in
-  // the meantime is not written over.
+  // A start appends too, after emptying the log, so that it does not overwrite a message that
+  // another run appends meanwhile.
   log.Open(EventLogPath, std::ios::app);
 }
 
 void CInstallEvent::RecordStart() {
   const ProfileGuard guard(Ini.Path);
-  const auto guardOfRun = std::move(StartGuard);  // ends here too: the snapshot takes its time
+  const auto guardOfRun = std::move(StartGuard);  // ends here too: a snapshot can take seconds
   SetStartTime(GetTimestamp());
   SetEndTime("");
   SetProduct(Product);

@@ -24,7 +24,7 @@ CInstallEvent::CInstallEvent(const std::string& identity)
     : EventID(identity), Ini(GetHistoryFilePath()) {}
 
 void CInstallEvent::ParseOptions(int argc, char** argv) {
-  // The last argument has no value after it, so it is no option whatever it says.
+  // An option as the last argument has no value and is dropped.
   for (int i = 1; i + 1 < argc; ++i) {
     const Option* option = FindOption(argv[i]);
     if (option == nullptr) {

@@ -7,31 +7,30 @@
 #include "history/ini_file.h"
 #include "platform/profile_file.h"
 
-// The record of one event: what this run's command line says of it, and the accessors of what the
-// history file says of it. The two differ on purpose: the fields are this run's, the keys are the
-// event's.
+// The record of one event. The fields hold what this run's command line says; the accessors read
+// and write what the history file says about the event. Neither follows the other.
 //
-// Nothing here reports a failure. A step that fails has no effect, the steps behind it still run,
-// and a key that is missing reads as an empty text.
+// Nothing here reports a failure: a step that fails has no effect, and the next steps still run.
 class CInstallEvent {
  public:
-  // The record for this run. A "-start" writes the first contents of the event's section and makes
-  // the event's folder. With Valid false nothing was written and the paths are empty.
+  // The record for this run; argv[0] is skipped. A "-start" writes the first contents of the
+  // event's section and creates the event's folder. If the command line names no event, Valid is
+  // false, nothing is written and the paths are empty.
   CInstallEvent(int argc, char** argv);
 
-  // A record to read an event of the history with: only the accessors and CollectFiles may be used.
+  // A record for an event of the history. Only the accessors and CollectFiles may be used.
   explicit CInstallEvent(const std::string& identity);
 
   // Runs the steps of the event's kind, in their order. (app/event_dispatch.cpp)
   void Dispatch();
 
-  // Copies the installer's log, trace and response file into the event's folder and turns their
-  // keys to the copies. A file that is missing or whose target exists is left alone, so that any
-  // number of calls give the same. (report/collected_files.cpp)
+  // Copies the installer's log, trace and response file into the event's folder and sets their keys
+  // to the copies. A file that is missing, or whose copy exists, is skipped: a second call changes
+  // nothing. (report/collected_files.cpp)
   void CollectFiles();
 
-  // The keys of the event's section, read at each call: at most 255 bytes come back.
-  // (history/event_keys.cpp)
+  // The keys of the event's section, read from the file by each call: at most 255 bytes, empty if
+  // there is no such key. (history/event_keys.cpp)
   std::string GetLogFileName() const;
   std::string GetTraceFile() const;
   std::string GetResponseFile() const;
@@ -51,7 +50,7 @@ class CInstallEvent {
   std::string GetServiceLevel() const;
   std::string GetProduct() const;
 
-  // Their twins write the key whole, whatever its length; the fields below do not follow.
+  // Write a key of any length. The fields below do not change.
   void SetLogFileName(const std::string& value);
   void SetTraceFile(const std::string& value);
   void SetResponseFile(const std::string& value);
@@ -92,7 +91,8 @@ class CInstallEvent {
   int32_t SectionNumber = 0;  // of the snapshot's next section
   CIniFile Ini;
 
-  // The guard of a "-start" on the history file, which RecordStart ends; else null.
+  // Guards the history file from Run to the end of RecordStart, so that a "-start" replaces it
+  // once; else null. Shared, as records are copied.
   std::shared_ptr<const ProfileGuard> StartGuard;
 
  private:
@@ -100,15 +100,14 @@ class CInstallEvent {
   void CheckMode();
   void WriteDefaults();
 
-  // True when the event's folder exists afterwards; otherwise a text on standard output says that
-  // it does not.
+  // True if the event's folder exists afterwards; prints a text to standard output if not.
   bool CreateEventFolder() const;
 
   void OpenEventLog() const;
   void RecordStart();
   void RecordEnd();
 
-  // The blocks that frame a report. (eventlog/event_blocks.cpp)
+  // The blocks around the snapshots of a report. (eventlog/event_blocks.cpp)
   void WriteStartBlock() const;
   void WriteMessageBlock() const;
   void WriteResultBlock() const;
@@ -118,7 +117,8 @@ class CInstallEvent {
   // (eventlog/event_placement.cpp)
   void PlaceEventLog();
 
-  // The machine as it is now: a box, six numbered sections, a box. (inventory/snapshot.cpp)
+  // The state of the machine: an opening box, six numbered sections, a closing box.
+  // (inventory/snapshot.cpp)
   void WriteSnapshot();
   void WriteUserSection();
   void WriteSoftwareSection();

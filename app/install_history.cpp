@@ -11,7 +11,7 @@
 CInstallHistory::CInstallHistory() { ReadCount(); }
 
 int CInstallHistory::Run(int argc, char** argv) {
-  // From the look at the history file to the start keys, so that a start replaces it once.
+  // Until the start keys are written, so that a start replaces the history file once.
   auto guard = std::make_shared<const ProfileGuard>(GetHistoryFilePath());
   if (!InitHistoryStore()) {
     std::cout << "Initialiation Failed:" << std::endl;
@@ -38,8 +38,8 @@ bool CInstallHistory::InitHistoryStore() {
     std::cout << " Failed to create path:" << historyFolder;
     return false;
   }
-  // Run's own guard does nothing on a first run, as the folder did not exist. Without this one, a
-  // run that counts its event now would have its count reset.
+  // On a first run Run's guard could not lock the folder. Without this one, another run could count
+  // its event now, and the reset would undo that.
   const ProfileGuard guard(GetHistoryFilePath());
   // A file that exists but whose status cannot be read must keep its count.
   const CIniFile history(GetHistoryFilePath());

@@ -8,15 +8,15 @@
 class CInstallEvent;
 struct CCopyEvents;
 
-// The top of the tool: the set-up of the history, one event of a run, the report over all of it.
+// The top of the program: sets up the history, runs one event, or reports on all events.
 class CInstallHistory {
  public:
-  // Reads Count; 0 where there is no history file yet.
+  // Reads Count; 0 if there is no history file yet.
   CInstallHistory();
 
-  // One event, as the command line names it; element 0 is not looked at. Gives 0 when the event
-  // was dispatched, whatever its steps met; 1 when the history folders cannot be made; 2 when the
-  // command line names no event, and then nothing but the empty history was written.
+  // Runs the event that the command line names; argv[0] is skipped. Returns 0 if the event was
+  // dispatched, even if its steps failed; 1 if the history folders cannot be created; 2 if the
+  // command line names no event, and then only an empty history is created.
   int Run(int argc, char** argv);
 
   // Writes the summaries, collects the installer's files, and packs the history folder into the
@@ -25,15 +25,15 @@ class CInstallHistory {
   // (report/archive.cpp)
   int Report(const std::string& archiveName);
 
-  // 0 when there is no history file and nothing was written, else 1. (report/summary.cpp)
+  // Returns 0, and writes nothing, if there is no history file, else 1. (report/summary.cpp)
   int WriteSummary();
 
-  // The names of all event sections in file order; what takes more than 10240 bytes is missing.
+  // The names of all event sections in file order, up to 10240 bytes of names with their ends.
   // (report/copy_events.cpp)
   std::vector<std::string> GetEventSections() const;
 
-  // Puts the events into the groups of their copies; groups stand in the order of their first
-  // events. (report/copy_events.cpp)
+  // Groups the events by their copies; the groups are in the order of their first events.
+  // (report/copy_events.cpp)
   void GroupEvents(const std::vector<std::string>& sections,
                    std::vector<std::unique_ptr<CCopyEvents>>& groups) const;
 
@@ -41,10 +41,11 @@ class CInstallHistory {
   // room for.
   bool IsArchiveComplete = false;
 
-  int32_t EventCount = 0;  // the starts so far; told to no one but the history file
+  int32_t EventCount = 0;  // the number of starts so far
 
  private:
-  // True when the history folders and the history file are there.
+  // Creates the history folders and the history file if they do not exist. False if a folder
+  // cannot be created.
   bool InitHistoryStore();
 
   // Builds the record of this run and counts a "-start"; to be called under a guard.

@@ -14,8 +14,7 @@ static bool IsHelp(std::string_view argument) {
   });
 }
 
-// Exit results: 0 to 2 as CInstallHistory::Run returns them, 3 for an archive that is not
-// complete.
+// Exit results: 0 to 2 from CInstallHistory::Run, 3 if the archive is not complete.
 int main(int argc, char** argv) {
   PrepareProcess();
   if (argc == 2 && IsHelp(argv[1])) {

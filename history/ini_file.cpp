@@ -2,7 +2,7 @@
 
 #include "platform/profile_file.h"
 
-// A name or value with a line break in it would begin a line of its own in the file.
+// A line break would begin another line of the file.
 static std::string OnOneLine(const std::string& text) {
   std::string line;
   line.reserve(text.size());
@@ -42,9 +42,9 @@ bool CIniFile::WriteInt(const std::string& section, const std::string& key, int3
 std::vector<std::string> CIniFile::GetSectionNames() const {
   const std::string buffer = ReadProfileSectionNames(Path, 0x2800);
   std::vector<std::string> names;
-  for (size_t place = 0; place < buffer.size() && buffer[place] != '\0';) {
-    names.emplace_back(buffer.c_str() + place);
-    place += names.back().size() + 1;
+  for (size_t offset = 0; offset < buffer.size() && buffer[offset] != '\0';) {
+    names.emplace_back(buffer.c_str() + offset);
+    offset += names.back().size() + 1;
   }
   return names;
 }
