@@ -1,6 +1,7 @@
 #include "reader/check.h"
 
 #include <string>
+#include <unordered_set>
 #include <utility>
 
 namespace {
@@ -14,6 +15,11 @@ class Checker {
 
   std::vector<Finding> Check() {
     CheckHistoryFile();
+    for (const Event& event : Checked.Events) {
+      if (event.Origin == EventOrigin::kSection) {
+        Sections.insert(event.Identity);
+      }
+    }
     for (const Event& event : Checked.Events) {
       CheckEvent(event);
     }
@@ -45,10 +51,7 @@ class Checker {
   void CheckEvent(const Event& event) {
     const std::string& identity = event.Identity;
     if (event.Origin != EventOrigin::kSection) {
-      Add(FindingLevel::kWarning, "started-again", identity,
-          event.Origin == EventOrigin::kOrphan
-              ? "no section names the report " + event.Report.value_or("")
-              : "an earlier run is in the report " + event.Report.value_or(""));
+      CheckRunWithoutSection(event);
       CheckReport(event);
       return;
     }
@@ -62,6 +65,20 @@ class Checker {
     }
     CheckReport(event);
     CheckFiles(event);
+  }
+
+  void CheckRunWithoutSection(const Event& event) {
+    const std::string report = event.Report.value_or("");
+    if (event.Origin == EventOrigin::kEarlierRun) {
+      Add(FindingLevel::kWarning, "started-again", event.Identity,
+          "an earlier run is in the report " + report);
+    } else if (Sections.contains(event.Identity)) {
+      Add(FindingLevel::kWarning, "started-again", event.Identity,
+          "an earlier run has the report " + report);
+    } else {
+      Add(FindingLevel::kWarning, "damaged", event.Identity,
+          "no section of History.ini names the report " + report);
+    }
   }
 
   // An event without a start has no report.
@@ -101,6 +118,7 @@ class Checker {
   }
 
   const History& Checked;
+  std::unordered_set<std::string> Sections;  // identities
   std::vector<Finding> Findings;
 };
 

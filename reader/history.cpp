@@ -8,6 +8,7 @@
 
 #include "platform/ascii_case.h"
 #include "platform/profile_text.h"
+#include "reader/event_section.h"
 #include "reader/history_files.h"
 #include "reader/report.h"
 
@@ -18,88 +19,10 @@ constexpr std::string_view reportName = "ORXInstallEvent.Log";
 // Of the changes and messages that are kept, over all events.
 constexpr size_t mostBytesKept = 96 << 20;
 
-// The values of an event's section as they are in the file.
-struct EventSection {
-  std::string_view Name;
-  std::string_view EventID;
-  std::string_view CommandLine;
-  std::string_view StartTime;
-  std::string_view EndTime;
-  std::string_view Action;
-  std::string_view Type;
-  std::string_view Product;
-  std::string_view Version;
-  std::string_view ServiceLevel;
-  std::string_view Path;
-  std::string_view CopyName;
-  std::string_view CompleteFlag;
-  std::string_view LogFileName;
-  std::string_view TraceFile;
-  std::string_view ResponseFile;
-  std::string_view EventLogFile;
-  std::string_view Result;
-};
-
-struct Key {
-  std::string_view Name;
-  std::string_view EventSection::*Value;
-};
-
-constexpr Key keys[] = {
-    {"Event_ID", &EventSection::EventID},
-    {"Command_Line", &EventSection::CommandLine},
-    {"Start_Time", &EventSection::StartTime},
-    {"End_Time", &EventSection::EndTime},
-    {"Action", &EventSection::Action},
-    {"Type", &EventSection::Type},
-    {"Product", &EventSection::Product},
-    {"Version", &EventSection::Version},
-    {"Service_Level", &EventSection::ServiceLevel},
-    {"Path", &EventSection::Path},
-    {"Copy_Name", &EventSection::CopyName},
-    {"Complete_Flag", &EventSection::CompleteFlag},
-    {"Log_File_Name", &EventSection::LogFileName},
-    {"Trace_File", &EventSection::TraceFile},
-    {"Response_File", &EventSection::ResponseFile},
-    {"Event_Log_File", &EventSection::EventLogFile},
-    {"Result", &EventSection::Result},
-};
-
-// A value ends at its first zero byte, as the recorder reads it.
-std::string_view UpToZero(std::string_view text) { return text.substr(0, text.find('\0')); }
-
-// True if a key of an event is in the section.
-bool ReadSection(const ProfileText& text, size_t section, EventSection& values) {
-  values.Name = UpToZero(text.NameOf(section));
-  bool hasKey = false;
-  std::unordered_set<const Key*> seen;
-  for (const ProfileLine& line : text.LinesOf(section)) {
-    const auto* const key = std::find_if(std::begin(keys), std::end(keys), [&line](const Key& k) {
-      return EqualsIgnoringCase(k.Name, line.Key);
-    });
-    if (key != std::end(keys) && seen.insert(key).second) {
-      values.*key->Value = UpToZero(line.Value);
-      hasKey = true;
-    }
-  }
-  return hasKey;
-}
-
 std::string Lowered(std::string_view text) {
   std::string lowered(text);
   std::transform(lowered.begin(), lowered.end(), lowered.begin(), ToLowerAscii);
   return lowered;
-}
-
-bool HasEnded(const EventSection& section) {
-  return EqualsIgnoringCase(section.CompleteFlag, "TRUE") || !section.EndTime.empty();
-}
-
-EventState StateOf(const EventSection& section) {
-  if (section.StartTime.empty() && section.EventID.empty()) {
-    return EventState::kNoStart;
-  }
-  return HasEnded(section) ? StateOfResult(section.Result) : EventState::kOpen;
 }
 
 std::optional<std::string> IfNotEmpty(std::string_view text) {

@@ -163,6 +163,7 @@ TEST(Check, FindsWhatWentWrongInTheCalls) {
   RunTool({"-start", "lost"});
   RunTool({"-end", "lost", "-CopyName", "C1"});
   std::filesystem::remove_all(scratch.In("ZEK/ORXHistory/C1/lost"));
+  scratch.Make("ZEK/ORXHistory/C2/alone/ORXInstallEvent.Log");
   RunTool({"-start", "again"});
   RunTool({"-start", "again", "-t", scratch.In("no.trc")});
   RunTool({"-end", "again"});
@@ -174,12 +175,13 @@ TEST(Check, FindsWhatWentWrongInTheCalls) {
   EXPECT_EQ(Codes(history.Result),
             (std::set<std::string>{"warning never-ended open", "warning no-start unstarted",
                                    "warning started-again twice", "error report-missing lost",
-                                   "warning no-copy again", "warning file-missing again",
-                                   "warning started-again "}));
+                                   "warning damaged alone", "warning no-copy again",
+                                   "warning file-missing again", "warning started-again "}));
   EXPECT_EQ(Lines(history.Result),
             (std::set<std::string>{
                 "fine, section, ok, C1/fine/ORXInstallEvent.Log",
                 "open, section, open, open/ORXInstallEvent.Log", "unstarted, section, no start, -",
+                "alone, orphan, no start, C2/alone/ORXInstallEvent.Log",
                 "twice, section, ok, twice/ORXInstallEvent.Log",
                 "twice, orphan, ok, C1/twice/ORXInstallEvent.Log", "lost, section, ended, -",
                 "again, section, ended, again/ORXInstallEvent.Log"}));

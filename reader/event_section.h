@@ -1,0 +1,36 @@
+#pragma once
+
+#include <cstddef>
+#include <string_view>
+
+#include "platform/profile_text.h"
+#include "reader/history.h"
+
+// The values of an event's section as they are in the file.
+struct EventSection {
+  std::string_view Name;
+  std::string_view EventID;
+  std::string_view CommandLine;
+  std::string_view StartTime;
+  std::string_view EndTime;
+  std::string_view Action;
+  std::string_view Type;
+  std::string_view Product;
+  std::string_view Version;
+  std::string_view ServiceLevel;
+  std::string_view Path;
+  std::string_view CopyName;
+  std::string_view CompleteFlag;
+  std::string_view LogFileName;
+  std::string_view TraceFile;
+  std::string_view ResponseFile;
+  std::string_view EventLogFile;
+  std::string_view Result;
+};
+
+// Reads a section of the history file. False if it has no key of an event.
+bool ReadSection(const ProfileText& text, size_t section, EventSection& values);
+
+bool HasEnded(const EventSection& section);
+
+EventState StateOf(const EventSection& section);
