@@ -36,22 +36,26 @@ std::optional<std::string> Source::Read(size_t file) {
   return bytes;
 }
 
-static std::unique_ptr<Source> OpenFileOrFolder(const std::string& path, std::string& error) {
-  const FileKind kind = KindOf(path);
-  if (kind == FileKind::kFolder) {
-    return OpenFolder(path, error);
-  }
+std::optional<ArchiveBytes> OpenArchiveFile(const std::string& path, std::string& error) {
   const auto file = std::make_shared<SharedFile>(path, LinkPolicy::kFollow);
   if (file->IsOpen()) {
-    return OpenArchive(
-        {file->Size(), [file](uint64_t offset, char* buffer,
-                              size_t size) { return file->ReadAt(offset, buffer, size); }},
-        error);
+    return ArchiveBytes{file->Size(), [file](uint64_t offset, char* buffer, size_t size) {
+                          return file->ReadAt(offset, buffer, size);
+                        }};
   }
+  const FileKind kind = KindOf(path);
   error = kind == FileKind::kNone   ? "is not there; name an archive or a folder"
           : kind == FileKind::kFile ? "cannot be opened; look at its permissions"
-                                    : "is neither a file nor a folder; name an archive or a folder";
-  return nullptr;
+                                    : "is no file; name an archive";
+  return std::nullopt;
+}
+
+static std::unique_ptr<Source> OpenFileOrFolder(const std::string& path, std::string& error) {
+  if (KindOf(path) == FileKind::kFolder) {
+    return OpenFolder(path, error);
+  }
+  std::optional<ArchiveBytes> bytes = OpenArchiveFile(path, error);
+  return bytes ? OpenArchive(std::move(*bytes), error) : nullptr;
 }
 
 std::unique_ptr<Source> OpenSource(const std::string& path, std::string& error) {

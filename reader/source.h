@@ -55,6 +55,11 @@ class Source {
 // followed.
 std::unique_ptr<Source> OpenSource(const std::string& path, std::string& error);
 
-// The same for a history folder or a folder above one, and for the bytes of an archive.
+// The bytes of an archive's file. Nothing, and the reason as the end of a sentence that begins with
+// the path, if it is no regular file or cannot be opened.
+std::optional<ArchiveBytes> OpenArchiveFile(const std::string& path, std::string& error);
+
+// As OpenSource for a history folder or a folder above one, and for the bytes of an archive; the
+// error is the end of a sentence.
 std::unique_ptr<Source> OpenFolder(const std::string& path, std::string& error);
 std::unique_ptr<Source> OpenArchive(ArchiveBytes bytes, std::string& error);

@@ -1,0 +1,31 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "reader/finding.h"
+#include "reader/history.h"
+#include "reader/terminal_text.h"
+
+// The texts that the commands print. Nothing from the history reaches a terminal that it could
+// obey.
+
+// A line for each of the events, in columns as wide as their contents, or cut to the terminal's
+// width; then a line that counts them.
+std::string ListText(const std::vector<const Event*>& events, const ViewOptions& options);
+
+// Its facts, messages, files and changes.
+std::string ShowText(const Event& event, const ViewOptions& options);
+
+// What differs between its snapshots, what does not and what cannot be compared; then its messages
+// and files.
+std::string ChangesText(const Event& event, const ViewOptions& options);
+
+// The first part of it: without title, messages and files.
+std::string DifferencesText(const Event& event, const ViewOptions& options);
+
+std::string MessagesText(const Event& event);
+std::string FilesText(const Event& event);
+
+// A line for each finding, and one that counts them.
+std::string FindingsText(const std::vector<Finding>& findings, const ViewOptions& options);
