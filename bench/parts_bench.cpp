@@ -7,7 +7,7 @@
 
 #include "eventlog/logger.h"
 #include "inventory/user_list.h"
-#include "platform/posix/registry_export.h"
+#include "platform/posix/registry/registry_export.h"
 #include "platform/profile_file.h"
 #include "platform/profile_text.h"
 #include "report/zipper.h"

@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "fuzz/require.h"
-#include "platform/posix/registry_export.h"
+#include "platform/posix/registry/registry_export.h"
 
 // Any bytes as the registry export of the machine: every key and value is asked for, the limits of
 // the answers hold, and text reads alike in both encodings.

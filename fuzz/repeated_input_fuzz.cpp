@@ -8,7 +8,7 @@
 #include "fuzz/words.h"
 #include "history/ini_file.h"
 #include "history/locations.h"
-#include "platform/posix/registry_export.h"
+#include "platform/posix/registry/registry_export.h"
 #include "platform/profile_text.h"
 #include "report/zip_names.h"
 #include "tests/support/scratch_history.h"

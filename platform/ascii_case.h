@@ -13,3 +13,13 @@ inline bool EqualsIgnoringCase(std::string_view a, std::string_view b) {
   return std::equal(a.begin(), a.end(), b.begin(), b.end(),
                     [](char x, char y) { return ToLowerAscii(x) == ToLowerAscii(y); });
 }
+
+// Removes the prefix from the text if the text begins with it; else false, and the text is as it
+// was.
+inline bool TakePrefixIgnoringCase(std::string_view& text, std::string_view prefix) {
+  if (!EqualsIgnoringCase(text.substr(0, prefix.size()), prefix)) {
+    return false;
+  }
+  text.remove_prefix(prefix.size());
+  return true;
+}

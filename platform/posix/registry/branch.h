@@ -1,0 +1,48 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "platform/posix/registry/headings.h"
+#include "platform/posix/registry/names.h"
+
+// The keys at and below one key, from one pass over an export: their headings, sorted as in the
+// tree of keys. It takes a fixed number of bytes for each heading, and those of its path. Headings
+// with a path that Windows does not allow are skipped with the lines below them.
+class RegistryBranch {
+ public:
+  // The part of the export from the heading of a key to the next heading.
+  struct Section {
+    uint32_t Begin = 0;
+    uint32_t End = 0;
+  };
+
+  RegistryBranch(std::string top, const ByteReader& read, const ExportFormat& format);
+
+  bool Covers(std::string_view path) const { return IsAtOrBelow(path, Top); }
+
+  // Of a key that the branch covers: its sections, and the names of its direct subkeys, in the
+  // order of the export. A key exists if it or a key below it has a heading.
+  std::vector<Section> SectionsOf(std::string_view path) const;
+  std::vector<std::string> SubKeyNames(std::string_view path) const;
+
+ private:
+  struct Entry {
+    uint32_t PathBegin = 0;  // in Paths
+    uint32_t PathSize = 0;
+    Section Lines;
+    bool IsRemoval = false;
+  };
+
+  bool Take(const RegistryHeading& heading);
+  void ApplyRemovals();
+  std::string_view PathOf(const Entry& entry) const;
+  std::string_view BelowTop(std::string_view path) const;
+  std::vector<Entry>::const_iterator FirstAtOrBelow(std::string_view path) const;
+
+  std::string Top;
+  std::string Paths;  // below Top, one after the other
+  std::vector<Entry> Entries;
+};

@@ -1,0 +1,139 @@
+#include "platform/registry.h"
+
+#include <fcntl.h>
+
+#include <algorithm>
+#include <memory>
+#include <utility>
+
+#include "platform/known_folders.h"
+#include "platform/posix/descriptor.h"
+#include "platform/posix/file_calls.h"
+#include "platform/posix/registry/registry_export.h"
+
+namespace {
+
+ExportFormat ReadFormat(const ByteReader& read) {
+  constexpr std::string_view utf16Mark = "\xFF\xFE";
+  constexpr std::string_view utf8Mark = "\xEF\xBB\xBF";
+  char begin[64];
+  std::string_view bytes(begin, read(/*offset=*/0, begin, sizeof begin));
+  ExportFormat format;
+  format.CharacterWidth = bytes.starts_with(utf16Mark) ? 2 : 1;
+  format.Begin = format.CharacterWidth == 2    ? utf16Mark.size()
+                 : bytes.starts_with(utf8Mark) ? utf8Mark.size()
+                                               : 0;
+  bytes.remove_prefix(format.Begin);
+  std::string buffer;
+  format.IsHexTextWide = !Decoded(bytes, format.CharacterWidth, buffer).starts_with("REGEDIT4");
+  return format;
+}
+
+std::vector<std::string> NamesThatFit(std::vector<std::string> names) {
+  constexpr size_t longest = 255;
+  names.erase(std::find_if(names.begin(), names.end(),
+                           [](const std::string& name) { return name.size() > longest; }),
+              names.end());
+  return names;
+}
+
+std::string_view WithoutLastBackslash(std::string_view path) {
+  return path.substr(0, path.size() - (path.ends_with('\\') ? 1 : 0));
+}
+
+// The keys beside one are likely to be asked for next. The parent of two names is a hive.
+std::string_view BranchTop(std::string_view path) {
+  const std::string_view parent = path.substr(0, std::min(path.rfind('\\'), path.size()));
+  return parent.find('\\') == std::string_view::npos ? path : parent;
+}
+
+// Bytes of a regular file; none of anything else, or of a file that cannot be opened.
+ByteReader ReaderOf(const std::string& path) {
+  // Without O_NONBLOCK a pipe of that name would hold up the run.
+  const auto file = std::make_shared<Descriptor>(RetryOnInterrupt(
+      [&] { return ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
+  struct stat status = {};
+  if (!file->IsOpen() || !StatusOf(*file, status) || !S_ISREG(status.st_mode)) {
+    return [](uint64_t, char*, size_t) { return size_t{0}; };
+  }
+  return [file](uint64_t offset, char* buffer, size_t size) {
+    const uint64_t left = kLongestExport - std::min(offset, kLongestExport);
+    return ReadAt(*file, offset, buffer, static_cast<size_t>(std::min<uint64_t>(size, left)));
+  };
+}
+
+// Kept for the whole run: the interface has free functions, and to read the export takes long.
+// Another folder, as in tests, makes another registry.
+RegistryExport& MachineRegistry() {
+  static std::string currentPath;
+  static std::optional<RegistryExport> current;
+  constexpr int32_t commonAppData = 35;
+  const std::string path = GetFolderPath(commonAppData) + "/ZEK/Registry.reg";
+  if (path != currentPath) {
+    current.emplace(ReaderOf(path));
+    currentPath = path;
+  }
+  return *current;
+}
+
+}  // namespace
+
+RegistryExport::RegistryExport(ByteReader read)
+    : ReadBytes(std::move(read)), Format(ReadFormat(ReadBytes)) {}
+
+const RegistryBranch& RegistryExport::BranchOf(std::string_view path) {
+  for (const RegistryBranch& branch : Branches) {
+    if (branch.Covers(path)) {
+      return branch;
+    }
+  }
+  return Branches.emplace_back(std::string(BranchTop(path)), ReadBytes, Format);
+}
+
+const RegistryValues& RegistryExport::ValuesOf(std::string_view path) {
+  if (CurrentKey == path) {
+    return CurrentValues;
+  }
+  CurrentKey = path;
+  CurrentValues = RegistryValues();
+  for (const auto& [begin, end] : BranchOf(path).SectionsOf(path)) {
+    const auto bytes = std::make_unique_for_overwrite<char[]>(end - begin);
+    const size_t got = ReadBytes(begin, bytes.get(), end - begin);
+    std::string buffer;
+    const std::string_view text = Decoded({bytes.get(), got}, Format.CharacterWidth, buffer);
+    CurrentValues.AddLines(text.substr(std::min(text.find('\n'), text.size())), Format);
+  }
+  return CurrentValues;
+}
+
+RegistryData RegistryExport::Read(const std::string& keyPath, const std::string& valueName,
+                                  size_t limit) {
+  const RegistryData* data = ValuesOf(WithoutLastBackslash(keyPath)).Find(valueName);
+  if (data == nullptr) {
+    return {};
+  }
+  return data->Bytes.size() > limit ? RegistryData{data->Type, ""} : *data;
+}
+
+std::vector<std::string> RegistryExport::ValueNames(const std::string& keyPath) {
+  return NamesThatFit(ValuesOf(WithoutLastBackslash(keyPath)).Names());
+}
+
+std::vector<std::string> RegistryExport::SubKeyNames(const std::string& keyPath) {
+  const std::string_view path = WithoutLastBackslash(keyPath);
+  return NamesThatFit(BranchOf(path).SubKeyNames(path));
+}
+
+// The access is ignored: it is granted to everybody who can read the export.
+RegistryData ReadRegistryData(const std::string& keyPath, const std::string& valueName,
+                              size_t limit, RegistryAccess /*access*/) {
+  return MachineRegistry().Read(keyPath, valueName, limit);
+}
+
+std::vector<std::string> EnumRegistryValueNames(const std::string& keyPath) {
+  return MachineRegistry().ValueNames(keyPath);
+}
+
+std::vector<std::string> EnumRegistrySubKeys(const std::string& keyPath) {
+  return MachineRegistry().SubKeyNames(keyPath);
+}

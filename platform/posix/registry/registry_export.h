@@ -1,0 +1,31 @@
+#pragma once
+
+#include <list>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "platform/posix/registry/branch.h"
+#include "platform/posix/registry/values.h"
+
+// Answers the questions of platform/registry.h from the bytes of a registry export. A question
+// about a key outside the branches read so far reads the export once and keeps one branch: that of
+// the key's parent, but never a whole hive. A question about values reads the lines of that key.
+class RegistryExport {
+ public:
+  explicit RegistryExport(ByteReader read);
+
+  RegistryData Read(const std::string& keyPath, const std::string& valueName, size_t limit);
+  std::vector<std::string> ValueNames(const std::string& keyPath);
+  std::vector<std::string> SubKeyNames(const std::string& keyPath);
+
+ private:
+  const RegistryBranch& BranchOf(std::string_view path);
+  const RegistryValues& ValuesOf(std::string_view path);
+
+  ByteReader ReadBytes;
+  ExportFormat Format;
+  std::list<RegistryBranch> Branches;
+  std::optional<std::string> CurrentKey;  // whose values were asked for last
+  RegistryValues CurrentValues;
+};

@@ -1,0 +1,34 @@
+#pragma once
+
+#include <map>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "platform/posix/registry/export_text.h"
+#include "platform/posix/registry/names.h"
+#include "platform/registry.h"
+
+// The values of one key.
+class RegistryValues {
+ public:
+  // Adds what the lines below one of the key's headings say, in UTF-8. A value that is there
+  // already is replaced or, by "name"=-, removed. A line that cannot be read is skipped. One that
+  // begins with a bracket is a damaged heading, and ends the reading.
+  void AddLines(std::string_view lines, const ExportFormat& format);
+
+  // In the order in which they were first written, and spelled so.
+  std::vector<std::string> Names() const;
+
+  // The data of a value; null if there is none of that name.
+  const RegistryData* Find(std::string_view name) const;
+
+ private:
+  struct Value {
+    size_t Number = 0;
+    RegistryData Data;
+  };
+
+  std::map<std::string, Value, TreeOrder> Values;
+  size_t LastNumber = 0;
+};
