@@ -4,6 +4,7 @@
 
 #include "eventlog/logger.h"
 #include "inventory/filter.h"
+#include "inventory/shown_name.h"
 #include "platform/computer.h"
 #include "platform/processes.h"
 
@@ -67,7 +68,7 @@ int32_t CProcessList::Print() {
   log << rule << std::endl;
   for (const CProcessInfo& process : Processes) {
     if (Matches(process)) {
-      log << std::setw(19) << process.ProcessID << process.Name << std::endl;
+      log << std::setw(19) << process.ProcessID << ShownName(process.Name) << std::endl;
     }
   }
   log << "---------- Process List ( end )-------------------- " << std::endl;

@@ -4,6 +4,7 @@
 
 #include "eventlog/logger.h"
 #include "inventory/computer_info.h"
+#include "inventory/shown_name.h"
 #include "platform/accounts.h"
 #include "platform/computer.h"
 
@@ -67,7 +68,7 @@ static void PrintGroups(const char* title, const std::vector<std::string>& group
   log << "Group Name " << std::endl;
   log << rule << std::endl;
   for (const std::string& group : groups) {
-    log << group << std::endl;
+    log << ShownName(group) << std::endl;
   }
 }
 
@@ -79,7 +80,8 @@ static void PrintMembers(const char* title, const std::vector<CGroupMember>& mem
   log << "Group                                   user   " << std::endl;
   log << rule << std::endl;
   for (const CGroupMember& member : members) {
-    log << std::left << std::setw(30) << member.Group << "          " << member.Member << std::endl;
+    log << std::left << std::setw(30) << ShownName(member.Group) << "          "
+        << ShownName(member.Member) << std::endl;
   }
   log << rule << std::endl;
 }
@@ -88,7 +90,7 @@ int32_t CUsersList::Print() {
   CLogger& log = CLogger::GetInstance();
   const std::string frame(83, '=');
   log << std::endl;
-  log << "Logged on User:" << LoggedOnUser << std::endl;
+  log << "Logged on User:" << ShownName(LoggedOnUser) << std::endl;
   log << frame << std::endl;
   log << std::endl;
   PrintGroups("Local Group List:", LocalGroups);

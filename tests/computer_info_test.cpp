@@ -45,4 +45,13 @@ TEST(ComputerInfo, IsThatOfTheGoldenTable) {
   }
 }
 
+// A text of 80 bytes with its terminator is the longest; the key is opened for queries alone.
+TEST(ComputerInfo, AsksTheRegistryForNoMoreThanItNeeds) {
+  SetMachine("2 4 0 WINNT 0 0 0 0");
+  CComputerInfo().Collect();
+  const std::vector<std::string> asked = {
+      "SYSTEM\\CurrentControlSet\\Control\\ProductOptions|ProductType|80|1"};
+  EXPECT_EQ(Machine().RegistryQuestions, asked);
+}
+
 }  // namespace

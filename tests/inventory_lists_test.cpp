@@ -3,7 +3,9 @@
 #include <gtest/gtest.h>
 
 #include "history/locations.h"
+#include "inventory/process_list.h"
 #include "inventory/service_list.h"
+#include "inventory/user_list.h"
 #include "platform/path.h"
 #include "products/copy_generation.h"
 #include "products/products_list.h"
@@ -31,9 +33,41 @@ TEST(Lists, ReadTextsAndNumbersAndNothingElse) {
       {{2, "%PATH%\0"s}, ""},
       {{3, "\x01\x02\x03\x04"}, ""}};
   for (const auto& [data, text] : cases) {
+    Machine() = FakeMachine();
     Machine().Registry = {{"SOFTWARE\\ZEK", "Value", data}};
     EXPECT_EQ(ReadRegistryValue("SOFTWARE\\ZEK", "Value"), text);
     EXPECT_EQ(ReadRegistryValue("SOFTWARE\\ZEK", "Missing"), "");
+    // 0x2001B: to read, and to set values.
+    EXPECT_EQ(Machine().RegistryQuestions.at(0), "SOFTWARE\\ZEK|Value|100|131099");
+  }
+}
+
+// They can neither add a line nor reach a terminal. A letter of a code page stays.
+TEST(Lists, ShowControlCharactersAsQuestionMarks) {
+  const std::string name = "ORX\n1) \r\t\0\x1B[2J\x7F|\xC2\x85\xC2\x9F|\xC2\xA0\x80\x9F\xC3\x9F~"s;
+  const std::string shown = "ORX?1) ????[2J?|??|\xC2\xA0\x80\x9F\xC3\x9F~";
+  Machine() = FakeMachine();
+  Machine().DomainUser = name;
+  Machine().LocalGroups = {{name, {name}}};
+  Machine().ProcessIDs = {{9}};
+  Machine().Modules = {{9, {name}}};
+  Machine().Services.Entries = {{name, name, 1}};
+  const std::string text = LoggedText([] {
+    CUsersList users;
+    CProcessList processes;
+    CServicesList services;
+    for (Info* list : std::initializer_list<Info*>{&users, &processes, &services}) {
+      list->Collect();
+      list->Print();
+    }
+  });
+  const std::string spaces(60 - shown.size(), ' ');
+  for (const std::string& line :
+       {"\nLogged on User:" + shown + '\n',
+        "\nGroup Name \n" + std::string(35, '-') + '\n' + shown + '\n',
+        '\n' + shown + std::string(40 - shown.size(), ' ') + shown + '\n',
+        "\n9" + std::string(18, ' ') + shown + '\n', '\n' + shown + spaces + "Stopped\n"}) {
+    EXPECT_NE(text.find(line), std::string::npos) << line << text;
   }
 }
 

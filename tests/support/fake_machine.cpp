@@ -63,10 +63,12 @@ std::optional<ProcessModule> FirstModuleOf(uint32_t processID) {
 
 std::optional<std::vector<ProcessEntry>> SnapshotProcesses() { return Machine().ProcessEntries; }
 
-ServiceListing ListServices() { return Machine().Services; }
+ServiceListing ListServices(std::chrono::milliseconds) { return Machine().Services; }
 
 RegistryData ReadRegistryData(const std::string& keyPath, const std::string& valueName,
-                              size_t limit, RegistryAccess) {
+                              size_t limit, RegistryAccess access) {
+  Machine().RegistryQuestions.push_back(keyPath + '|' + valueName + '|' + std::to_string(limit) +
+                                        '|' + std::to_string(static_cast<uint32_t>(access)));
   for (const auto& [path, name, data] : Machine().Registry) {
     if (EqualsIgnoringCase(path, keyPath) && EqualsIgnoringCase(name, valueName)) {
       return data.Bytes.size() <= limit ? data : RegistryData{data.Type, ""};
@@ -76,6 +78,7 @@ RegistryData ReadRegistryData(const std::string& keyPath, const std::string& val
 }
 
 std::vector<std::string> EnumRegistryValueNames(const std::string& keyPath) {
+  Machine().RegistryQuestions.push_back(keyPath + "|values");
   std::vector<std::string> names;
   for (const auto& [path, name, data] : Machine().Registry) {
     if (EqualsIgnoringCase(path, keyPath) && !name.empty()) {
@@ -86,6 +89,7 @@ std::vector<std::string> EnumRegistryValueNames(const std::string& keyPath) {
 }
 
 std::vector<std::string> EnumRegistrySubKeys(const std::string& keyPath) {
+  Machine().RegistryQuestions.push_back(keyPath + "|subkeys");
   std::vector<std::string> names;
   const std::string prefix = keyPath + '\\';
   for (const auto& entry : Machine().Registry) {

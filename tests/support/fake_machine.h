@@ -44,6 +44,10 @@ struct FakeMachine {
     RegistryData Data;
   };
   std::vector<RegistryEntry> Registry;
+
+  // What was asked of it: key, value name, limit and access, or key and "values" or "subkeys".
+  std::vector<std::string> RegistryQuestions;
+
   void SetText(const std::string& keyPath, const std::string& name, const std::string& text);
 
   // Adds what a text says, line by line: [key] and below it name=text or name=dword:fffffffe.
