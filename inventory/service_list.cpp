@@ -4,6 +4,7 @@
 
 #include "eventlog/logger.h"
 #include "inventory/filter.h"
+#include "inventory/shown_name.h"
 #include "platform/services.h"
 
 static const char* StateWord(uint32_t state) {
@@ -29,7 +30,7 @@ static const char* StateWord(uint32_t state) {
 
 int32_t CServicesList::Collect() {
   Services.clear();
-  const ServiceListing listing = ListServices();
+  const ServiceListing listing = ListServices(std::chrono::seconds(2));
   for (const ServiceEntry& entry : listing.Entries) {
     Services.push_back({entry.ServiceName, entry.DisplayName, StateWord(entry.CurrentState)});
   }
@@ -49,7 +50,7 @@ int32_t CServicesList::Print() {
   log << rule << std::endl;
   for (const CServiceInfo& service : Services) {
     if (Matches(service)) {
-      log << std::left << std::setfill(' ') << std::setw(60) << service.DisplayName
+      log << std::left << std::setfill(' ') << std::setw(60) << ShownName(service.DisplayName)
           << service.Status << std::endl;
     }
   }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <chrono>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -9,7 +10,9 @@
 struct ServiceEntry {
   std::string ServiceName;
   std::string DisplayName;
-  uint32_t CurrentState = 0;  // 1 stopped, 2 starting, 3 stopping, 4 running, 5 to 7 pausing
+  // 1 stopped, 2 starting, 3 stopping, 4 running, 5 about to continue, 6 about to pause, 7 paused.
+  // POSIX: 1 inactive or failed, 2 activating, 3 deactivating, 4 active, 5 reloading, 0 any other.
+  uint32_t CurrentState = 0;
 };
 
 struct ServiceListing {
@@ -17,7 +20,12 @@ struct ServiceListing {
   std::vector<ServiceEntry> Entries;
 };
 
-// Every service, running or not, in the system's order. Waits at most two seconds in all.
-// Windows: OpenSCManagerA with access 0xF003F, EnumServicesStatusA. POSIX: the service units of
-// systemd over the system bus, through libsystemd, looked up at run time.
-ServiceListing ListServices();
+// The services in the system's order.
+// Windows: OpenSCManagerA with access 0xF003F and EnumServicesStatusA for all Win32 services,
+// running or not. They answer from the machine itself, and the limit is not used.
+// POSIX: ListUnits of systemd over the system bus, through libsystemd, looked up at run time. These
+// are the service units that systemd has in memory: all that run or have failed, and those stopped
+// ones that another unit refers to; a stopped unit that nothing refers to is missing. Units with
+// the load state "not-found" are left out. The whole takes at most the limit; after that, the error
+// is ETIMEDOUT.
+ServiceListing ListServices(std::chrono::milliseconds limit);

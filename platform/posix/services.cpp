@@ -11,7 +11,7 @@
 namespace {
 
 // The calls of libsystemd in use. They are looked up so that a run that lists no services does not
-// load the library, and a machine without it merely has no services.
+// load the library, and a machine without it has no services.
 struct BusLibrary {
   decltype(&::sd_bus_open_system) OpenSystem = nullptr;
   decltype(&::sd_bus_call_method_async) CallMethodAsync = nullptr;
@@ -57,11 +57,12 @@ uint32_t StateNumber(std::string_view activeState) {
 
 using Clock = std::chrono::steady_clock;
 
-// One question to systemd: which units there are. Each step gives 0 or more, or a negative error
+// One question to systemd: which units there are. Each step returns 0 or more, or a negative error
 // number.
 class UnitQuery {
  public:
-  explicit UnitQuery(const BusLibrary& library) : Library(library) {}
+  UnitQuery(const BusLibrary& library, std::chrono::milliseconds limit)
+      : Library(library), Deadline(Clock::now() + limit) {}
   ~UnitQuery() { Library.CloseUnref(Bus); }
   UnitQuery(const UnitQuery&) = delete;
   UnitQuery& operator=(const UnitQuery&) = delete;
@@ -76,7 +77,7 @@ class UnitQuery {
   int ReadUnits(sd_bus_message* reply);
 
   const BusLibrary& Library;
-  const Clock::time_point Deadline = Clock::now() + std::chrono::seconds(2);
+  const Clock::time_point Deadline;
   sd_bus* Bus = nullptr;
   bool IsAnswered = false;
   int Outcome = 0;
@@ -87,9 +88,8 @@ int UnitQuery::Ask() {
   if (opened < 0) {
     return opened;
   }
-  // The call stands in line behind the authentication, which goes on while the reply is awaited:
-  // so one deadline serves for all of it. The library's own blocking call would wait for the
-  // authentication without one.
+  // The call is queued after the authentication, which goes on while the reply is awaited: so one
+  // deadline is enough. The library's own blocking call waits for the authentication without one.
   return Library.CallMethodAsync(Bus, /*slot=*/nullptr, "org.freedesktop.systemd1",
                                  "/org/freedesktop/systemd1", "org.freedesktop.systemd1.Manager",
                                  "ListUnits", &UnitQuery::TakeReply, this, /*types=*/"");
@@ -103,7 +103,7 @@ int UnitQuery::AwaitReply() {
       return -ETIMEDOUT;
     }
     int step = Library.Process(Bus, /*message=*/nullptr);
-    if (step == 0) {  // nothing is there to be processed
+    if (step == 0) {  // nothing to process yet
       step = Library.Wait(Bus, static_cast<uint64_t>(left));
     }
     if (step < 0 && step != -EINTR) {
@@ -130,13 +130,16 @@ int UnitQuery::ReadUnits(sd_bus_message* reply) {
   }
   const char* name = nullptr;
   const char* description = nullptr;
+  const char* loadState = nullptr;
   const char* activeState = nullptr;
   int isRead = 0;
-  while ((isRead = Library.Read(reply, "(ssssssouso)", &name, &description, /*load*/ nullptr,
+  while ((isRead = Library.Read(reply, "(ssssssouso)", &name, &description, &loadState,
                                 &activeState, /*sub*/ nullptr, /*following*/ nullptr,
                                 /*path*/ nullptr, /*job id*/ nullptr, /*job type*/ nullptr,
                                 /*job path*/ nullptr)) > 0) {
-    if (std::string_view(name).ends_with(".service")) {
+    // Other units may name a service that is not installed.
+    const bool isInstalled = std::string_view(loadState) != "not-found";
+    if (isInstalled && std::string_view(name).ends_with(".service")) {
       Entries.push_back({name, description, StateNumber(activeState)});
     }
   }
@@ -145,12 +148,12 @@ int UnitQuery::ReadUnits(sd_bus_message* reply) {
 
 }  // namespace
 
-ServiceListing ListServices() {
+ServiceListing ListServices(std::chrono::milliseconds limit) {
   BusLibrary library;
   if (!library.Load()) {
     return {ELIBACC, {}};
   }
-  UnitQuery query(library);
+  UnitQuery query(library, limit);
   int outcome = query.Ask();
   if (outcome >= 0) {
     outcome = query.AwaitReply();

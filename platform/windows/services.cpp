@@ -12,7 +12,7 @@ using UniqueService = std::unique_ptr<SC_HANDLE, ServiceCloser>;
 
 }  // namespace
 
-ServiceListing ListServices() {
+ServiceListing ListServices(std::chrono::milliseconds /*limit*/) {
   constexpr DWORD fullAccess = 0xF003F;
   const UniqueService manager(
       ::OpenSCManagerA(/*lpMachineName=*/nullptr, /*lpDatabaseName=*/nullptr, fullAccess));
