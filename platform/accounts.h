@@ -6,27 +6,32 @@
 
 // Users and groups. A server is named with two leading backslashes; an empty name is the machine
 // itself. The name of a group, of a member or of a user without a domain that needs more than 128
-// bytes with its terminator comes as an empty text.
+// bytes with its terminator is returned as an empty text.
+//
+// POSIX: the name service is asked once in a run, in a child process, and everything below answers
+// from that. It has ten seconds for all of it. When they have passed, there are no groups, and no
+// user if that was not known by then. The server is ignored.
 
-// The user that runs the tool, as domain, backslash, name; nothing if the system cannot tell.
-// Windows: GetUserNameExA. POSIX: getpwuid of the effective user, the host name as the domain.
+// The user that runs the tool, as domain, backslash, name; nothing if the system does not know.
+// Windows: GetUserNameExA, at most 1024 bytes. POSIX: getpwuid of the effective user, with the host
+// name as the domain.
 std::optional<std::string> DomainUserName();
 
-// The same user without a domain. Windows: NetWkstaUserGetInfo. POSIX: the number of the user, for
-// one without a name.
+// The same user without a domain; nothing if the system does not know.
+// Windows: NetWkstaUserGetInfo. POSIX: the same as above; the number of a user without a name.
 std::optional<std::string> WorkstationUserName();
 
-// The local groups in the system's order; empty if they cannot be listed.
-// Windows: NetLocalGroupEnum, level 1. POSIX: getgrent.
+// The names of the local groups in the system's order; empty if they cannot be listed.
+// Windows: NetLocalGroupEnum, level 1. POSIX: getgrent; each name once.
 std::vector<std::string> ListLocalGroups(const std::string& server);
 
 // The members of a local group, each with its domain; empty if they cannot be listed.
-// Windows: NetLocalGroupGetMembers, level 2. POSIX: getgrent, and the users whose primary group it
-// is; each once; both read once in a run.
+// Windows: NetLocalGroupGetMembers, level 2. POSIX: the members that getgrent lists, then the users
+// whose primary group it is (getpwent), each once; of all groups with that name.
 std::vector<std::string> ListLocalGroupMembers(const std::string& server, const std::string& group);
 
-// The global groups and the users of each, as the same calls for local ones. POSIX: none.
-// Windows: NetGroupEnum, level 2; NetGroupGetUsers, level 0.
+// The global groups and the users of each, like the two calls above.
+// Windows: NetGroupEnum, level 2; NetGroupGetUsers, level 0. POSIX: none.
 std::vector<std::string> ListGlobalGroups(const std::string& server);
 std::vector<std::string> ListGlobalGroupMembers(const std::string& server,
                                                 const std::string& group);

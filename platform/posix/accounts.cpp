@@ -8,19 +8,32 @@
 #include <unordered_map>
 #include <unordered_set>
 
+#include "platform/posix/child_output.h"
 #include "platform/posix/host_name.h"
+#include "platform/posix/text_file.h"
 
 namespace {
 
-std::string FittingName(const std::string& name) {
-  constexpr size_t longest = 127;
-  return name.size() <= longest ? name : "";
+using NamesByGroup = std::unordered_map<std::string, std::vector<std::string>>;
+
+struct NameServiceAnswers {
+  std::optional<std::string> OwnUser;
+  std::vector<std::string> Groups;  // each name once
+  NamesByGroup Members;
+};
+
+// The child asks the name service and writes records, each a letter and a text, ended by a zero
+// byte: u the user that runs the tool; g a group and then each m a member of it; e the end.
+void AppendRecord(std::string& records, char kind, std::string_view text) {
+  records += kind;
+  records += text;
+  records += '\0';
 }
 
-using UsersByGroup = std::unordered_map<gid_t, std::vector<std::string>>;
+using UsersByNumber = std::unordered_map<gid_t, std::vector<std::string>>;
 
-UsersByGroup ReadUsersByPrimaryGroup() {
-  UsersByGroup users;
+UsersByNumber ReadUsersByPrimaryGroup() {
+  UsersByNumber users;
   ::setpwent();
   while (const passwd* user = ::getpwent()) {
     users[user->pw_gid].emplace_back(user->pw_name);
@@ -29,73 +42,107 @@ UsersByGroup ReadUsersByPrimaryGroup() {
   return users;
 }
 
-struct Group {
-  gid_t Number = 0;
-  std::vector<std::string> Members;
-};
-
-using GroupsByName = std::unordered_map<std::string, Group>;
-
-// Of two groups with one name the first, as getgrnam has it.
-GroupsByName ReadGroups() {
-  GroupsByName groups;
+// One walk through each database serves all groups: a walk for each would cost groups times groups,
+// and users times groups.
+void AskNameService(const Descriptor& output) {
+  std::string records;
+  if (const passwd* user = ::getpwuid(::geteuid())) {
+    AppendRecord(records, 'u', user->pw_name);
+  }
+  WriteAll(output, records);
+  records.clear();
+  const UsersByNumber users = ReadUsersByPrimaryGroup();
   ::setgrent();
-  while (const ::group* entry = ::getgrent()) {
-    const auto [place, isNew] = groups.try_emplace(entry->gr_name, Group{entry->gr_gid, {}});
-    for (char** member = entry->gr_mem; isNew && *member != nullptr; ++member) {
-      place->second.Members.emplace_back(*member);
+  while (const group* entry = ::getgrent()) {
+    AppendRecord(records, 'g', entry->gr_name);
+    for (char** member = entry->gr_mem; *member != nullptr; ++member) {
+      AppendRecord(records, 'm', *member);
+    }
+    if (const auto found = users.find(entry->gr_gid); found != users.end()) {
+      for (const std::string& user : found->second) {
+        AppendRecord(records, 'm', user);
+      }
     }
   }
   ::endgrent();
-  return groups;
+  AppendRecord(records, 'e', "");
+  WriteAll(output, records);
 }
 
-// The named members of a group, and behind them the users whose primary group it is. One walk
-// through each database serves all groups of a run: a walk for each would cost groups times groups,
-// and users times groups.
-std::vector<std::string> UsersOf(const std::string& group) {
-  static const GroupsByName groups = ReadGroups();
-  static const UsersByGroup primaryUsers = ReadUsersByPrimaryGroup();
-  const auto place = groups.find(group);
-  if (place == groups.end()) {
-    return {};
+// Groups without an end are not all groups, or not all of their members: then there are none.
+NameServiceAnswers ParseRecords(std::string_view records) {
+  NameServiceAnswers answers;
+  bool isComplete = false;
+  std::vector<std::string>* members = nullptr;
+  while (!records.empty()) {
+    const std::string_view record = records.substr(0, records.find('\0'));
+    records.remove_prefix(std::min(record.size() + 1, records.size()));
+    const std::string text(record.substr(1));
+    switch (record.front()) {
+      case 'u':
+        answers.OwnUser = text;
+        break;
+      case 'g': {
+        const auto [place, isNew] = answers.Members.try_emplace(text);
+        if (isNew) {
+          answers.Groups.push_back(text);
+        }
+        members = &place->second;
+        break;
+      }
+      case 'm':
+        members->push_back(text);
+        break;
+      default:
+        isComplete = true;
+        break;
+    }
   }
-  std::vector<std::string> users = place->second.Members;
-  if (const auto more = primaryUsers.find(place->second.Number); more != primaryUsers.end()) {
-    users.insert(users.end(), more->second.begin(), more->second.end());
-  }
-  return users;
+  return isComplete ? answers : NameServiceAnswers{answers.OwnUser, {}, {}};
+}
+
+// Kept for the whole run, which asks the name service once and so waits for it once.
+const NameServiceAnswers& NameService() {
+  static const NameServiceAnswers answers =
+      ParseRecords(ChildOutput(&AskNameService, std::chrono::seconds(10)));
+  return answers;
+}
+
+std::string FittingName(const std::string& name) {
+  constexpr size_t longest = 127;
+  return name.size() <= longest ? name : "";
 }
 
 }  // namespace
 
 std::optional<std::string> DomainUserName() {
-  const passwd* user = ::getpwuid(::geteuid());
-  return user == nullptr ? std::nullopt : std::optional(HostName() + '\\' + user->pw_name);
+  const std::optional<std::string>& user = NameService().OwnUser;
+  return user ? std::optional(HostName() + '\\' + *user) : std::nullopt;
 }
 
 std::optional<std::string> WorkstationUserName() {
-  const passwd* user = ::getpwuid(::geteuid());
-  return user == nullptr ? std::to_string(::geteuid()) : FittingName(user->pw_name);
+  return FittingName(NameService().OwnUser.value_or(std::to_string(::geteuid())));
 }
 
 std::vector<std::string> ListLocalGroups(const std::string& /*server*/) {
   std::vector<std::string> names;
-  ::setgrent();
-  while (const group* entry = ::getgrent()) {
-    names.push_back(FittingName(entry->gr_name));
+  for (const std::string& name : NameService().Groups) {
+    names.push_back(FittingName(name));
   }
-  ::endgrent();
   return names;
 }
 
 std::vector<std::string> ListLocalGroupMembers(const std::string& /*server*/,
                                                const std::string& group) {
-  const std::vector<std::string> users = UsersOf(group);
+  const NamesByGroup& groups = NameService().Members;
+  const auto found = groups.find(group);
+  if (found == groups.end()) {
+    return {};
+  }
   const std::string domain = HostName() + '\\';
   std::unordered_set<std::string_view> seen;
   std::vector<std::string> members;
-  for (const std::string& user : users) {
+  for (const std::string& user : found->second) {
     if (seen.insert(user).second) {
       members.push_back(FittingName(domain + user));
     }

@@ -7,6 +7,9 @@
 #include <climits>
 #include <cstring>
 #include <memory>
+#include <string_view>
+
+#include "platform/posix/process_folder.h"
 
 namespace {
 
@@ -18,23 +21,34 @@ struct FolderCloser {
 
 uint32_t OwnProcessID() { return static_cast<uint32_t>(::getpid()); }
 
-std::optional<std::vector<uint32_t>> ListProcessIDs() {
+std::optional<std::vector<uint32_t>> ListNumbers(const std::string& folder) {
   constexpr size_t most = 8192;
-  const std::unique_ptr<DIR, FolderCloser> folder(::opendir("/proc"));
-  if (!folder) {
+  const std::unique_ptr<DIR, FolderCloser> entries(::opendir(folder.c_str()));
+  if (!entries) {
     return std::nullopt;
   }
-  std::vector<uint32_t> ids;
-  while (const dirent* entry = ::readdir(folder.get())) {
+  std::vector<uint32_t> numbers;
+  while (const dirent* entry = ::readdir(entries.get())) {
     const char* end = entry->d_name + std::strlen(entry->d_name);
-    uint32_t id = 0;
-    const auto [stop, error] = std::from_chars(entry->d_name, end, id);
-    if (error == std::errc() && stop == end && ids.size() < most) {
-      ids.push_back(id);
+    uint32_t number = 0;
+    const auto [stop, error] = std::from_chars(entry->d_name, end, number);
+    if (error == std::errc() && stop == end && numbers.size() < most) {
+      numbers.push_back(number);
     }
   }
-  return ids;
+  return numbers;
 }
+
+std::string ExecutableName(std::string link) {
+  constexpr std::string_view deletedMark = " (deleted)";
+  if (link.ends_with(deletedMark)) {
+    link.resize(link.size() - deletedMark.size());
+  }
+  constexpr size_t longest = 259;
+  return link.substr(link.rfind('/') + 1, longest);
+}
+
+std::optional<std::vector<uint32_t>> ListProcessIDs() { return ListNumbers("/proc"); }
 
 std::optional<ProcessModule> FirstModuleOf(uint32_t processID) {
   const std::string link = "/proc/" + std::to_string(processID) + "/exe";
@@ -43,13 +57,7 @@ std::optional<ProcessModule> FirstModuleOf(uint32_t processID) {
   if (length < 0) {
     return std::nullopt;
   }
-  std::string file(target, static_cast<size_t>(length));
-  constexpr std::string_view deletedMark = " (deleted)";  // the kernel's, on a replaced executable
-  if (file.ends_with(deletedMark)) {
-    file.resize(file.size() - deletedMark.size());
-  }
-  constexpr size_t longest = 259;
-  return ProcessModule{file.substr(file.rfind('/') + 1, longest)};
+  return ProcessModule{ExecutableName(std::string(target, static_cast<size_t>(length)))};
 }
 
 std::optional<std::vector<ProcessEntry>> SnapshotProcesses() { return std::nullopt; }

@@ -57,13 +57,13 @@ TEST(Accounts, CountOnceAndFitTheirBuffer) {
                      "carl:x:70006:100" + shell + fits + ":x:70007:300" + shell + fits +
                      "f:x:70008:300" + shell,
                  "staff:x:100:bo,ana,bo\nempty:x:50:\nsame:x:100:\nmany:x:200:" + manyMembers +
-                     '\n' + group127 + ":x:300:\n" + group127 + "g:x:301:bo\n");
+                     '\n' + group127 + ":x:300:\n" + group127 + "g:x:301:bo\nstaff:x:302:zoe,bo\n");
   EXPECT_EQ(report, "Logged on User:" + host + "me\n\nLocal Group List:\nGroup Name \nstaff\n" +
                         "empty\nsame\nmany\n" + group127 + "\n\n\nLocal User List:\n" +
                         "Group                                   user   \n" + row("staff", "bo") +
-                        row("staff", "ana") + row("staff", "carl") + row("same", "ana") +
-                        row("same", "carl") + manyRows + row(group127, fits) + group127 +
-                        std::string(10, ' ') + "\n\n\n");
+                        row("staff", "ana") + row("staff", "carl") + row("staff", "zoe") +
+                        row("same", "ana") + row("same", "carl") + manyRows + row(group127, fits) +
+                        group127 + std::string(10, ' ') + "\n\n\n");
 }
 
 }  // namespace

@@ -1,0 +1,72 @@
+// The limits of what a machine answers, on machines other than this one.
+
+#include <gtest/gtest.h>
+#include <sched.h>
+#include <unistd.h>
+
+#include <algorithm>
+
+#include "platform/computer.h"
+#include "platform/posix/child_output.h"
+#include "platform/posix/process_folder.h"
+#include "platform/posix/text_file.h"
+#include "tests/support/scratch_folder.h"
+
+namespace {
+
+// The short name of a machine with that host name, or "none".
+std::string ShortNameOf(const std::string& hostName) {
+  return ChildOutput(
+      [&](const Descriptor& output) {
+        const bool isAllowed =
+            ::unshare(CLONE_NEWUTS) == 0 || ::unshare(CLONE_NEWUSER | CLONE_NEWUTS) == 0;
+        if (isAllowed && ::sethostname(hostName.c_str(), hostName.size()) == 0) {
+          WriteAll(output, ShortComputerName().value_or("none"));
+        }
+      },
+      std::chrono::seconds(20));
+}
+
+TEST(Machine, HasAShortNameOfAtMost14Characters) {
+  if (ShortNameOf("a").empty()) {
+    GTEST_SKIP() << "needs the right to make a namespace";
+  }
+  for (const auto& [hostName, name] :
+       {std::pair("fourteen-bytes", "fourteen-bytes"), std::pair("fifteen-bytes--", "none"),
+        std::pair("fourteen-bytes.domain", "fourteen-bytes"), std::pair(".domain", "none")}) {
+    EXPECT_EQ(ShortNameOf(hostName), name);
+  }
+}
+
+TEST(Machine, HasAtMost8192Processes) {
+  const ScratchFolder scratch;
+  scratch.Make("x/1x/");
+  scratch.Make("x/self/");
+  scratch.Make("x/4294967296/");
+  scratch.Make("x/4294967295/");
+  EXPECT_EQ(ListNumbers(scratch.In("x")).value(), std::vector<uint32_t>{4294967295U});
+  for (int i = 1; i <= 8192; ++i) {
+    scratch.Make("x/" + std::to_string(i) + "/");
+  }
+  std::vector<uint32_t> numbers = ListNumbers(scratch.In("x")).value();
+  EXPECT_EQ(numbers.size(), 8192U);
+  std::sort(numbers.begin(), numbers.end());
+  EXPECT_EQ(std::unique(numbers.begin(), numbers.end()), numbers.end());
+  EXPECT_FALSE(ListNumbers(scratch.In("none")));
+}
+
+TEST(Machine, NamesAnExecutableByItsFile) {
+  const std::string longest(259, 'n');
+  const std::pair<std::string, std::string> cases[] = {{"/usr/bin/tool", "tool"},
+                                                       {"/usr/bin/tool (deleted)", "tool"},
+                                                       {"/a (deleted)/tool", "tool"},
+                                                       {"/x (deleted) (deleted)", "x (deleted)"},
+                                                       {"tool", "tool"},
+                                                       {"/a/" + longest, longest},
+                                                       {"/a/" + longest + "n", longest}};
+  for (const auto& [link, name] : cases) {
+    EXPECT_EQ(ExecutableName(link), name);
+  }
+}
+
+}  // namespace
