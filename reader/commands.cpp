@@ -1,13 +1,17 @@
 #include "reader/commands.h"
 
+#include <fstream>
 #include <functional>
 #include <iostream>
 
 #include "history/locations.h"
+#include "platform/files.h"
+#include "platform/temporary_file.h"
 #include "reader/check.h"
 #include "reader/event_text.h"
 #include "reader/hits.h"
 #include "reader/json.h"
+#include "reader/page.h"
 #include "reader/progress.h"
 #include "reader/source.h"
 #include "reader/text_encoding.h"
@@ -25,6 +29,13 @@ int Fail(const std::string& text) {
   return kFailed;
 }
 
+// What the source found when it was read comes first.
+std::vector<Finding> FindingsOf(const History& history, const Source& source) {
+  std::vector<Finding> findings = CheckHistory(history);
+  findings.insert(findings.begin(), source.Findings.begin(), source.Findings.end());
+  return findings;
+}
+
 class Session {
  public:
   Session(const CommandLine& line, const TextDecoder& decoder, const ViewOptions& options)
@@ -34,6 +45,7 @@ class Session {
   int ShowEvent();
   int Find();
   int Check();
+  int Page();
 
  private:
   std::string ToUtf8(const std::string& text) const {
@@ -165,8 +177,7 @@ int Session::Check() {
   bool isClean = true;
   const int result = ForEachHistory(
       Detail::kCounts, std::nullopt, [&](const History& history, const Source& source) {
-        std::vector<Finding> findings = CheckHistory(history);
-        findings.insert(findings.begin(), source.Findings.begin(), source.Findings.end());
+        const std::vector<Finding> findings = FindingsOf(history, source);
         for (const Finding& finding : findings) {
           isClean = isClean && finding.Level == FindingLevel::kNote;
           if (Line.IsJson) {
@@ -179,6 +190,29 @@ int Session::Check() {
         }
       });
   return result != kDone ? result : isClean ? kDone : kFound;
+}
+
+// An older page of that name is replaced, but nothing that a history is read from.
+int Session::Page() {
+  std::string page;
+  const int result =
+      ForEachHistory(Detail::kAll, std::nullopt, [&](const History& history, const Source& source) {
+        page = RenderPage(history, FindingsOf(history, source));
+      });
+  if (result != kDone) {
+    return result;
+  }
+  if (!Line.From.empty() && IsSameFile(Line.Argument, Line.From.front())) {
+    return Fail("The page would replace the history; name another file.");
+  }
+  TemporaryFile file(Line.Argument);
+  std::ofstream stream(file.Path(), std::ios::binary);
+  stream << page;
+  stream.close();
+  if (!file.Exists() || !stream || !file.Replace()) {
+    return Fail(Argument + " cannot be written; name a file in a folder that you may write to.");
+  }
+  return kDone;
 }
 
 int Unpack(const CommandLine& line) {
@@ -219,7 +253,7 @@ int RunCommand(const CommandLine& line, const ViewOptions& options) {
     case Command::kCheck:
       return session.Check();
     case Command::kPage:
-      return Fail("not there yet");
+      return session.Page();
     case Command::kUnpack:
       return Unpack(line);
   }

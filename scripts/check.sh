@@ -38,6 +38,12 @@ reliability() {
   step reliability python3 scripts/reliability/run.py "$@"
 }
 
+page() {
+  step build scripts/build.sh release
+  scripts/install-packages.sh page >/dev/null
+  step page python3 scripts/check_page.py build/release/ORXInstallEventLog build/release/orxhistory
+}
+
 packages() {
   if [ -e scripts/package.sh ]; then
     step packages scripts/package.sh
@@ -48,6 +54,7 @@ all() {
   quick
   step demo scripts/demo.sh
   step analysis scripts/check-style.sh analysis
+  page
   reliability --seconds 60
   step fuzz scripts/fuzz.sh 8
   step windows scripts/test-windows.sh

@@ -11,6 +11,7 @@ packages_of() {
     tests) echo "libnss-wrapper" ;;
     style) echo "git clang-format clang-tidy python3 pycodestyle pyflakes3 shellcheck" ;;
     reliability) echo "acl attr binutils python3 strace unzip" ;;
+    page) echo "chromium python3" ;;
     fuzz) echo "clang libclang-rt-dev cmake ninja-build zlib1g-dev libminizip-dev libsystemd-dev \
       libcli11-dev nlohmann-json3-dev" ;;
     windows) echo "cmake dpkg-dev googletest g++-mingw-w64-x86-64-posix libcli11-dev \

@@ -1,0 +1,15 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "reader/event_time.h"
+
+struct TimeTick {
+  LocalTime Time = 0;
+  std::string Label;  // a date, or a time of day within a short range
+};
+
+// The round times within a range, at most nine: minutes, hours, days, months or years, whatever
+// suits its length; the beginning alone, if there is none. Labels of one axis have the same form.
+std::vector<TimeTick> TicksBetween(LocalTime begin, LocalTime end);

@@ -1,0 +1,181 @@
+#include "reader/time_line.h"
+
+#include <algorithm>
+
+#include "reader/html.h"
+#include "reader/time_axis.h"
+
+namespace {
+
+// In SVG units; the picture is as wide as a page on a desk and scrolls on a phone.
+constexpr int width = 960;
+constexpr int plotLeft = 150;
+constexpr int plotRight = width - 110;  // leaves room for the last label
+constexpr int axisHeight = 26;
+constexpr int rowHeight = 22;
+constexpr int lanePadding = 6;
+constexpr int barHeight = 18;
+constexpr int leastBar = 18;  // wide enough for its mark
+constexpr int letter = 7;     // width of a label's character, about
+
+constexpr size_t mostLabels = 80;  // beyond that, labels would push the bars apart
+constexpr size_t longestLabel = 14;
+constexpr size_t longestLane = 18;
+
+struct PlacedBar {
+  const TimeLineBar* Bar;
+  int Left;
+  int Width;
+  int Row;
+};
+
+struct Lane {
+  std::string Name;
+  std::vector<PlacedBar> Bars;
+  std::vector<int> RowEnds;  // where each row is free again
+
+  int Height() const { return static_cast<int>(RowEnds.size()) * rowHeight + 2 * lanePadding; }
+};
+
+struct TimeScale {
+  LocalTime Begin;
+  LocalTime End;
+
+  int At(LocalTime time) const {
+    const auto range = static_cast<double>(std::max<LocalTime>(End - Begin, 1));
+    const double part = static_cast<double>(time - Begin) / range;
+    return plotLeft + static_cast<int>(part * (plotRight - leastBar - plotLeft));
+  }
+};
+
+// The first characters of UTF-8 text, with a sign that some are missing.
+std::string Shortened(const std::string& text, size_t most) {
+  size_t characters = 0;
+  for (size_t i = 0; i < text.size(); ++i) {
+    const bool isFirstByte = (static_cast<unsigned char>(text[i]) & 0xC0U) != 0x80;
+    if (isFirstByte && ++characters > most) {
+      return text.substr(0, i) + "\xE2\x80\xA6";
+    }
+  }
+  return text;
+}
+
+int LabelWidth(const TimeLineBar& bar) {
+  return static_cast<int>(std::min(bar.Label.size(), longestLabel + 1)) * letter + 8;
+}
+
+TimeScale ScaleOf(const std::vector<TimeLineBar>& bars) {
+  TimeScale scale{bars.front().Begin, bars.front().End};
+  for (const TimeLineBar& bar : bars) {
+    scale.Begin = std::min(scale.Begin, bar.Begin);
+    scale.End = std::max(scale.End, bar.End);
+  }
+  return scale;
+}
+
+// Puts the bar into the first row of the lane that is free there.
+void Place(Lane& lane, const TimeLineBar& bar, const TimeScale& scale, bool hasLabels) {
+  const int left = scale.At(bar.Begin);
+  const int barWidth = std::max(scale.At(bar.End) - left, leastBar);
+  const auto isFree = [left](int rowEnd) { return rowEnd <= left; };
+  auto row = std::find_if(lane.RowEnds.begin(), lane.RowEnds.end(), isFree);
+  if (row == lane.RowEnds.end()) {
+    row = lane.RowEnds.insert(lane.RowEnds.end(), 0);
+  }
+  *row = left + barWidth + (hasLabels ? LabelWidth(bar) : 2);
+  lane.Bars.push_back({&bar, left, barWidth, static_cast<int>(row - lane.RowEnds.begin())});
+}
+
+std::vector<Lane> PlaceInLanes(const std::vector<TimeLineBar>& bars, const TimeScale& scale) {
+  std::vector<const TimeLineBar*> order;
+  std::vector<Lane> lanes;
+  for (const TimeLineBar& bar : bars) {
+    order.push_back(&bar);
+    const auto hasName = [&bar](const Lane& lane) { return lane.Name == bar.Lane; };
+    if (std::none_of(lanes.begin(), lanes.end(), hasName)) {
+      lanes.push_back({bar.Lane, {}, {}});
+    }
+  }
+  std::stable_sort(order.begin(), order.end(),
+                   [](const TimeLineBar* a, const TimeLineBar* b) { return a->Begin < b->Begin; });
+  for (const TimeLineBar* bar : order) {
+    const auto hasName = [bar](const Lane& lane) { return lane.Name == bar->Lane; };
+    Place(*std::find_if(lanes.begin(), lanes.end(), hasName), *bar, scale,
+          bars.size() <= mostLabels);
+  }
+  return lanes;
+}
+
+std::string Attribute(const char* name, int value) {
+  return std::string(" ") + name + "=\"" + std::to_string(value) + '"';
+}
+
+std::string Text(int x, int y, const char* textClass, const std::string& text) {
+  return "<text class=\"" + std::string(textClass) + '"' + Attribute("x", x) + Attribute("y", y) +
+         '>' + EscapeHtml(text) + "</text>";
+}
+
+std::string DrawAxis(const TimeScale& scale, int height) {
+  std::string svg;
+  int free = 0;  // a label that would run into the one before it is left out
+  for (const TimeTick& tick : TicksBetween(scale.Begin, scale.End)) {
+    const int x = scale.At(tick.Time);
+    svg += "<line class=\"tick\"" + Attribute("x1", x) + Attribute("x2", x) +
+           Attribute("y1", axisHeight - 6) + Attribute("y2", height) + "/>\n";
+    const int labelWidth = static_cast<int>(tick.Label.size()) * letter;
+    const int left = std::min(x - labelWidth / 2, width - labelWidth);
+    if (left >= free) {
+      svg += Text(left, axisHeight - 10, "tick-label", tick.Label) + '\n';
+      free = left + labelWidth + letter;
+    }
+  }
+  return svg;
+}
+
+std::string DrawBar(const PlacedBar& placed, int laneTop, bool hasLabels) {
+  const TimeLineBar& bar = *placed.Bar;
+  const int top = laneTop + lanePadding + placed.Row * rowHeight;
+  const std::string title = EscapeHtml(bar.Title);
+  std::string svg = "<a class=\"bar " + bar.StateClass + "\" href=\"" + bar.Link +
+                    "\" aria-label=\"" + title + "\"><title>" + title + "</title><rect rx=\"3\"" +
+                    Attribute("x", placed.Left) + Attribute("y", top) +
+                    Attribute("width", placed.Width) + Attribute("height", barHeight) + "/>";
+  svg += Text(placed.Left + 5, top + barHeight - 5, "mark", bar.Mark);
+  if (hasLabels) {
+    svg += Text(placed.Left + placed.Width + 4, top + barHeight - 5, "bar-label",
+                Shortened(bar.Label, longestLabel));
+  }
+  return svg + "</a>\n";
+}
+
+std::string DrawLane(const Lane& lane, int top, bool hasLabels) {
+  std::string svg =
+      "<rect class=\"lane\" x=\"0\"" + Attribute("y", top) + Attribute("width", width) +
+      Attribute("height", lane.Height() - 2) + "/>\n" +
+      Text(8, top + lanePadding + barHeight - 5, "lane-name", Shortened(lane.Name, longestLane)) +
+      '\n';
+  for (const PlacedBar& bar : lane.Bars) {
+    svg += DrawBar(bar, top, hasLabels);
+  }
+  return svg;
+}
+
+}  // namespace
+
+std::string DrawTimeLine(const std::vector<TimeLineBar>& bars) {
+  if (bars.empty()) {
+    return "";
+  }
+  const TimeScale scale = ScaleOf(bars);
+  const std::vector<Lane> lanes = PlaceInLanes(bars, scale);
+  std::string content;
+  int top = axisHeight;
+  for (const Lane& lane : lanes) {
+    content += DrawLane(lane, top, bars.size() <= mostLabels);
+    top += lane.Height();
+  }
+  const std::string size = std::to_string(width) + ' ' + std::to_string(top);
+  return "<svg viewBox=\"0 0 " + size + "\"" + Attribute("width", width) +
+         Attribute("height", top) + " role=\"group\" aria-label=\"Time line of the events\">\n" +
+         content + DrawAxis(scale, top) + "</svg>\n";
+}

@@ -1,0 +1,81 @@
+#include "reader/page.h"
+
+#include <gtest/gtest.h>
+
+#include "reader/html.h"
+#include "reader/time_axis.h"
+#include "reader/time_line.h"
+
+TEST(Page, ShowsMarkupAndHiddenCharactersAsText) {
+  const std::pair<const char*, const char*> cases[] = {
+      {"a&<>\"'b", "a&amp;&lt;&gt;&quot;&#39;b"},
+      {"tab\tbell\x07", "tab[U+0009]bell[U+0007]"},
+      {"\x7F\xC2\x9F\xC2\xA0", "[U+007F][U+009F]\xC2\xA0"},
+      {"\xE2\x80\xAE"
+       "exe\xE2\x81\xA6\xE2\x82\xAC",
+       "[U+202E]exe[U+2066]\xE2\x82\xAC"},
+      {"\xF3\xA0\x80\x81\xF0\x9F\x98\x80", "[U+E0001]\xF0\x9F\x98\x80"},
+  };
+  for (const auto& [text, html] : cases) {
+    EXPECT_EQ(EscapeHtml(text), html);
+  }
+}
+
+TEST(Page, TicksAreRoundAndFew) {
+  constexpr LocalTime begin = 1771000003;  // 2026-02-13 16:26:43
+  const std::tuple<LocalTime, size_t, const char*, const char*> cases[] = {
+      {0, 1, "02-13 16:26", "02-13 16:26"},
+      {100, 2, "02-13 16:27", "02-13 16:28"},
+      {3600, 4, "02-13 16:30", "02-13 17:15"},
+      {86400, 8, "02-13 18:00", "02-14 15:00"},
+      {40 * 86400, 5, "2026-02-19", "2026-03-19"},
+      {400 * 86400, 7, "2026-03-01", "2027-03-01"},
+      {20LL * 366 * 86400, 4, "2030-01-01", "2045-01-01"},
+  };
+  for (const auto& [range, count, first, last] : cases) {
+    const std::vector<TimeTick> ticks = TicksBetween(begin, begin + range);
+    ASSERT_EQ(ticks.size(), count) << range;
+    EXPECT_EQ(ticks.front().Label, first);
+    EXPECT_EQ(ticks.back().Label, last);
+  }
+}
+
+static size_t Count(const std::string& text, const std::string& part) {
+  size_t count = 0;
+  for (size_t i = text.find(part); i != text.npos; i = text.find(part, i + 1)) {
+    ++count;
+  }
+  return count;
+}
+
+TEST(Page, BarsThatWouldOverlapShareALaneInRows) {
+  const TimeLineBar bar = {"Prod", "1", "title", "#event-1", "ok", "x", 0, 10};
+  TimeLineBar later = bar;
+  later.Begin = later.End = 100000;
+  TimeLineBar other = bar;
+  other.Lane = "Test <2>";
+  const std::string svg = DrawTimeLine({bar, bar, later, other});
+  EXPECT_EQ(Count(svg, "class=\"lane\""), 2U);
+  EXPECT_EQ(Count(svg, "class=\"bar ok\""), 4U);
+  EXPECT_EQ(Count(svg, "y=\"32\" width=\"18\""), 2U) << svg;  // the first and the later one
+  EXPECT_EQ(Count(svg, "y=\"54\" width=\"18\""), 1U) << svg;  // the second, below the first
+  EXPECT_NE(svg.find("Test &lt;2&gt;"), svg.npos);
+  EXPECT_EQ(DrawTimeLine({}), "");
+}
+
+TEST(Page, KeepsEventsOfOneNameApartAndUnchangedFromNotKnown) {
+  History history;
+  history.Events.resize(2);
+  for (Event& event : history.Events) {
+    event.Identity = "<7>";
+  }
+  history.Events[0].HasBefore = history.Events[0].HasAfter = true;
+  history.Events[0].Differences.Compared.fill(true);
+  const std::string page = RenderPage(history, {{FindingLevel::kNote, "damaged", "<7>", "cut"}});
+  EXPECT_EQ(Count(page, "<div id=\"event-1\">"), 1U);
+  EXPECT_EQ(Count(page, "href=\"#event-2\""), 1U);
+  EXPECT_EQ(Count(page, "Unchanged: user"), 1U);
+  EXPECT_EQ(Count(page, "Not known, as a snapshot is missing or not whole: user"), 1U);
+  EXPECT_EQ(Count(page, "event <bdi>&lt;7&gt;</bdi>: <bdi>cut</bdi>"), 1U);
+  EXPECT_EQ(page.find("<7>"), page.npos);
+}
