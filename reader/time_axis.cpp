@@ -33,11 +33,11 @@ static std::string Format(LocalTime time, int64_t step) {
   return text;
 }
 
-// Ticks at the first day of every so many months, counted from January.
+// Ticks at the first day of every so many months, counted from January of a round year.
 static std::vector<TimeTick> MonthTicks(LocalTime begin, LocalTime end, int months) {
   std::vector<TimeTick> ticks;
-  const year_month_day first = DateOf(begin);
-  auto month = std::chrono::year_month(first.year(), std::chrono::month(1));
+  const std::chrono::years past(static_cast<int>(DateOf(begin).year()) % std::max(months / 12, 1));
+  auto month = (DateOf(begin).year() - past) / std::chrono::January;
   for (;; month += std::chrono::months(months)) {
     const LocalTime time = sys_days(month / 1).time_since_epoch().count() * day;
     if (time > end) {
