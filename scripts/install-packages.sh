@@ -8,7 +8,7 @@ packages_of() {
   case $1 in
     build) echo "g++ cmake ninja-build pkg-config zlib1g-dev libminizip-dev libsystemd-dev \
       libcli11-dev nlohmann-json3-dev libgtest-dev" ;;
-    tests) echo "libnss-wrapper" ;;
+    tests) echo "libnss-wrapper python3 sqlite3" ;;
     style) echo "git clang-format clang-tidy python3 pycodestyle pyflakes3 shellcheck" ;;
     reliability) echo "acl attr binutils python3 strace unzip" ;;
     page) echo "chromium python3" ;;
