@@ -1,0 +1,103 @@
+"""What the machine says about itself: a name service, a registry export, a process, in any state."""
+
+import os
+import resource
+import shutil
+import subprocess
+import time
+
+from harness import attack
+from history import check
+
+HEADER = "Windows Registry Editor Version 5.00\n\n"
+KEY = "[HKEY_LOCAL_MACHINE\\SOFTWARE\\ZEK\\ORX\\InstalledCopies\\C1\\GLOBAL_PROFILE]\n"
+GOOD = KEY + '"Seen"="yes"\n'
+DRIVERS = "HKEY_LOCAL_MACHINE\\SOFTWARE\\ODBC\\ODBCINST.INI"
+
+
+def write_export(machine, text):
+    (machine.root / "ZEK" / "Registry.reg").write_text(HEADER + text)
+    machine.watch()
+
+
+def report_of(machine, **options):
+    machine.must("-start", "7", **options)
+    return (machine.history / "7" / "ORXInstallEvent.Log").read_bytes()
+
+
+def limit_memory():
+    resource.setrlimit(resource.RLIMIT_AS, (800 << 20, 800 << 20))
+
+
+@attack(("levels of a heading", lambda: "".join(
+            f"[HKEY_LOCAL_MACHINE\\SOFTWARE\\ZEK\\{i}" + "\\k" * 500_000 + "]\n"
+            for i in range(10))),
+        ("levels of many headings", lambda: "".join(
+            f"[HKEY_LOCAL_MACHINE\\SOFTWARE\\ZEK\\{i}" + "\\k" * 500 + "]\n"
+            for i in range(10_000))),
+        ("drivers with a backslash", lambda: f"[{DRIVERS}\\ODBC Drivers]\n" + "".join(
+            f'"ZEK ORX {i}\\\\x"="Installed"\n' for i in range(500)) + "".join(
+            f"[{DRIVERS}\\{i}]\n" for i in range(200_000))))
+def hostile_registry_export(machine, make):
+    """It costs a small multiple of its size in memory and little time, and the good lines count."""
+    write_export(machine, make() + GOOD)
+    before = resource.getrusage(resource.RUSAGE_CHILDREN)
+    report = report_of(machine, preexec_fn=limit_memory)
+    after = resource.getrusage(resource.RUSAGE_CHILDREN)
+    seconds = after.ru_utime - before.ru_utime
+    check(seconds < 2, f"{seconds:.1f} s of CPU time")
+    check(b"Seen:" in report, "the last key is missing")
+
+
+@attack()
+def registry_line_without_closing_quotation_mark(machine):
+    write_export(machine, KEY + '"open"="text\n";next"="kept"\n')
+    check(b";next:" in report_of(machine), "the next line is lost")
+
+
+@attack()
+def process_name_with_control_characters(machine):
+    """It can neither add a line to the report nor send a terminal an escape sequence."""
+    program = os.fsencode(machine.scratch) + b"/x\n4) Services\x1b[2J\xc2\x9b\x7f"
+    shutil.copy(shutil.which("sleep"), program)
+    with subprocess.Popen([program, "60"]) as process:
+        machine.callback(process.kill)
+        report = report_of(machine)
+        process.kill()
+    check(b"x?4) Services?[2J??\n" in report, "the name is not shown as agreed")
+    check(b"\x1b" not in report and b"\n4) Services\x1b" not in report, "forged")
+
+
+SILENT_NAME_SERVICE = """
+#include <unistd.h>
+struct passwd;
+struct passwd* getpwent(void) { for (;;) pause(); }
+"""
+
+
+@attack()
+def silent_name_service(machine):
+    """It costs its rows and at most ten seconds."""
+    library = machine.scratch / "silent.so"
+    subprocess.run(["gcc", "-shared", "-fPIC", "-xc", "-", "-o", library], check=True,
+                   input=SILENT_NAME_SERVICE.encode())
+    began = time.monotonic()
+    report = report_of(machine, variables={"LD_PRELOAD": str(library)})
+    seconds = time.monotonic() - began
+    check(seconds < 12, f"{seconds:.0f} s")
+    check(b"6) ORX ODBC Driver Info:" in report, "the rest of the snapshot is missing")
+    left = subprocess.run(["pgrep", "-f", machine.program], stdout=subprocess.PIPE, check=False)
+    check(not left.stdout, "a process is left")
+
+
+@attack()
+def groups_with_one_name(machine):
+    wrapper = "/usr/lib/x86_64-linux-gnu/libnss_wrapper.so"
+    passwd, group = machine.scratch / "passwd", machine.scratch / "group"
+    passwd.write_text("root:x:0:0::/:/bin/sh\n")
+    group.write_text("twice:x:100:ana\ntwice:x:101:bo\n")
+    report = report_of(machine, variables={
+        "LD_PRELOAD": wrapper, "NSS_WRAPPER_PASSWD": str(passwd), "NSS_WRAPPER_GROUP": str(group)})
+    rows = [line.split()[-1].split(b"\\")[-1] for line in report.splitlines()
+            if line.startswith(b"twice")]
+    check(rows == [b"twice", b"ana", b"bo"], f"{rows}")
