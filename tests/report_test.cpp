@@ -15,10 +15,12 @@ namespace {
 
 namespace fs = std::filesystem;
 
-// A report's result and, behind it, what it prints.
+// A report's result and after it what it prints.
 std::string Report(const std::string& archive) {
   testing::internal::CaptureStdout();
-  const int result = CInstallHistory().Report(archive);
+  CInstallHistory history;
+  const int result = history.Report(archive);
+  EXPECT_EQ(history.IsArchiveComplete, result == 1);
   return std::to_string(result) + testing::internal::GetCapturedStdout();
 }
 
@@ -77,12 +79,26 @@ TEST(Report, NeedsAHistoryFolderForItsArchiveAndAHistoryFileForItsSummary) {
 TEST(Report, MakesNoArchiveUnderNamesThatAreTaken) {
   const ScratchHistory scratch;
   RunTool({"-start", "7"});
-  const std::string history = FileText(GetHistoryFilePath());
-  for (const std::string& name : {std::string(), scratch.Root, scratch.In("none/a.zip"),
-                                  GetHistoryFilePath(), InHistory("7/../History.ini")}) {
+  CInstallHistory().WriteSummary();
+  const std::string names[] = {"",
+                               scratch.Root,
+                               scratch.In("none/a.zip"),
+                               GetHistoryFilePath(),
+                               InHistory("7/../History.ini"),
+                               InHistory("Summary.txt"),
+                               InHistory("7/ORXInstallEvent.Log")};
+  const auto texts = [&names] {
+    std::string all;
+    for (const std::string& name : names) {
+      all += FileExists(name) ? FileText(name) : "";
+    }
+    return all;
+  };
+  const std::string before = texts();
+  for (const std::string& name : names) {
     EXPECT_EQ(Report(name), "0 Failed to create file '" + name + "'\n");
   }
-  EXPECT_EQ(FileText(GetHistoryFilePath()), history);
+  EXPECT_EQ(texts(), before);
 }
 
 }  // namespace

@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <ctime>
 #include <filesystem>
 #include <string>
@@ -134,6 +135,72 @@ TEST_F(Zipper, AddsToAnArchiveReplacesItAndCloses) {
   EXPECT_FALSE(zipper.AddFolder(Root) || zipper.AddBuffer("x", 1, "x"));
   EXPECT_EQ(zipper.Counters.FolderCount, 0U);
   EXPECT_TRUE(zipper.Close());
+}
+
+TEST_F(Zipper, ReplacesAnOlderArchiveWhenItIsClosed) {
+  WriteFileText(Archive, "older");
+  const std::string before = Scratch.Tree();
+  CZipper zipper(Archive.c_str(), Scratch.Root.c_str());
+  EXPECT_TRUE(zipper.AddFile(File));
+  EXPECT_FALSE(zipper.AddFile(Archive));
+  EXPECT_EQ(FileText(Archive), "older");
+  EXPECT_NE(Scratch.Tree(), before);
+  EXPECT_TRUE(zipper.Close());
+  EXPECT_EQ(ArchiveTree(Archive), "Tree/sub/b.txt\n");
+  EXPECT_EQ(Scratch.Tree(), before);
+
+  // What is not a regular file when the archive is finished is not replaced either.
+  zipper.Open(Archive.c_str());
+  fs::remove(Archive);
+  fs::create_directory(Archive);
+  EXPECT_FALSE(zipper.Close());
+  EXPECT_FALSE(zipper.Open(Archive.c_str()));
+  EXPECT_TRUE(fs::is_empty(Archive));
+}
+
+TEST_F(Zipper, EndsWhatExceedsALimit) {
+  struct {
+    ZipLimits Limits;
+    bool IsAdded;
+    const char* Tree;
+  } const cases[] = {{{14, 4}, true, "a.txt\nsub/\nsub/b.txt\nm\n"},
+                     {{14, 3}, false, "a.txt\nsub/\nsub/b.txt\n"},
+                     {{13, 4}, true, "a.txt\nsub/\nsub/b.txt\nm\n"}};
+  fs::remove(Scratch.In("Tree/sub/empty"));
+  for (const auto& [limits, isAdded, tree] : cases) {
+    CZipper zipper(Archive.c_str(), Root.c_str());
+    zipper.Limits = limits;
+    EXPECT_TRUE(zipper.AddFolder(Root));
+    EXPECT_EQ(zipper.AddBuffer("mm", 2, "m"), isAdded);
+    EXPECT_TRUE(zipper.Close());
+    EXPECT_EQ(zipper.IsWithinLimits(), isAdded && limits.EntrySize == 14);
+    EXPECT_EQ(ArchiveTree(Archive), tree);
+    EXPECT_EQ(ReadArchive(Archive).at(2).Contents,
+              std::string("Tree/sub/b.txt").substr(0, limits.EntrySize));
+    EXPECT_TRUE(zipper.Open(Archive.c_str()) && zipper.IsWithinLimits());
+  }
+}
+
+TEST_F(Zipper, StoresTheNearestDateOfTheFormat) {
+  constexpr unsigned long cases[][2] = {
+      // the year, and the packed date and time of its first of July
+      {1975, 0x00210000},  // first of January 1980
+      {1981, 0x02E10000},
+      {2107, 0xFEE10000},
+      {2108, 0xFF9FBF7D},  // 31 December 2107, 23:59:58
+  };
+  for (const auto& [year, date] : cases) {
+    tm july = {};
+    july.tm_year = static_cast<int>(year) - 1900;
+    july.tm_mon = 6;
+    july.tm_mday = 1;
+    july.tm_isdst = -1;
+    const std::chrono::seconds time(std::mktime(&july));
+    fs::last_write_time(File, std::chrono::file_clock::from_sys(std::chrono::sys_seconds(time)));
+    CZipper zipper(Archive.c_str(), Root.c_str());
+    EXPECT_TRUE(zipper.AddFile(File) && zipper.Close());
+    EXPECT_EQ(ReadArchive(Archive).at(0).Date, date) << year;
+  }
 }
 
 TEST_F(Zipper, PacksAThingBesideIt) {

@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <fstream>
+
 #include "tests/platform/contract.h"
 
 namespace {
@@ -21,12 +24,27 @@ TEST_F(Files, AreReadExclusively) {
     EXPECT_EQ(ExclusiveFile(path).IsOpen(), !isWindows);
   }
   EXPECT_TRUE(ExclusiveFile(path).IsOpen());
-  for (const std::string& other : {Root, In("none"), device}) {
+  std::error_code error;
+  std::filesystem::create_symlink(path, In("link"), error);  // not possible everywhere
+  for (const std::string& other : {Root, In("none"), In("link"), device}) {
     ExclusiveFile file(other);
     char byte = 0;
     EXPECT_FALSE(file.IsOpen()) << other;
     EXPECT_EQ(file.Read(&byte, 1), 0U) << other;
+    EXPECT_EQ(file.Size(), 0U) << other;
   }
+}
+
+TEST_F(Files, EndWhereTheyEndedWhenTheyWereOpened) {
+  const std::string path = Make("file", "0123456789");
+  ExclusiveFile file(path);
+  std::ofstream(path, std::ios::app) << "more";  // impossible on Windows
+  char buffer[20];
+  EXPECT_EQ(file.Size(), 10U);
+  EXPECT_EQ(file.Read(buffer, 4), 4U);
+  EXPECT_EQ(file.Read(buffer, sizeof buffer), 6U);
+  EXPECT_EQ(std::string(buffer, 6), "456789");
+  EXPECT_EQ(file.Read(buffer, sizeof buffer), 0U);
 }
 
 }  // namespace
