@@ -138,6 +138,13 @@ std::string EventTable(const History& history) {
          Scrolling("Events", table) + "</section>\n";
 }
 
+std::string FindingItem(const Finding& finding) {
+  const std::string level(LevelName(finding.Level));
+  const std::string event = finding.Event.empty() ? "" : "event " + Isolated(finding.Event) + ": ";
+  return "<li><span class=\"level " + level + "\">" + level + "</span> " + event +
+         Isolated(finding.Text) + " <code>" + EscapeHtml(finding.Code) + "</code></li>\n";
+}
+
 std::string FindingsSection(const std::vector<Finding>& findings) {
   std::string html = "<section aria-labelledby=\"check\">\n<h2 id=\"check\">Check</h2>\n";
   if (findings.empty()) {
@@ -145,11 +152,7 @@ std::string FindingsSection(const std::vector<Finding>& findings) {
   }
   html += "<ul class=\"findings\">\n";
   for (const Finding& finding : findings) {
-    const std::string level(LevelName(finding.Level));
-    const std::string event =
-        finding.Event.empty() ? "" : "event " + Isolated(finding.Event) + ": ";
-    html += "<li><span class=\"level " + level + "\">" + level + "</span> " + event +
-            Isolated(finding.Text) + " <code>" + EscapeHtml(finding.Code) + "</code></li>\n";
+    html += FindingItem(finding);
   }
   return html + "</ul>\n</section>\n";
 }

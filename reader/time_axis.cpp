@@ -14,7 +14,7 @@ static constexpr size_t mostTicks = 9;
 
 static year_month_day DateOf(LocalTime time) {
   const int64_t dayNumber = time / day - (time % day < 0 ? 1 : 0);
-  return year_month_day(sys_days(days(dayNumber)));
+  return {sys_days(days(dayNumber))};
 }
 
 static std::string Format(LocalTime time, int64_t step) {
@@ -70,7 +70,7 @@ std::vector<TimeTick> TicksBetween(LocalTime begin, LocalTime end) {
     }
   }
   for (const int months : {1, 2, 3, 6, 12, 24, 60, 120}) {
-    const int64_t step = months * 28 * day;
+    const int64_t step = 28 * day * months;
     if (static_cast<size_t>(range / step) < mostTicks) {
       return MonthTicks(begin, end, months);
     }
