@@ -39,7 +39,7 @@ void CInstallEvent::Dispatch() {
 }
 
 void CInstallEvent::OpenEventLog() const {
-  if (LeadsOutOfHistory(JoinPath(EventID, "ORXInstallEvent.Log"))) {
+  if (LeadsElsewhere(JoinPath(EventID, "ORXInstallEvent.Log"))) {
     return;  // like a log that cannot be opened: the text is dropped
   }
   if (KindOf(EventLogPath) == FileKind::kOther) {

@@ -61,7 +61,7 @@ void CInstallEvent::WriteDefaults() {
 }
 
 bool CInstallEvent::CreateEventFolder() const {
-  if (!LeadsOutOfHistory(EventID) && EnsureFolder(EventFolder)) {
+  if (CanHoldEvent(EventID) && EnsureFolder(EventFolder)) {
     return true;
   }
   std::cout << " Failed to create path:" << EventFolder;

@@ -5,7 +5,6 @@
 #include "app/install_event.h"
 #include "history/ini_file.h"
 #include "history/locations.h"
-#include "platform/path.h"
 #include "platform/profile_file.h"
 
 CInstallHistory::CInstallHistory() { ReadCount(); }
@@ -30,12 +29,11 @@ int CInstallHistory::Run(int argc, char** argv) {
 }
 
 bool CInstallHistory::InitHistoryStore() {
-  if (!EnsureFolder(JoinPath(GetCommonAppDataPath(), "ZEK"))) {
-    return false;
-  }
-  const std::string historyFolder = GetHistoryDir();
-  if (!EnsureFolder(historyFolder)) {
-    std::cout << " Failed to create path:" << historyFolder;
+  std::string failed;
+  if (!EnsureHistoryDir(failed)) {
+    if (failed == GetHistoryDir()) {
+      std::cout << " Failed to create path:" << failed;
+    }
     return false;
   }
   // On a first run Run's guard could not lock the folder. Without this one, another run could count

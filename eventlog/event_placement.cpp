@@ -6,7 +6,7 @@
 #include "platform/path.h"
 
 void CInstallEvent::PlaceEventLog() {
-  if (CopyName.empty() || LeadsOutOfHistory(CopyName) || LeadsOutOfHistory(EventID)) {
+  if (CopyName.empty() || LeadsElsewhere(EventID) || !CanHoldEvent(JoinPath(CopyName, EventID))) {
     return;
   }
   const std::string copyFolder = JoinPath(GetHistoryDir(), CopyName);

@@ -2,6 +2,8 @@
 
 #include <cerrno>
 
+#include "platform/held_file.h"
+
 CLogger& CLogger::GetInstance() {
   static CLogger instance;
   return instance;
@@ -9,6 +11,7 @@ CLogger& CLogger::GetInstance() {
 
 void CLogger::Open(const std::string& fileName, std::ios_base::openmode mode) {
   Close();
+  WaitWhileHeld(fileName);
   do {
     errno = 0;  // a failure need not set it
     open(fileName, mode | std::ios::out);

@@ -3,20 +3,24 @@
 #include <fstream>
 #include <string>
 
-// The one text stream of a run, on the event's ORXInstallEvent.Log. Writers insert into it with the
-// ordinary operators and end each line with std::endl, so that all text up to the last whole line
-// is on disk when a run breaks off. Formatting flags that one writer sets stay set for the next.
+// The one text stream of a run, on the event's ORXInstallEvent.Log. Writers use the ordinary
+// insertion operators and end each line with std::endl, which flushes it, so that after a crash all
+// complete lines are in the file. (Flushed means handed to the system, not forced to disk.)
+// Formatting flags that one writer sets stay set for the next.
 //
-// Without an open file, after a failed Open and on a full disk, insertions do nothing and raise
-// nothing; nobody tests the stream.
+// Without an open file, after a failed Open and after a failed write, insertions do nothing; they
+// throw nothing, and no caller tests the stream.
 class CLogger : public std::ofstream {
  public:
   static CLogger& GetInstance();
 
-  // Closes what is open and opens the named file for output: std::ios::out empties an existing
-  // file, std::ios::app writes behind what it holds. Makes a missing file, but no folder.
+  // Closes the file that is open and opens the named one for output, as text and shared with other
+  // programs: std::ios::out empties an existing file, std::ios::app writes after what it contains.
+  // A missing file is made, a missing folder is not. A file that another program holds is waited
+  // for (WaitWhileHeld). If the file cannot be opened, the stream is in its failure state.
   void Open(const std::string& fileName, std::ios_base::openmode mode);
 
+  // Does nothing if no file is open.
   void Close();
 
  private:

@@ -64,7 +64,7 @@ void CheckJoining(const std::string& folder, const std::string& name) {
 
 void CheckStaying(const std::string& name) {
   const std::string history = GetHistoryDir();
-  const bool leadsOut = LeadsOutOfHistory(name);
+  const bool leadsOut = LeadsElsewhere(name);
   const auto parts = Split(name, '/');
   const bool isPlain = std::none_of(parts.begin(), parts.end(),
                                     [](const std::string& part) { return part == ".."; });

@@ -69,7 +69,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   RequireQuick([&] { ReadProfile(text); });
   RequireQuick([&] { ReadRegistry(text); });
   const std::string argument = text.substr(0, argumentSize);
-  RequireQuick([&] { LeadsOutOfHistory(argument); });
+  RequireQuick([&] { LeadsElsewhere(argument); });
   RequireQuick([&] { ReplaceExtension(TrimHead(TrimTail(argument)), ".zip"); });
   RequireQuick([&] { CIniFile(GetHistoryFilePath()).WriteString(argument, "Key", argument); });
   return 0;

@@ -117,7 +117,7 @@ void RunEvent(HistoryModel& model, const Words& words) {
 void RunReport(HistoryModel& model, const std::string& archive) {
   Require(CInstallHistory().Report(archive) == 1);
   for (const std::string& name : ArchiveNames(archive)) {
-    Require(!name.starts_with('/') && !LeadsOutOfHistory(name));
+    Require(!name.starts_with('/') && !LeadsElsewhere(name));
   }
   for (const std::string& section : model.EventSections()) {
     for (const char* key : {"Log_File_Name", "Trace_File", "Response_File"}) {

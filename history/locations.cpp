@@ -12,11 +12,26 @@ std::string GetCommonAppDataPath() {
   return folder.empty() ? "C:\\Documents and Settings\\All Users\\Application Data" : folder;
 }
 
-std::string GetHistoryDir() {
-  return JoinPath(JoinPath(GetCommonAppDataPath(), "ZEK"), "ORXHistory");
-}
+std::string GetMakerDir() { return JoinPath(GetCommonAppDataPath(), "ZEK"); }
+
+std::string GetHistoryDir() { return JoinPath(GetMakerDir(), "ORXHistory"); }
 
 std::string GetHistoryFilePath() { return JoinPath(GetHistoryDir(), "History.ini"); }
+
+bool EnsureHistoryDir(std::string& failed) {
+  for (const std::string& path : {GetMakerDir(), GetHistoryDir()}) {
+    if (!EnsureFolder(path, FolderAccess::kShared) || IsSymbolicLink(path)) {
+      failed = path;
+      return false;
+    }
+  }
+  return true;
+}
+
+bool HistoryDirExists() {
+  return DirExists(GetHistoryDir()) && !IsSymbolicLink(GetMakerDir()) &&
+         !IsSymbolicLink(GetHistoryDir());
+}
 
 // Windows drops blanks and points from the end of a part: ".. " leads up too.
 static bool LeadsUp(std::string_view part) {
@@ -24,7 +39,7 @@ static bool LeadsUp(std::string_view part) {
          part.find_first_not_of(". ") == std::string_view::npos;
 }
 
-bool LeadsOutOfHistory(const std::string& name) {
+bool LeadsElsewhere(const std::string& name) {
   if (IsRootedPath(name)) {
     return true;
   }
@@ -47,6 +62,11 @@ bool LeadsOutOfHistory(const std::string& name) {
   return false;
 }
 
+bool CanHoldEvent(const std::string& name) {
+  const std::string log = JoinPath(JoinPath(GetHistoryDir(), name), "ORXInstallEvent.Log");
+  return !LeadsElsewhere(name) && FitsPathLimit(log);
+}
+
 static FileKind KindOfUnquoted(std::string path) {
   if (path.starts_with('"')) {
     path.erase(0, 1);
@@ -61,6 +81,6 @@ bool FileExists(const std::string& path) { return KindOfUnquoted(path) == FileKi
 
 bool DirExists(const std::string& path) { return KindOfUnquoted(path) == FileKind::kFolder; }
 
-bool EnsureFolder(const std::string& path) {
-  return DirExists(path) || CreateFolder(path) || DirExists(path);
+bool EnsureFolder(const std::string& path, FolderAccess access) {
+  return DirExists(path) || CreateFolder(path, access) || DirExists(path);
 }

@@ -2,28 +2,45 @@
 
 #include <string>
 
-// Where the history lies. No path is kept: each call works it out again. No path ends in a
+#include "platform/files.h"
+
+// The paths of the history. None is cached: each call works it out again. None ends with a
 // separator.
 
-// The common application data folder of the machine, the root of it all.
+// The common application data folder of the machine.
 std::string GetCommonAppDataPath();
 
-// The history folder, ZEK and ORXHistory below the root.
+// The maker's folder, ZEK in the common application data folder.
+std::string GetMakerDir();
+
+// The history folder, ORXHistory in the maker's folder.
 std::string GetHistoryDir();
 
 // The history file, History.ini in the history folder.
 std::string GetHistoryFilePath();
 
-// True if a name, put below the history folder, would lead out of it: a rooted path, one with a
-// part "..", or one with a part that is a symbolic link there. Such a name is treated as a folder
-// that cannot be made and a file that cannot be opened.
-bool LeadsOutOfHistory(const std::string& name);
+// True if both folders exist afterwards and neither is a link, which anybody could have placed
+// there before the first run; if not, the path of the first one that fails is stored in "failed".
+// Both are made for all users (FolderAccess::kShared).
+bool EnsureHistoryDir(std::string& failed);
 
-// Whether a regular file, or a folder, of that name exists. The path may stand in double quotation
-// marks. A link counts as what it leads to; an empty path is neither.
+// True if the history folder exists and neither it nor the maker's folder is a link.
+bool HistoryDirExists();
+
+// True if a name, below the history folder, would lead to anything but a file or folder of that
+// name there: a rooted path, one with a part "..", one with a part that the system changes or takes
+// for a device (IsKeptName), or one with a part that is a symbolic link. Such a name is treated as
+// a folder that cannot be made and a file that cannot be opened.
+bool LeadsElsewhere(const std::string& name);
+
+// False if the folder of an event cannot have that name, below the history folder: it leads
+// elsewhere, or the path of the event's log would be too long (FitsPathLimit).
+bool CanHoldEvent(const std::string& name);
+
+// Whether a regular file, or a folder, of that name exists. The path may be enclosed in double
+// quotation marks. A link counts as its target; an empty path is neither.
 bool FileExists(const std::string& path);
 bool DirExists(const std::string& path);
 
-// True when the folder exists afterwards, whoever made it: a run beside this one may do so between
-// the look and the making. The folder above must exist.
-bool EnsureFolder(const std::string& path);
+// True if the folder exists afterwards, even if an overlapping run made it. The parent must exist.
+bool EnsureFolder(const std::string& path, FolderAccess access = FolderAccess::kInherited);

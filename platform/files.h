@@ -26,9 +26,18 @@ bool IsSymbolicLink(const std::string& path);
 // inode).
 bool IsSameFile(const std::string& first, const std::string& second);
 
+enum class FolderAccess {
+  kInherited,  // what the parent folder prescribes
+  // On Windows, whatever the parent prescribes: administrators and the system have full access,
+  // and so has a user to what he made; all users may read, and create files and folders. On POSIX
+  // as kInherited.
+  kShared,
+};
+
 // Makes one folder; its parent must exist. False if anything of that name exists.
-// Windows: CreateDirectoryA with default security. POSIX: mkdir with mode 0777.
-bool CreateFolder(const std::string& path);
+// Windows: CreateDirectoryA, for kInherited with default security. POSIX: mkdir with
+// mode 0777.
+bool CreateFolder(const std::string& path, FolderAccess access = FolderAccess::kInherited);
 
 // Moves a folder with its contents in one step. False, with nothing moved, if anything of the
 // target's name exists (an empty folder too), or the source is not a folder or is a link to one.

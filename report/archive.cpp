@@ -28,7 +28,7 @@ static bool IsHistoryFile(const std::string& path) {
 int CInstallHistory::CreateArchive(const std::string& archiveName) {
   CZipper zipper;
   const std::string folder = GetHistoryDir();
-  if (!DirExists(folder)) {
+  if (!HistoryDirExists()) {
     std::cout << "There is no ORX Installation History Log ( no ORX V9 or Later is installed )"
               << std::endl;
     return 0;

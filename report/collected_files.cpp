@@ -32,7 +32,7 @@ struct CollectedFile {
 // The target's name is below the history folder.
 bool CopyIntoHistory(const std::string& source, const std::string& targetName) {
   const std::string target = JoinPath(GetHistoryDir(), targetName);
-  return FileExists(source) && !FileExists(target) && !LeadsOutOfHistory(targetName) &&
+  return FileExists(source) && !FileExists(target) && !LeadsElsewhere(targetName) &&
          CopyToNewFile(source, target);
 }
 

@@ -6,7 +6,9 @@
 #include "history/ini_file.h"
 #include "history/locations.h"
 
-bool CInstallHistory::HistoryFileExists() const { return FileExists(GetHistoryFilePath()); }
+bool CInstallHistory::HistoryFileExists() const {
+  return HistoryDirExists() && FileExists(GetHistoryFilePath());
+}
 
 std::vector<std::string> CInstallHistory::GetEventSections() const {
   std::vector<std::string> sections = CIniFile(GetHistoryFilePath()).GetSectionNames();

@@ -16,7 +16,7 @@ namespace {
 void OpenBelowHistory(std::ofstream& stream, const std::string& name) {
   const std::string path = JoinPath(GetHistoryDir(), name);
   // A pipe would hold the report up until somebody reads from it.
-  if (!LeadsOutOfHistory(name) && KindOf(path) != FileKind::kOther) {
+  if (!LeadsElsewhere(name) && KindOf(path) != FileKind::kOther) {
     stream.open(path, std::ios::out | std::ios::trunc);
   }
 }

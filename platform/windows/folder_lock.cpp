@@ -5,8 +5,7 @@
 #include <cstdio>
 
 #include "platform/path.h"
-// It needs what the system's header defines.
-#include <sddl.h>
+#include "platform/windows/access_list.h"
 
 // A name of an object may have no backslash and at most 260 characters, so it has a hash (FNV-1a)
 // of the folder's path.
@@ -25,17 +24,9 @@ static std::string MutexName(const std::string& folder) {
 
 UniqueHandle OpenFolderMutex(const std::string& folder) {
   constexpr DWORD access = SYNCHRONIZE | MUTEX_MODIFY_STATE;
-  constexpr const char* everyoneMayUse = "D:(A;;0x100001;;;WD)";
-  SECURITY_ATTRIBUTES security = {sizeof security, /*lpSecurityDescriptor=*/nullptr,
-                                  /*bInheritHandle=*/FALSE};
-  if (::ConvertStringSecurityDescriptorToSecurityDescriptorA(
-          everyoneMayUse, SDDL_REVISION_1, &security.lpSecurityDescriptor,
-          /*SecurityDescriptorSize=*/nullptr) == FALSE) {
-    return nullptr;
-  }
-  UniqueHandle mutex(::CreateMutexExA(&security, MutexName(folder).c_str(), /*dwFlags=*/0, access));
-  ::LocalFree(security.lpSecurityDescriptor);
-  return mutex;
+  AccessList everyoneMayUse("D:(A;;0x100001;;;WD)");
+  return UniqueHandle(
+      ::CreateMutexExA(everyoneMayUse.Get(), MutexName(folder).c_str(), /*dwFlags=*/0, access));
 }
 
 FolderLock::FolderLock(const std::string& folder, std::chrono::nanoseconds& timeLeft)

@@ -4,53 +4,21 @@
 
 #include <chrono>
 #include <functional>
-#include <semaphore>
-#include <thread>
 
 #include "platform/windows/folder_lock.h"
 #include "platform/windows/system.h"
 #include "tests/platform/contract.h"
+#include "tests/windows/holder.h"
 
 namespace {
 
 using namespace std::chrono_literals;
 using std::chrono::steady_clock;
 
-// Another program: what it acquires it keeps until the object ends, or for the time given.
-class Holder {
- public:
-  Holder(std::function<UniqueHandle()> acquire, steady_clock::duration time)
-      : Thread([this, acquire = std::move(acquire), time] {
-          const UniqueHandle held = acquire();
-          IsHeld = held != nullptr;
-          Acquired.release();
-          Ended.try_acquire_for(time);
-        }) {
-    Acquired.acquire();
-    EXPECT_TRUE(IsHeld);
-  }
-  ~Holder() {
-    Ended.release();
-    Thread.join();
-  }
-  Holder(const Holder&) = delete;
-  Holder& operator=(const Holder&) = delete;
-
- private:
-  bool IsHeld = false;
-  std::binary_semaphore Acquired{0};
-  std::binary_semaphore Ended{0};
-  std::thread Thread;
-};
-
 class ProfileOnWindows : public Platform {
  protected:
   std::function<UniqueHandle()> OpensIni(DWORD access, DWORD share) const {
-    return [this, access, share] {
-      return OwnIfValid(::CreateFileA(Ini.c_str(), access, share, /*lpSecurityAttributes=*/nullptr,
-                                      OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL,
-                                      /*hTemplateFile=*/nullptr));
-    };
+    return [this, access, share] { return OpenExisting(Ini, access, share); };
   }
 
   std::string Value() const { return ReadProfileValue(Ini, "S", "Key", "none", 256); }
