@@ -64,7 +64,7 @@ constexpr const char* listName = "system.posix_acl_access";
 
 TEST_F(ProfileOnPosix, KeepsOwnerPermissionsAndAccessList) {
   const uid_t owner = ::getuid() == 0 ? 65534 : ::getuid();
-  for (const mode_t mode : {0600, 0640, 0604, 04755}) {
+  for (const mode_t mode : {0600U, 0640U, 0604U, 04755U}) {
     ASSERT_EQ(::chown(Ini.c_str(), owner, /*group=*/::getgid()), 0);
     ASSERT_EQ(::chmod(Ini.c_str(), mode), 0);
     EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", std::to_string(mode)));
@@ -74,13 +74,22 @@ TEST_F(ProfileOnPosix, KeepsOwnerPermissionsAndAccessList) {
     EXPECT_EQ(status.st_uid, owner);
     EXPECT_LT(::getxattr(Ini.c_str(), listName, /*value=*/nullptr, /*size=*/0), 0);
   }
-  if (::setxattr(Ini.c_str(), listName, accessList, sizeof accessList - 1, /*flags=*/0) != 0) {
+  const std::string_view list(accessList, sizeof accessList - 1);
+  const auto listOf = [](const std::string& path) {
+    char buffer[100] = {};
+    const ssize_t size = ::getxattr(path.c_str(), listName, buffer, sizeof buffer);
+    return std::string(buffer, size < 0 ? 0 : static_cast<size_t>(size));
+  };
+  // The folder's default for new files must not come in, and the file's own list must stay.
+  if (::setxattr(Root.c_str(), "system.posix_acl_default", list.data(), list.size(), 0) != 0) {
     GTEST_SKIP() << "a file system without access control lists";
   }
+  ASSERT_EQ(::chmod(Ini.c_str(), 0660), 0);
+  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "no list"));
+  EXPECT_EQ(listOf(Ini), "");
+  ASSERT_EQ(::setxattr(Ini.c_str(), listName, list.data(), list.size(), /*flags=*/0), 0);
   EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "with a list"));
-  char list[sizeof accessList] = {};
-  ::getxattr(Ini.c_str(), listName, list, sizeof list);
-  EXPECT_EQ(std::string(list, sizeof list), std::string(accessList, sizeof accessList));
+  EXPECT_EQ(listOf(Ini), list);
 }
 
 TEST_F(ProfileOnPosix, WaitsForALockOnlyOnce) {

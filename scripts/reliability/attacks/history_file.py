@@ -24,13 +24,17 @@ def temporary_file_of_a_closed_history(machine, call):
     check(all(stat.S_IMODE(file.stat().st_mode) == 0o600 for file in left), "others could read it")
 
 
-@attack(*((f"{call} {error}", call, error) for call, error in (
-    ("fdatasync", "EINVAL"), ("fdatasync", "EOPNOTSUPP"), ("fdatasync", "ENOSYS"),
-    ("fchmod", "EPERM"), ("fchown", "EPERM"), ("fgetxattr", "EOPNOTSUPP"))))
-def refused_by_the_file_system(machine, call, error):
-    for name in ("7", "8"):
-        machine.must("-start", name, before=injecting(call, f"error={error}"))
+@attack(*((f"{call} {error}", call, error, mode) for call, error, mode in (
+    ("fdatasync", "EINVAL", 0o660), ("fdatasync", "EOPNOTSUPP", 0o660),
+    ("fdatasync", "ENOSYS", 0o660), ("fgetxattr", "EOPNOTSUPP", 0o660), ("fgetxattr", "EIO", 0o600),
+    ("fchown", "EPERM", 0o600), ("fchmod", "EPERM", 0o600))))
+def refused_by_the_file_system(machine, call, error, mode):
+    """The run goes on, and what it cannot keep gives nobody more rights."""
+    machine.must("-start", "7", before=injecting(call, f"error={error}"))
+    machine.ini.chmod(0o660)
+    machine.must("-start", "8", before=injecting(call, f"error={error}"))
     check(machine.sections()["History"]["Count"] == "2", "not recorded")
+    check(stat.S_IMODE(machine.ini.stat().st_mode) == mode, "permissions")
 
 
 @attack()
