@@ -1,6 +1,7 @@
 // The program as an installer runs it: whole processes over a scratch folder.
 
 #include <gtest/gtest.h>
+#include <sys/inotify.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 
@@ -143,7 +144,7 @@ TEST_F(Run, WaitsForNoReaderOfALog) {
 TEST_F(Run, NeitherFollowsNorPacksLinksAndPipes) {
   ASSERT_EQ(
       Shell("mkdir outside outside/7; echo untouched >outside/Summary.txt; echo log >setup.log;"
-            "cd ZEK/ORXHistory; mkdir C2 C2/7 C2/7.log; mkfifo pipe C2/Summary.txt;"
+            "cd ZEK/ORXHistory; mkdir C2 C2/7 C2/7.log C2/C1; mkfifo pipe C2/Summary.txt;"
             "ln -s ../../outside C1; ln -s ../../outside/Summary.txt .; ln -s C2 loop;"
             "ln -s ../../../../outside/new.log C2/7.log/setup.log;"
             "ln -s ../../../outside/new.log C2/ORXInstallEvent.Log"),
@@ -152,14 +153,54 @@ TEST_F(Run, NeitherFollowsNorPacksLinksAndPipes) {
   const std::string log = "Log_File_Name=" + Root + "/setup.log\n";
   WriteFileText(History + "History.ini", "[7]\nCopy_Name=C1\n" + log + "[8]\nCopy_Name=C2/7\n" +
                                              log + "[7.log]\nCopy_Name=C2\n" + log);
-  for (const std::string arguments :
-       {"-start C1", "-start C2", "-start 9", "-end 9 -CopyName C1", "-report a.zip"}) {
+  for (const std::string arguments : {"-start C1", "-start C2", "-start 9", "-end 9 -CopyName C1",
+                                      "-end C1/7 -CopyName C2", "-report a.zip"}) {
     EXPECT_EQ(Call(arguments), 0);
   }
   EXPECT_EQ(ArchiveTree(Root + "/a.zip"),
-            "9/\n9/ORXInstallEvent.Log\nC2/\nC2/7/\nC2/7/Summary.txt\nC2/7.log/\nHistory.ini\n");
+            "9/\n9/ORXInstallEvent.Log\nC2/\nC2/7/\nC2/7/Summary.txt\nC2/7.log/\nC2/C1/\n"
+            "History.ini\n");
   EXPECT_EQ(FileText(Root + "/outside/Summary.txt"), "untouched\n");
   EXPECT_EQ(fs::remove_all(Root + "/outside"), 3U);  // itself and what is made above
+}
+
+// Windows moves no folder in which a file is open.
+TEST_F(Run, ClosesALogBeforeItIsMoved) {
+  Call("-start 7");
+  const int watch = ::inotify_init1(IN_NONBLOCK);
+  ASSERT_GE(::inotify_add_watch(watch, (History + "7/ORXInstallEvent.Log").c_str(), IN_CLOSE_WRITE),
+            0);
+  ASSERT_GE(::inotify_add_watch(watch, History.c_str(), IN_MOVED_FROM | IN_ONLYDIR), 0);
+  EXPECT_EQ(Call("-end 7 -CopyName C1"), 0);
+  std::vector<uint32_t> events;
+  alignas(inotify_event) char buffer[4096];
+  const ssize_t size = ::read(watch, buffer, sizeof buffer);
+  for (ssize_t offset = 0; offset < size;) {
+    const auto* event = reinterpret_cast<const inotify_event*>(buffer + offset);
+    if (event->len == 0 || std::string(event->name) == "7") {
+      events.push_back(event->mask & (IN_CLOSE_WRITE | IN_MOVED_FROM));
+    }
+    offset += static_cast<ssize_t>(sizeof *event + event->len);
+  }
+  ::close(watch);
+  EXPECT_EQ(events, (std::vector<uint32_t>{IN_CLOSE_WRITE, IN_MOVED_FROM}));
+}
+
+// The lock of the history file, which a report takes twice: when it has copied a file, and when it
+// packs the history file.
+TEST_F(Run, ReportsUnderTheLockOfTheHistoryFile) {
+  const std::string log = "Log_File_Name=" + Root;
+  WriteFileText(Root + "/setup.log", "log");
+  WriteFileText(History + "History.ini", "[7]\nCopy_Name=C1\n" + log + "/setup.log\n");
+  EXPECT_EQ(Shell("cd ZEK/ORXHistory; mkdir -p C1/7; exec 9<.; flock 9;"
+                  "$ORX -report $OLDPWD/a.zip 9<&- & while ! [ -e C1/7/setup.log ]; do :; done;"
+                  "sed -i s/setup.log/new.log/ History.ini; flock -u 9; wait $!"),
+            0);
+  EXPECT_EQ(HistoryFile().Find("7", "Log_File_Name"), Root + "/new.log");
+
+  EXPECT_EQ(Shell("cd ZEK/ORXHistory; exec 9<.; flock 9; $ORX -report $OLDPWD/b.zip 9<&- &"
+                  "sleep 0.5; test ! -e $OLDPWD/b.zip; flock -u 9; wait $!"),
+            0);
 }
 
 TEST_F(Run, TakesArgumentsOfAnyKind) {
