@@ -24,4 +24,7 @@ endif()
 
 add_library(orx_minizip INTERFACE)
 target_include_directories(orx_minizip SYSTEM INTERFACE ${ORX_MINIZIP_INCLUDE_DIR})
-target_link_libraries(orx_minizip INTERFACE ${ORX_MINIZIP_LIBRARY} ZLIB::ZLIB)
+# A program with the property ORX_SHARES_ZLIB gets the fixes of the system's zlib, as it unpacks what
+# others packed. The others, which only pack, have their own and start without loading one.
+target_link_libraries(orx_minizip INTERFACE ${ORX_MINIZIP_LIBRARY}
+  $<IF:$<BOOL:$<TARGET_PROPERTY:ORX_SHARES_ZLIB>>,z,ZLIB::ZLIB>)

@@ -16,6 +16,7 @@ packages_of() {
       libcli11-dev nlohmann-json3-dev" ;;
     windows) echo "cmake dpkg-dev googletest g++-mingw-w64-x86-64-posix libcli11-dev \
       libz-mingw-w64-dev ninja-build nlohmann-json3-dev python3 wine wine64" ;;
+    packages) echo "$(packages_of windows) binutils debootstrap lintian" ;;
     bench) echo "libbenchmark-dev libglib2.0-dev pkg-config crudini git zip unzip minizip \
       libnss-wrapper procps python3" ;;
     *) echo "$1" ;;

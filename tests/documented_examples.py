@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
-"""Runs the examples of docs/integrating.md as they are written there.
+"""Runs the examples of README.md and docs/integrating.md as they are written there.
 
-usage: documented_examples.py PROGRAMS          the shell script
+usage: documented_examples.py PROGRAMS          the README's sessions and the shell script
        documented_examples.py PROGRAMS --wine   the batch file, with the programs for Windows
 """
 import os
@@ -71,13 +71,38 @@ def check_batch_file(programs, scratch, status):
     check_recorded(scratch, pathlib.Path(prefix) / "drive_c/ProgramData/ZEK/ORXHistory", status)
 
 
+def without_variables(line):
+    """A line without what differs between two runs: times, and processes that came and went."""
+    line = re.sub(r"\d{4}-\d\d-\d\d \d\d:\d\d:\d\d( to \d\d:\d\d:\d\d)?", "TIME", line)
+    line = re.sub(r"\b\d+ s\b", "DURATION", line)
+    line = re.sub(r"([+~-]\d+ )+", "CHANGES ", line)
+    line = line.replace(" processes,", "") if line.startswith("unchanged: ") else line
+    return " ".join(line.split())
+
+
+def check_sessions(programs, scratch):
+    """The README's sessions, as one: the lines that it shows come in their order."""
+    session = "".join(blocks("README.md", "console"))
+    steps = re.findall(r"^\$ (.*)\n((?:(?!\$ ).*\n)*)", session, re.M)
+    (scratch / "scripts").symlink_to(REPOSITORY / "scripts")
+    environment = dict(os.environ, PATH=f"{programs}:{os.environ['PATH']}", TMPDIR=str(scratch))
+    run = subprocess.run(["sh", "-ev"], input="".join(f"{command}\n" for command, _ in steps),
+                         cwd=scratch, env=environment, text=True,
+                         stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
+    check(run.returncode == 0, "The README's session failed", run.stdout)
+    printed = iter([without_variables(line) for line in run.stdout.splitlines()])
+    for command, output in steps:
+        for line in [command, *output.splitlines()]:
+            check(without_variables(line) in printed, f"{command}\nlacks: {line}", run.stdout)
+
+
 def main():
     programs = pathlib.Path(sys.argv[1]).resolve()
     if "--wine" in sys.argv:
         cases = [(check_batch_file, programs, status) for status in (0, 3)]
     else:
         cases = [(check_shell_script, programs, status) for status in (0, 3)]
-        cases += [(check_shell_script, None, 0)]
+        cases += [(check_shell_script, None, 0), (check_sessions, programs)]
     for function, *arguments in cases:
         with tempfile.TemporaryDirectory() as scratch:
             function(arguments[0], pathlib.Path(scratch), *arguments[1:])

@@ -1,6 +1,6 @@
 #!/bin/sh
-# Records a whole event of a sample machine in a scratch folder, packs the history.
-# Needs ORXInstallEventLog and the export of the sample's registry beside this script.
+# Records a whole event of a sample machine in a scratch folder, packs the history and reads it back.
+# Needs ORXInstallEventLog, orxhistory, and the registry exports beside this script.
 # The commands that are shown are expanded when they run.
 # shellcheck disable=SC2016
 set -eu
@@ -27,13 +27,8 @@ run 'ORXInstallEventLog -start 42 -Product "ORX Server Build 1907" -Version 9.5 
     -Command "setup.exe /gui" -l $PWD/setup.log -t $PWD/setup.trc -u $PWD/setup.rsp'
 run 'ORXInstallEventLog -logmessage 42 -message "Creating instance ORX95"'
 
-# What the setup program does here: an instance more in the registry.
-cat >> ZEK/Registry.reg <<'END'
-
-[HKEY_LOCAL_MACHINE\SOFTWARE\ZEK\ORX\InstalledCopies\Main\PROFILES\ORX95]
-"Folder"="C:\\ZEK\\ORX95"
-"Protocol"="TCPIP"
-END
+# What the setup program would do: an instance more in the registry.
+cat "$sample/installed.reg" >> ZEK/Registry.reg
 run 'ORXInstallEventLog -end 42 -CopyName Main -Result Successful'
 run 'ORXInstallEventLog -start 43 -Product "ORX Client Build 1907" -Action Install'
 run 'ORXInstallEventLog -report history.zip'
@@ -46,3 +41,6 @@ run 'tail -n 22 ZEK/ORXHistory/Main/42/ORXInstallEvent.Log'
 run 'csplit -s ZEK/ORXHistory/Main/42/ORXInstallEvent.Log "/^1) /" "/^\* End of Snap/" "/^1) /" "/^\*End of Snap/"'
 run 'diff xx01 xx03 || true'
 run 'head -n 22 ZEK/ORXHistory/Summary.txt'
+
+run 'orxhistory --from history.zip list'
+run 'orxhistory --from history.zip changes 42'
