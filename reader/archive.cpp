@@ -28,7 +28,11 @@ std::string WhyNotOpened(const ArchiveBytes& bytes) {
   if (bytes.Size == 0) {
     return "is empty; copy the archive again";
   }
-  return std::string_view(begin, sizeof begin) == "PK\x03\x04"
+  const std::string_view signature(begin, sizeof begin);
+  if (signature == "PK\x05\x06") {
+    return "is an empty archive; name one that holds a history";
+  }
+  return signature == "PK\x03\x04"
              ? "is cut off or damaged: its directory at the end is missing; copy the archive again"
              : "is neither a zip archive nor a folder; name one that holds a history";
 }

@@ -1,5 +1,6 @@
 #include "reader/commands.h"
 
+#include <algorithm>
 #include <fstream>
 #include <functional>
 #include <iostream>
@@ -34,6 +35,11 @@ std::vector<Finding> FindingsOf(const History& history, const Source& source) {
   std::vector<Finding> findings = CheckHistory(history);
   findings.insert(findings.begin(), source.Findings.begin(), source.Findings.end());
   return findings;
+}
+
+bool HasError(const Source& source) {
+  return std::any_of(source.Findings.begin(), source.Findings.end(),
+                     [](const Finding& finding) { return finding.Level == FindingLevel::kError; });
 }
 
 class Session {
@@ -83,6 +89,14 @@ int Session::ForEachHistory(Detail detail, const std::optional<std::string>& ide
       Progress progress("reports");
       source->OnRead = [&progress] { progress.CountOne(); };
       history = ReadHistory(*source, Decoder, detail, identity);
+    }
+    if (Line.What != Command::kCheck && HasError(*source)) {
+      const std::string text = "Not all of " + source->Name + " can be read: ";
+      if (history.Events.empty()) {
+        result = Fail(text + source->Findings.front().Text);
+        continue;
+      }
+      Fail(text + "orxhistory check says what is missing.");
     }
     use(history, *source);
   }
