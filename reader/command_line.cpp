@@ -32,7 +32,7 @@ constexpr CommandText kCommands[] = {
      "The text; upper and lower case are the same"},
     {Command::kCheck, "check", "What is wrong or missing in the history", nullptr, nullptr},
     {Command::kPage, "page", "The whole history as one self-contained page", "FILE.html",
-     "A file that is not there yet"},
+     "Where to; an older page is replaced"},
     {Command::kUnpack, "unpack", "The archive's tree as files", "FOLDER",
      "Where to; made if it is not there"}};
 
