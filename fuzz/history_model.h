@@ -109,17 +109,14 @@ class HistoryModel {
     File.Set(OnOneLine(section), key, OnOneLine(value));
   }
 
-  // As it stands in the file; empty if it does not.
+  // Without the limit of a getter; empty if there is none.
   std::string Stored(const std::string& section, const std::string& key) const {
     return std::string(File.Find(OnOneLine(section), key).value_or(""));
   }
 
-  // As an event's getter gives it.
+  // As an event's getter returns it.
   std::string Read(const std::string& section, const std::string& key) const {
-    std::string value = Stored(section, key);
-    const bool isQuoted = value.size() > 1 && value.front() == value.back() &&
-                          (value.front() == '"' || value.front() == '\'');
-    return isQuoted ? value.substr(1, value.size() - 2).substr(0, 255) : value.substr(0, 255);
+    return Stored(section, key).substr(0, 255);
   }
 
   static std::string OnOneLine(std::string text) {

@@ -64,7 +64,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     text.Set(change.Section, change.Key, change.Value);
     model.Set(change.Section, change.Key, change.Value);
     Require(text.Get() == model.Text());
-    Require(text.Find(change.Section, change.Key) == ProfileModel::Trim(change.Value));
+    Require(text.Find(change.Section, change.Key) == ProfileModel::Clean(change.Value));
   }
   CompareAnswers(text, model, changes);
   // The places that were kept through the changes are those of a fresh reading.

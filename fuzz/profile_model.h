@@ -46,7 +46,7 @@ class ProfileModel {
     if (line == Lines.size()) {
       return std::nullopt;
     }
-    return Trim(std::string_view(Lines[line]).substr(Lines[line].find('=') + 1));
+    return Clean(std::string_view(Lines[line]).substr(Lines[line].find('=') + 1));
   }
 
   void Set(const std::string& section, const std::string& key, const std::string& value) {
@@ -63,6 +63,14 @@ class ProfileModel {
       --place;
     }
     AddAt(place, key + "=" + value + "\n");
+  }
+
+  // A value as it is read: without blanks, then without one pair of quotation marks.
+  static std::string_view Clean(std::string_view raw) {
+    const std::string_view value = Trim(raw);
+    const bool isQuoted = value.size() > 1 && value.front() == value.back() &&
+                          (value.front() == '"' || value.front() == '\'');
+    return isQuoted ? value.substr(1, value.size() - 2) : value;
   }
 
   static std::string_view Trim(std::string_view text) {
