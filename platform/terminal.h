@@ -27,6 +27,6 @@ class Utf8Terminal {
 
  private:
   bool ShowsColours = false;
-  unsigned EarlierCodePage = 0;
-  unsigned long EarlierMode = 0;
+  [[maybe_unused]] unsigned EarlierCodePage = 0;  // only Windows has something to restore
+  [[maybe_unused]] unsigned long EarlierMode = 0;
 };
