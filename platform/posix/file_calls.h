@@ -4,7 +4,6 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include <cstdint>
 #include <cstdio>
 #include <string>
 
@@ -40,20 +39,4 @@ inline bool RemoveFile(const std::string& path) {
 inline bool FlushToDisk(const Descriptor& file) {
   return RetryOnInterrupt([&] { return ::fdatasync(file.Get()); }) == 0 || errno == EINVAL ||
          errno == ENOTSUP || errno == ENOSYS || errno == EROFS;
-}
-
-// Copies bytes from an offset on and returns how many: fewer than asked for at the end of the file,
-// or where reading fails.
-inline size_t ReadAt(const Descriptor& file, uint64_t offset, char* buffer, size_t size) {
-  size_t got = 0;
-  while (got < size) {
-    const ssize_t count = RetryOnInterrupt([&] {
-      return ::pread(file.Get(), buffer + got, size - got, static_cast<off_t>(offset + got));
-    });
-    if (count <= 0) {
-      break;
-    }
-    got += static_cast<size_t>(count);
-  }
-  return got;
 }

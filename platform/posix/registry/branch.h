@@ -1,6 +1,6 @@
 #pragma once
 
-#include <cstdint>
+#include <map>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -8,9 +8,9 @@
 #include "platform/posix/registry/headings.h"
 #include "platform/posix/registry/names.h"
 
-// The keys at and below one key, from one pass over an export: their headings, sorted as in the
-// tree of keys. It takes a fixed number of bytes for each heading, and those of its path. Headings
-// with a path that Windows does not allow are skipped with the lines below them.
+// The keys at and below one key, from one pass over an export. It takes a fixed number of bytes for
+// each heading, and those of its path. A heading with a path that Windows does not allow is skipped
+// with the lines below it.
 class RegistryBranch {
  public:
   // The part of the export from the heading of a key to the next heading.
@@ -29,20 +29,9 @@ class RegistryBranch {
   std::vector<std::string> SubKeyNames(std::string_view path) const;
 
  private:
-  struct Entry {
-    uint32_t PathBegin = 0;  // in Paths
-    uint32_t PathSize = 0;
-    Section Lines;
-    bool IsRemoval = false;
-  };
-
-  bool Take(const RegistryHeading& heading);
-  void ApplyRemovals();
-  std::string_view PathOf(const Entry& entry) const;
+  Section* Take(const RegistryHeading& heading);
   std::string_view BelowTop(std::string_view path) const;
-  std::vector<Entry>::const_iterator FirstAtOrBelow(std::string_view path) const;
 
   std::string Top;
-  std::string Paths;  // below Top, one after the other
-  std::vector<Entry> Entries;
+  std::multimap<std::string, Section, TreeOrder> Sections;  // by the path below Top
 };

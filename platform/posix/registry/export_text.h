@@ -7,6 +7,8 @@
 #include <string>
 #include <string_view>
 
+#include "platform/posix/utf16.h"
+
 // The text of a registry export, in UTF-8 or UTF-16LE. Offsets and sizes count bytes.
 
 // Copies bytes of the export from an offset on and returns how many: fewer than asked for only at
@@ -34,44 +36,6 @@ inline size_t FindCharacter(std::string_view bytes, size_t width, char c, size_t
     at = bytes.find(c, at + 1);
   }
   return std::min(at, bytes.size());
-}
-
-// Writes a character as UTF-8, at most four bytes, and returns the end of what it wrote.
-inline char* PutUtf8(char* out, uint32_t character) {
-  if (character < 0x80) {
-    *out++ = static_cast<char>(character);
-    return out;
-  }
-  constexpr uint32_t firstByte[] = {0, 0xC0, 0xE0, 0xF0};
-  const int moreBytes = character < 0x800 ? 1 : character < 0x10000 ? 2 : 3;
-  *out++ = static_cast<char>(firstByte[moreBytes] | character >> (6 * moreBytes));
-  for (int bits = 6 * (moreBytes - 1); bits >= 0; bits -= 6) {
-    *out++ = static_cast<char>(0x80 | (character >> bits & 0x3F));
-  }
-  return out;
-}
-
-// UTF-16LE as UTF-8. A surrogate without its other half becomes U+FFFD; a last odd byte is dropped.
-inline void NarrowInto(std::string& text, std::string_view utf16) {
-  const size_t units = utf16.size() / 2;
-  const auto unitAt = [&](size_t at) -> uint32_t {
-    return at == units ? 0
-                       : static_cast<uint8_t>(utf16[2 * at]) |
-                             static_cast<uint32_t>(static_cast<uint8_t>(utf16[2 * at + 1])) << 8;
-  };
-  text.resize(units * 3);  // a unit takes at most three bytes
-  char* out = text.data();
-  for (size_t at = 0; at < units; ++at) {
-    uint32_t character = unitAt(at);
-    if (character >> 11 == 0xD800 >> 11) {  // a surrogate
-      const uint32_t next = unitAt(at + 1);
-      const bool isPair = character < 0xDC00 && next >> 10 == 0xDC00 >> 10;
-      character = isPair ? 0x10000 + ((character - 0xD800) << 10) + (next - 0xDC00) : 0xFFFD;
-      at += isPair ? 1 : 0;
-    }
-    out = PutUtf8(out, character);
-  }
-  text.resize(static_cast<size_t>(out - text.data()));
 }
 
 // Bytes of the export as UTF-8, valid or not. The result may be in the buffer.

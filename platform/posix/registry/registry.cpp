@@ -1,31 +1,27 @@
 #include "platform/registry.h"
 
-#include <fcntl.h>
-
 #include <algorithm>
 #include <memory>
 #include <utility>
 
 #include "platform/known_folders.h"
-#include "platform/posix/descriptor.h"
-#include "platform/posix/file_calls.h"
 #include "platform/posix/registry/registry_export.h"
+#include "platform/shared_file.h"
 
 namespace {
 
 ExportFormat ReadFormat(const ByteReader& read) {
-  constexpr std::string_view utf16Mark = "\xFF\xFE";
-  constexpr std::string_view utf8Mark = "\xEF\xBB\xBF";
   char begin[64];
-  std::string_view bytes(begin, read(/*offset=*/0, begin, sizeof begin));
+  const std::string_view bytes(begin, read(/*offset=*/0, begin, sizeof begin));
   ExportFormat format;
-  format.CharacterWidth = bytes.starts_with(utf16Mark) ? 2 : 1;
-  format.Begin = format.CharacterWidth == 2    ? utf16Mark.size()
-                 : bytes.starts_with(utf8Mark) ? utf8Mark.size()
-                                               : 0;
-  bytes.remove_prefix(format.Begin);
+  if (bytes.starts_with("\xFF\xFE")) {
+    format.Begin = format.CharacterWidth = 2;
+  } else if (bytes.starts_with("\xEF\xBB\xBF")) {
+    format.Begin = 3;
+  }
   std::string buffer;
-  format.IsHexTextWide = !Decoded(bytes, format.CharacterWidth, buffer).starts_with("REGEDIT4");
+  const auto text = Decoded(bytes.substr(format.Begin), format.CharacterWidth, buffer);
+  format.IsHexTextWide = !text.starts_with("REGEDIT4");
   return format;
 }
 
@@ -47,21 +43,6 @@ std::string_view BranchTop(std::string_view path) {
   return parent.find('\\') == std::string_view::npos ? path : parent;
 }
 
-// Bytes of a regular file; none of anything else, or of a file that cannot be opened.
-ByteReader ReaderOf(const std::string& path) {
-  // Without O_NONBLOCK a pipe of that name would hold up the run.
-  const auto file = std::make_shared<Descriptor>(RetryOnInterrupt(
-      [&] { return ::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
-  struct stat status = {};
-  if (!file->IsOpen() || !StatusOf(*file, status) || !S_ISREG(status.st_mode)) {
-    return [](uint64_t, char*, size_t) { return size_t{0}; };
-  }
-  return [file](uint64_t offset, char* buffer, size_t size) {
-    const uint64_t left = kLongestExport - std::min(offset, kLongestExport);
-    return ReadAt(*file, offset, buffer, static_cast<size_t>(std::min<uint64_t>(size, left)));
-  };
-}
-
 // Kept for the whole run: the interface has free functions, and to read the export takes long.
 // Another folder, as in tests, makes another registry.
 RegistryExport& MachineRegistry() {
@@ -70,7 +51,10 @@ RegistryExport& MachineRegistry() {
   constexpr int32_t commonAppData = 35;
   const std::string path = GetFolderPath(commonAppData) + "/ZEK/Registry.reg";
   if (path != currentPath) {
-    current.emplace(ReaderOf(path));
+    current.emplace([file = std::make_shared<SharedFile>(path, LinkPolicy::kFollow)](
+                        uint64_t offset, char* buffer, size_t size) {
+      return offset < kLongestExport ? file->ReadAt(offset, buffer, size) : 0;
+    });
     currentPath = path;
   }
   return *current;

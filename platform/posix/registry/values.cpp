@@ -8,8 +8,8 @@
 
 namespace {
 
-// Reads a line part by part, and removes what it has read. After a failure it reads nothing more,
-// and what it returns has no meaning.
+// Reads a line part by part and removes what it has read. After a failure, which the last part may
+// be, what it returns has no meaning.
 class LineParser {
  public:
   LineParser(std::string_view text, bool isHexTextWide)
@@ -21,145 +21,135 @@ class LineParser {
   void Expect(std::string_view word) { Failed = !Take(word); }
   void SkipBlanks() { Text.remove_prefix(std::min(Text.find_first_not_of(" \t"), Text.size())); }
   void SkipLine() { Text.remove_prefix(std::min(Text.find('\n'), Text.size() - 1) + 1); }
-  void TakeLineEnd();
-  std::string TakeName();
-  RegistryData TakeData();
+
+  // Blanks and a comment may come before it.
+  void ExpectLineEnd() {
+    SkipBlanks();
+    if (Text.starts_with(';')) {
+      SkipLine();
+    } else if (!Text.empty() && !Take("\r\n")) {
+      Expect("\n");
+    }
+  }
+
+  // "@" is the value without a name.
+  std::string TakeName() {
+    const std::string_view before = Text;
+    std::string name = Take("@") ? "" : TakeQuoted();
+    Failed = Failed || HasLineBreakSince(before) || IsNameTooLong(name);
+    return name;
+  }
+
+  RegistryData TakeData() {
+    if (Take("dword:")) {
+      return TakeNumber();
+    }
+    return Take("hex") ? TakeHexData() : TakeText();
+  }
 
  private:
-  std::string TakeQuoted();
-  RegistryData TakeText();
-  RegistryData TakeNumber();
-  RegistryData TakeHexData();
-  std::string TakeHexBytes();
-  uint32_t TakeHexNumber(uint32_t largest);
-  void SkipBlanksAndJoints();
   bool HasLineBreakSince(std::string_view before) const {
     return before.find('\n') < before.size() - Text.size();
+  }
+
+  std::string TakeQuoted() {
+    std::string result;
+    for (Expect("\""); !Failed && !Take("\"");) {
+      const size_t plain = std::min(Text.find_first_of("\"\\"), Text.size());
+      result += Text.substr(0, plain);
+      Text.remove_prefix(plain);
+      if (Text.starts_with('\\')) {
+        result += TakeEscaped();
+      }
+      Failed = Text.empty();
+    }
+    return result;
+  }
+
+  // The escapes of line ends are Wine's. A backslash before any other character is one itself.
+  std::string_view TakeEscaped() {
+    const std::string_view escape = Text.substr(0, 2);
+    Text.remove_prefix(escape.size());
+    if (escape == "\\n" || escape == "\\r") {
+      return escape == "\\n" ? "\n" : "\r";
+    }
+    return escape.substr(escape == "\\\\" || escape == "\\\"" ? 1 : 0);
+  }
+
+  // After a text of several lines, what looks like a comment may be the name of the next value:
+  // then the text has no closing quotation mark.
+  RegistryData TakeText() {
+    const std::string_view before = Text;
+    RegistryData data{kRegistryText, TakeQuoted() + '\0'};
+    SkipBlanks();
+    Failed = Failed || (HasLineBreakSince(before) && Text.starts_with(';'));
+    return data;
+  }
+
+  uint32_t TakeHexNumber(uint32_t largest = std::numeric_limits<uint32_t>::max()) {
+    uint32_t number = 0;
+    const auto [stop, error] = std::from_chars(Text.data(), Text.data() + Text.size(), number, 16);
+    Failed = Failed || error != std::errc() || number > largest;
+    Text.remove_prefix(static_cast<size_t>(stop - Text.data()));
+    return number;
+  }
+
+  RegistryData TakeNumber() {
+    SkipBlanks();
+    const uint32_t number = TakeHexNumber();
+    RegistryData data{kRegistryNumber, ""};
+    for (int bits = 0; bits < 32; bits += 8) {
+      data.Bytes += static_cast<char>(number >> bits & 0xFF);
+    }
+    return data;
+  }
+
+  // Blanks, and line breaks after a backslash.
+  void SkipBlanksAndJoints() {
+    for (SkipBlanks(); Take("\\"); SkipBlanks()) {
+      SkipBlanks();
+      Take("\r\n") || Take("\n");
+    }
+  }
+
+  // One or two digits for each byte, with commas between the bytes; possibly none at all.
+  std::string TakeHexBytes() {
+    std::string bytes;
+    SkipBlanksAndJoints();
+    bool isByteNext = Text.find_first_of("0123456789abcdefABCDEF") == 0;
+    while (isByteNext && !Failed) {
+      bytes += static_cast<char>(TakeHexNumber(/*largest=*/0xFF));
+      SkipBlanksAndJoints();
+      isByteNext = Take(",");
+      SkipBlanksAndJoints();
+    }
+    return bytes;
+  }
+
+  // What comes after "hex": the kind of value in parentheses, if it is not binary, and its bytes.
+  RegistryData TakeHexData() {
+    constexpr uint32_t expandableText = 2;
+    constexpr uint32_t binary = 3;
+    constexpr uint32_t multipleText = 7;
+    RegistryData data{binary, ""};
+    if (Take("(")) {
+      data.Type = TakeHexNumber();
+      Expect(")");
+    }
+    Expect(":");
+    data.Bytes = TakeHexBytes();
+    const bool isText =
+        data.Type == kRegistryText || data.Type == expandableText || data.Type == multipleText;
+    if (isText && IsHexTextWide) {
+      NarrowInto(data.Bytes, std::string(data.Bytes));
+    }
+    return data;
   }
 
   std::string_view Text;
   bool IsHexTextWide;
   bool Failed = false;
 };
-
-// Blanks and a comment may come before it.
-void LineParser::TakeLineEnd() {
-  SkipBlanks();
-  if (Text.starts_with(';')) {
-    SkipLine();
-  } else if (!Text.empty() && !Take("\r\n")) {
-    Expect("\n");
-  }
-}
-
-std::string LineParser::TakeQuoted() {
-  std::string result;
-  for (Expect("\""); !Failed && !Take("\"");) {
-    const size_t plain = std::min(Text.find_first_of("\"\\"), Text.size());
-    result += Text.substr(0, plain);
-    Text.remove_prefix(plain);
-    if (Text.starts_with('\\')) {
-      const std::string_view escape = Text.substr(0, 2);
-      result += escape == "\\n"                        ? "\n"
-                : escape == "\\r"                      ? "\r"
-                : escape == "\\\\" || escape == "\\\"" ? escape.substr(1)
-                                                       : escape;
-      Text.remove_prefix(escape.size());
-    }
-    Failed = Text.empty();
-  }
-  return result;
-}
-
-// "@" is the value without a name.
-std::string LineParser::TakeName() {
-  if (Take("@")) {
-    return "";
-  }
-  const std::string_view before = Text;
-  std::string name = TakeQuoted();
-  Failed = Failed || HasLineBreakSince(before) || IsNameTooLong(name);
-  return name;
-}
-
-RegistryData LineParser::TakeText() {
-  const std::string_view before = Text;
-  std::string text = TakeQuoted();
-  SkipBlanks();
-  // After a text of several lines, what looks like a comment may be the name of the next value:
-  // then the text has no closing quotation mark.
-  Failed = Failed || (HasLineBreakSince(before) && Text.starts_with(';'));
-  return {kRegistryText, std::move(text) + '\0'};
-}
-
-uint32_t LineParser::TakeHexNumber(uint32_t largest) {
-  uint32_t number = 0;
-  const auto [stop, error] = std::from_chars(Text.data(), Text.data() + Text.size(), number, 16);
-  Failed = Failed || error != std::errc() || number > largest;
-  Text.remove_prefix(static_cast<size_t>(stop - Text.data()));
-  return number;
-}
-
-RegistryData LineParser::TakeNumber() {
-  SkipBlanks();
-  const uint32_t number = TakeHexNumber(std::numeric_limits<uint32_t>::max());
-  RegistryData data{kRegistryNumber, ""};
-  for (int bits = 0; bits < 32; bits += 8) {
-    data.Bytes += static_cast<char>(number >> bits & 0xFF);
-  }
-  return data;
-}
-
-// Blanks, and line breaks after a backslash.
-void LineParser::SkipBlanksAndJoints() {
-  for (SkipBlanks(); Take("\\"); SkipBlanks()) {
-    SkipBlanks();
-    if (!Take("\r\n")) {
-      Take("\n");
-    }
-  }
-}
-
-// One or two digits for each byte, with commas between the bytes; possibly none at all.
-std::string LineParser::TakeHexBytes() {
-  std::string bytes;
-  SkipBlanksAndJoints();
-  bool isByteNext = Text.find_first_of("0123456789abcdefABCDEF") == 0;
-  while (isByteNext && !Failed) {
-    bytes += static_cast<char>(TakeHexNumber(/*largest=*/0xFF));
-    SkipBlanksAndJoints();
-    isByteNext = Take(",");
-    SkipBlanksAndJoints();
-  }
-  return bytes;
-}
-
-// What comes after "hex": the kind of value in parentheses, if it is not binary, and its bytes.
-RegistryData LineParser::TakeHexData() {
-  constexpr uint32_t binary = 3;
-  RegistryData data{binary, ""};
-  if (Take("(")) {
-    data.Type = TakeHexNumber(std::numeric_limits<uint32_t>::max());
-    Expect(")");
-  }
-  Expect(":");
-  data.Bytes = TakeHexBytes();
-  constexpr uint32_t expandableText = 2;
-  constexpr uint32_t multipleText = 7;
-  const bool isText =
-      data.Type == kRegistryText || data.Type == expandableText || data.Type == multipleText;
-  if (isText && IsHexTextWide) {
-    NarrowInto(data.Bytes, std::string(data.Bytes));
-  }
-  return data;
-}
-
-RegistryData LineParser::TakeData() {
-  if (Take("dword:")) {
-    return TakeNumber();
-  }
-  return Take("hex") ? TakeHexData() : TakeText();
-}
 
 }  // namespace
 
@@ -174,7 +164,7 @@ void RegistryValues::AddLines(std::string_view lines, const ExportFormat& format
     line.SkipBlanks();
     const bool isRemoval = line.Take("-");
     RegistryData data = isRemoval ? RegistryData() : line.TakeData();
-    line.TakeLineEnd();
+    line.ExpectLineEnd();
     if (line.HasFailed()) {
       parser.SkipLine();
       continue;
@@ -189,14 +179,13 @@ void RegistryValues::AddLines(std::string_view lines, const ExportFormat& format
 }
 
 std::vector<std::string> RegistryValues::Names() const {
-  std::vector<std::pair<size_t, std::string_view>> ordered;
+  std::map<size_t, std::string> ordered;
   for (const auto& [name, value] : Values) {
-    ordered.emplace_back(value.Number, name);
+    ordered.emplace(value.Number, name);
   }
-  std::sort(ordered.begin(), ordered.end());
   std::vector<std::string> names;
-  for (const auto& [number, name] : ordered) {
-    names.emplace_back(name);
+  for (auto& [number, name] : ordered) {
+    names.push_back(std::move(name));
   }
   return names;
 }
