@@ -28,7 +28,7 @@ int32_t CComputerInfo::CollectCPUInfo() {
   ProcessorArchitecture = system.ProcessorArchitecture;
   NumberOfProcessors = system.NumberOfProcessors;
   CPU = NameByArchitecture(system);
-  // The type overrules the architecture.
+  // The type has precedence over the architecture.
   switch (system.ProcessorType) {
     case 386:
       CPU = "Intel 386";

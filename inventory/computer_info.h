@@ -6,14 +6,14 @@
 #include "inventory/info.h"
 #include "platform/computer.h"
 
-// What machine this is: its name, its system, its processor. A call that fails leaves its fields
-// as they were, and the block shows them empty.
+// The machine's name, system and processor. A call that fails leaves its fields as they were, and
+// the report shows them empty.
 class CComputerInfo : public Info {
  public:
   int32_t Collect() override;
   int32_t Print() override;
 
-  // The two halves of Collect. 0 on every path.
+  // The two halves of Collect. Both return 0 always.
   int32_t CollectOSInfo();
   int32_t CollectCPUInfo();
 

@@ -128,7 +128,7 @@ void CComputerInfo::AddServerEdition(const SystemVersion& version) {
   const bool isDatacenter = (version.SuiteMask & suiteDatacenter) != 0;
   const bool isEnterprise = (version.SuiteMask & suiteEnterprise) != 0;
   if (version.MajorVersion == 5 && version.MinorVersion == 2) {
-    // The web edition is told by the whole mask, not by its bit.
+    // For the web edition the whole mask counts, not its bit.
     OSName += isDatacenter                      ? " Datacenter Edition "
               : isEnterprise                    ? " Enterprise Edition "
               : version.SuiteMask == suiteBlade ? " Web Edition "
@@ -138,7 +138,7 @@ void CComputerInfo::AddServerEdition(const SystemVersion& version) {
               : isEnterprise ? " Advanced Server "
                              : " Server ";
   } else {
-    // The family name is lost here, for systems newer than these too.
+    // This replaces the name of the family, also for newer systems.
     OSName = isEnterprise ? " Server 4.0, Enterprise Edition " : "Server 4.0 ";
   }
 }

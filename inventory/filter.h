@@ -4,6 +4,6 @@
 #include <string>
 #include <string_view>
 
-// The rule of the filtered lists: a table that begins with "ALL" lets everything through; otherwise
-// one of its entries, case respected, must stand somewhere in the text.
+// Whether a filter table selects a text: always if its first entry is "ALL", else if the text
+// contains one of its entries, case respected. The table must have an entry.
 bool MatchesFilter(std::span<const std::string_view> filter, const std::string& text);

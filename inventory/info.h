@@ -2,16 +2,16 @@
 
 #include <cstdint>
 
-// One piece of the machine's state: gathered into memory, then written to the event log. Objects
-// live for one section of a snapshot. Neither result is looked at: what cannot be gathered is
-// missing from what is printed, and no error text reaches the report.
+// One part of the machine's state: collected into memory, then written to the event log. An object
+// lives for one section of a snapshot. The callers ignore both results: what cannot be collected is
+// missing from the report, and the report contains no error text.
 class Info {
  public:
   virtual ~Info() = default;
 
-  // Gathers the data. 0, or the code of the step that failed.
+  // Collects the data. Returns 0, or the code of the step that failed.
   virtual int32_t Collect() = 0;
 
-  // Writes the data to the CLogger stream.
+  // Writes the data to the CLogger stream. Returns 0.
   virtual int32_t Print() = 0;
 };

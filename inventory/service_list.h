@@ -8,6 +8,7 @@
 
 #include "inventory/info.h"
 
+// Selects the services that are printed, by DisplayName.
 inline constexpr std::array<std::string_view, 2> g_ServiceFilter = {"ORX", "Windows Installer"};
 
 struct CServiceInfo {
@@ -16,11 +17,11 @@ struct CServiceInfo {
   std::string Status;  // the state in words
 };
 
-// The machine's services in the system's order; those whose display names matter to the product
-// family are printed. Without a listing there are none.
+// The machine's services in the system's order, as platform/services.h lists them; none if they
+// cannot be listed.
 class CServicesList : public Info {
  public:
-  // 0, or the system's code for the step that failed.
+  // Returns 0, or the system's code for the step that failed. Waits at most two seconds on Linux.
   int32_t Collect() override;
 
   int32_t Print() override;

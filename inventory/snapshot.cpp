@@ -11,8 +11,8 @@
 #include "products/products_list.h"
 
 // The rows of the user, software and service tables turn left adjustment on at the stream, and it
-// stays on: every later value with a field width is padded on its right. A run that has written no
-// such row yet pads on the left.
+// stays on: every later value with a field width is padded on its right, before the first such row
+// on its left.
 
 namespace {
 

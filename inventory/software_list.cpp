@@ -10,7 +10,7 @@
 #include "platform/registry.h"
 #include "products/registry_value.h"
 
-// A number beyond the range of the result gives the nearest one, whatever the size of a long.
+// Returns the nearest number in range, whatever the size of a long.
 static int32_t ParseNumber(const std::string& text) {
   using Limits = std::numeric_limits<int32_t>;
   const long long number = std::strtoll(text.c_str(), nullptr, 10);

@@ -8,24 +8,27 @@
 
 #include "inventory/info.h"
 
+// Selects the products that are printed, by Publisher.
 inline constexpr std::array<std::string_view, 4> g_PublisherFilter = {
     "Microsoft", "ZEK", "InstallShield", "Orrin Software"};
 
-// What the machine's installer records of one product; a missing value is empty.
+// The record that Windows Installer keeps of one product. The texts are the values of these names
+// as the registry has them; one that is missing or longer than 99 bytes is empty.
 struct CProductInfo {
   std::string DisplayName;
   std::string DisplayVersion;
-  std::string InstallDate;
+  std::string InstallDate;  // usually year, month and day: "20200131"
   std::string InstallLocation;
   std::string Publisher;
-  int32_t Language = 0;  // 0 for a text that does not begin with a number
+  int32_t Language = 0;  // the number of a locale; 0 if it is missing or no number
 };
 
-// The software installed for all users of the machine, in the registry's order; those of the
-// publishers of interest are printed.
+// The software installed for all users of the machine, in the registry's order.
 class CProductsList : public Info {
  public:
+  // Appends to Products. Returns 0.
   int32_t Collect() override;
+
   int32_t Print() override;
   bool Matches(const CProductInfo& product) const;
 

@@ -6,13 +6,14 @@
 
 #include "inventory/info.h"
 
+// One member of one group. A name that is too long for the system's buffer is empty.
 struct CGroupMember {
-  std::string Member;  // with its domain in a local group, without in a global one
-  std::string Group;
+  std::string Member;  // "DOMAIN\name" in a local group, "name" in a global one
+  std::string Group;   // as in LocalGroups or GlobalGroups
 };
 
-// The user that runs the tool and the machine's groups with their members, all in the system's
-// order. Global groups are asked for on every machine, and printed on a domain controller only.
+// The user that runs the tool, and the machine's groups with their members, in the system's order.
+// Global groups are collected on every machine and printed on a domain controller only.
 class CUsersList : public Info {
  public:
   CUsersList();
@@ -20,21 +21,22 @@ class CUsersList : public Info {
   int32_t Collect() override;
   int32_t Print() override;
 
-  // Empties the four lists.
+  // Empties the four lists. LoggedOnUser stays.
   void Clear();
 
-  // The steps of Collect. One that fails leaves its list empty; members come from the groups that
-  // were listed before.
+  // The steps of Collect. One that fails leaves its list empty. The members are those of the groups
+  // that an earlier step has listed.
   void CollectLoggedOnUser();
   void CollectLocalGroups();
   void CollectLocalMembers();
   void CollectGlobalGroups();
   void CollectGlobalMembers();
 
-  // Two backslashes and the computer name: the one server that is ever asked. Empty, which means
-  // this machine too, if the name cannot be told.
+  // Two backslashes and the computer name: the only server that is asked. Empty, which means this
+  // machine too, if the name is not known.
   std::string ServerName;
-  std::string LoggedOnUser;
+
+  std::string LoggedOnUser;  // "DOMAIN\name"; "name" if the domain is not known; or empty
   std::vector<std::string> LocalGroups;
   std::vector<CGroupMember> LocalMembers;
   std::vector<std::string> GlobalGroups;

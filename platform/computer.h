@@ -6,8 +6,8 @@
 
 // What machine and system this is.
 
-// The machine's short (NetBIOS) name; nothing if it has 15 characters or more.
-// Windows: GetComputerNameA with a size of 15. POSIX: the host name up to its first point.
+// The machine's short (NetBIOS) name; nothing if it is empty or has more than 14 bytes.
+// Windows: GetComputerNameA with a size of 15. POSIX: the host name (uname) up to its first dot.
 std::optional<std::string> ShortComputerName();
 
 enum class VersionForm {
@@ -20,7 +20,7 @@ struct SystemVersion {
   uint32_t MinorVersion = 0;
   uint32_t BuildNumber = 0;
   uint32_t PlatformID = 0;  // Windows: 0, 1 or 2. POSIX: a number that is none of these
-  std::string ServicePack;  // the system's own version text
+  std::string ServicePack;  // a text of the system; POSIX: the kernel's name and release
   uint16_t ServicePackMajor = 0;
   uint16_t ServicePackMinor = 0;
   uint16_t SuiteMask = 0;
@@ -28,7 +28,7 @@ struct SystemVersion {
 };
 
 // Nothing if the system does not know the form.
-// Windows: GetVersionExA. POSIX: uname, its name and release as the service pack text.
+// Windows: GetVersionExA. POSIX: uname; the extended form only.
 std::optional<SystemVersion> QuerySystemVersion(VersionForm form);
 
 struct SystemInfo {
@@ -38,5 +38,6 @@ struct SystemInfo {
   uint16_t ProcessorLevel = 0;  // the processor family
 };
 
-// Windows: GetSystemInfo. POSIX: uname, sysconf, /proc/cpuinfo.
+// Always succeeds; what the system does not know is 0, or 0xFFFF for the architecture, and there is
+// at least one processor. Windows: GetSystemInfo. POSIX: uname, sysconf, /proc/cpuinfo.
 SystemInfo QuerySystemInfo();

@@ -5,22 +5,23 @@
 #include <string>
 #include <vector>
 
-// The running processes, in the two ways in which Windows systems tell them.
+// The running processes, in the two ways that Windows systems have to list them.
 
 // Windows: GetCurrentProcessId. POSIX: getpid.
 uint32_t OwnProcessID();
 
 // The IDs of all processes, at most 8192, in the system's order. Nothing if the system lacks the
-// service. Windows: EnumProcesses of psapi.dll, looked up at run time. POSIX: the folders of /proc.
+// service. Windows: EnumProcesses of psapi.dll, looked up at run time. POSIX: the entries of /proc
+// that are numbers.
 std::optional<std::vector<uint32_t>> ListProcessIDs();
 
 struct ProcessModule {
-  std::string BaseName;  // file name without folder, below 260 bytes; empty if it cannot be read
+  std::string BaseName;  // file name without folder, at most 259 bytes; empty if it cannot be read
 };
 
-// The executable of a process; nothing if the process may not be looked at or is gone.
+// The executable of a process; nothing if the user may not look at the process or it has ended.
 // Windows: OpenProcess with access 0x410, EnumProcessModules, GetModuleBaseNameA. POSIX: the link
-// /proc/ID/exe.
+// /proc/ID/exe, without the " (deleted)" that the kernel adds to it.
 std::optional<ProcessModule> FirstModuleOf(uint32_t processID);
 
 struct ProcessEntry {
@@ -29,7 +30,7 @@ struct ProcessEntry {
   std::string ExecutableFile;  // with its folder
 };
 
-// A snapshot of all processes, as Windows 95 and its followers give it. Nothing if the system
-// lacks the service. Windows: CreateToolhelp32Snapshot, Process32First and Process32Next of
+// A snapshot of all processes, as Windows 95, 98 and Me list them. Nothing if the system lacks the
+// service. Windows: CreateToolhelp32Snapshot, Process32First and Process32Next of
 // kernel32.dll, looked up at run time. POSIX: always nothing.
 std::optional<std::vector<ProcessEntry>> SnapshotProcesses();

@@ -5,16 +5,21 @@
 #include <string>
 #include <vector>
 
-// Read access to the registry below HKEY_LOCAL_MACHINE. A key path has single backslashes between
-// its components and none at either end. Names are found without regard to case and given back as
+// Read access to the registry below HKEY_LOCAL_MACHINE. A key path is names with one backslash
+// between them; one at its end is ignored. Names are found without regard to case and returned as
 // the registry holds them. What cannot be opened is empty.
-// Windows: RegOpenKeyExA, RegQueryValueExA, RegEnumValueA, RegEnumKeyExA, RegCloseKey. POSIX: the
-// registry export ZEK/Registry.reg below the common application data folder, read once.
+//
+// Windows: RegOpenKeyExA, RegQueryValueExA, RegEnumValueA, RegEnumKeyExA, RegCloseKey.
+// POSIX: the registry export ZEK/Registry.reg below the common application data folder, opened with
+// the first question and read once for each part of the registry that is asked for; so a run sees
+// one state of it. Only the letters A to Z have two cases. docs/registry-export.md has its format.
 
 inline constexpr uint32_t kRegistryText = 1;    // REG_SZ
 inline constexpr uint32_t kRegistryNumber = 4;  // REG_DWORD
 
-// What the caller asks to be allowed; a key is opened only if all of it is granted.
+// The rights with which a key is opened. Windows opens it only if the user has all of them, so a
+// user without the right to set values reads nothing with kReadAndSet. POSIX: ignored; the right to
+// read the file decides.
 enum class RegistryAccess : uint32_t {
   kQueryValue = 0x1,      // KEY_QUERY_VALUE
   kReadAndSet = 0x2001B,  // KEY_READ with KEY_SET_VALUE
@@ -25,8 +30,9 @@ struct RegistryData {
   std::string Bytes;  // the stored data; empty if it is longer than the limit
 };
 
-// One value. Text comes as narrow text with its terminating zero, if it is stored with one; a
-// number as four bytes, lowest first. The limit counts bytes of that form, terminator included.
+// One value. Text is returned as narrow text (POSIX: UTF-8), with its terminating zero if it is
+// stored with one; a number as four bytes, lowest first. The limit counts bytes of that form,
+// terminator included.
 RegistryData ReadRegistryData(const std::string& keyPath, const std::string& valueName,
                               size_t limit, RegistryAccess access);
 

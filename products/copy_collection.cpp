@@ -1,3 +1,5 @@
+#include <utility>
+
 #include "platform/registry.h"
 #include "products/copy_generation.h"
 #include "products/copy_records.h"
@@ -22,7 +24,7 @@ void AppendInstances(const std::string& copyName, const std::string& keyPath,
   for (const std::string& name : EnumRegistrySubKeys(keyPath)) {
     Instance instance(copyName, name);
     instance.Collect();
-    instances.push_back(instance);
+    instances.push_back(std::move(instance));
   }
 }
 

@@ -6,10 +6,10 @@
 
 #include "products/parameter.h"
 
-// What the registry holds of one installed copy of the product family. Every record owns all that
-// is in it and knows its copy by name alone. Each Collect fills a new record under the copy
-// generation in force (products/copy_generation.h); what the registry lacks stays empty.
-// (products/copy_collection.cpp; the report is in products/copy_report.cpp)
+// What the registry has about one installed copy of the product family. A record owns its contents
+// and refers to its copy by name. Each Collect fills a new record from the layout that
+// products/copy_generation.h selects; what the registry does not have stays empty.
+// products/copy_collection.cpp implements it, products/copy_report.cpp the report.
 
 struct CORXVersion {
   std::string Version;
@@ -22,7 +22,7 @@ struct CORXProduct {
   CORXProduct(const std::string& copyName, const std::string& name);
   void Collect();
 
-  std::string Name;  // of the product's key, its leading "ORX " included
+  std::string Name;  // of the product's key, with its leading "ORX "
   std::string CopyName;
   std::string Description;  // collected, not part of the report
   std::string LastModifiedDate;
@@ -59,8 +59,8 @@ struct CORXCopy {
   void CollectAdmInstances();
   void AddProduct(const CORXProduct& product);
 
-  // Writes the copy's block to the CLogger stream. Fields are padded as the stream's adjustment
-  // says, which the report leaves alone.
+  // Writes the copy's block to the CLogger stream. The stream's adjustment decides on which side
+  // fields are padded.
   void Print() const;
   void PrintGlobalProfiles() const;
   void PrintProducts() const;
@@ -71,6 +71,6 @@ struct CORXCopy {
   CORXVersion VersionInfo;  // collected, not part of the report
   std::vector<CADMInstance> AdmInstances;
   std::vector<CORXProduct> Products;
-  int32_t Generation = 0;  // the copy generation that the record was filled under
+  int32_t Generation = 0;  // the copy generation at the time of Collect
   std::string Name;
 };

@@ -1,6 +1,7 @@
 #include "products/odbc_drivers.h"
 
 #include <iomanip>
+#include <utility>
 
 #include "eventlog/logger.h"
 #include "platform/registry.h"
@@ -17,7 +18,7 @@ void CODBCDriversList::Collect() {
     if (name.find("ZEK ORX") != std::string::npos) {
       CODBCDriver driver(name);
       driver.Collect();
-      Drivers.push_back(driver);
+      Drivers.push_back(std::move(driver));
     }
   }
 }

@@ -3,11 +3,12 @@
 #include <string>
 #include <vector>
 
-// One value of a profile or of an ODBC driver.
+// One registry value of a profile or of an ODBC driver.
 struct CParameter {
-  std::string Name;
-  std::string Value;  // empty for a kind of value that is neither text nor number
+  std::string Name;   // at most 255 bytes; empty for the value without a name
+  std::string Value;  // as ReadRegistryValue returns it: empty if neither a text nor a number
 };
 
-// Appends every value of a key, in the registry's order; nothing for a key that cannot be read.
+// Appends the values of a key below HKEY_LOCAL_MACHINE, in the registry's order, to the first name
+// of more than 255 bytes; nothing if the key cannot be read.
 void AppendParameters(const std::string& keyPath, std::vector<CParameter>& parameters);

@@ -1,5 +1,7 @@
 #include "products/products_list.h"
 
+#include <utility>
+
 #include "eventlog/logger.h"
 #include "platform/registry.h"
 #include "products/copy_generation.h"
@@ -10,7 +12,7 @@ int32_t CORXProductsList::Collect() {
       CORXCopy copy(name);
       copy.Generation = GetCopyGeneration();
       copy.Collect();
-      Copies.push_back(copy);
+      Copies.push_back(std::move(copy));
     }
   }
   return 0;

@@ -6,17 +6,16 @@
 #include "inventory/info.h"
 #include "products/copy_records.h"
 
-// The installed copies of the product family, in one registry layout at a time: the copy
-// generation in force (products/copy_generation.h) tells Collect where to look and Print which of
-// the two reports to write.
+// The installed copies of the product family, in one of two registry layouts. The copy generation
+// (products/copy_generation.h) selects the layout for Collect and the report for Print.
 class CORXProductsList : public Info {
  public:
-  // Appends the copies to what the list holds, in the registry's order. Always 0.
+  // Appends the copies, in the registry's order. Returns 0.
   int32_t Collect() override;
 
   int32_t Print() override;
 
-  // Between the two layouts, so that the copies of one do not stand in the report of the other.
+  // Empties the list. Needed between the two layouts, as Collect appends.
   void Clear();
 
   std::vector<CORXCopy> Copies;

@@ -4,7 +4,7 @@
 
 #include "platform/registry.h"
 
-// Empty for data that is no number of 32 bits.
+// Empty for data that is not a number of 32 bits.
 static std::string SignedDigits(const std::string& bytes) {
   if (bytes.size() != sizeof(uint32_t)) {
     return "";

@@ -2,7 +2,7 @@
 
 #include <string>
 
-// The data of one registry value as text: of a text, what stands in front of its first zero byte;
-// of a number, its decimal digits as a signed one. Empty for a value of any other kind, for a value
-// or key that is missing, and for data of more than 100 bytes, terminator included.
+// The data of one registry value below HKEY_LOCAL_MACHINE as text: a text up to its first zero
+// byte; a number in decimal digits, as a signed one. Empty for a value of any other kind, for a
+// missing value or key, and for data of more than 100 bytes, terminator included.
 std::string ReadRegistryValue(const std::string& keyPath, const std::string& valueName);

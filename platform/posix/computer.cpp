@@ -42,7 +42,7 @@ static uint16_t ArchitectureCode(std::string_view machine) {
   return 0xFFFF;
 }
 
-// The number behind "cpu family" of the first processor; 0 without one, as on other architectures.
+// The number after "cpu family" of the first processor; 0 without one, as on other architectures.
 static uint16_t ProcessorFamily() {
   const std::string text = ReadTextFile("/proc/cpuinfo").value_or("");
   const size_t line = text.find("cpu family");

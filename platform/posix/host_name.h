@@ -2,5 +2,5 @@
 
 #include <string>
 
-// The host name up to its first point, whatever its length; empty if the kernel does not tell it.
+// The host name up to its first dot, of any length; empty if the kernel has none.
 std::string HostName();

@@ -46,19 +46,14 @@ std::string_view RegistryBranch::BelowTop(std::string_view path) const {
 
 std::vector<RegistryBranch::Section> RegistryBranch::SectionsOf(std::string_view path) const {
   std::vector<Section> sections;
-  if (!IsKeyPath(path)) {
-    return sections;
-  }
   const auto [first, last] = Sections.equal_range(BelowTop(path));
-  std::transform(first, last, std::back_inserter(sections),
-                 [](const auto& entry) { return entry.second; });
+  for (auto entry = first; entry != last; ++entry) {
+    sections.push_back(entry->second);
+  }
   return sections;
 }
 
 std::vector<std::string> RegistryBranch::SubKeyNames(std::string_view path) const {
-  if (!IsKeyPath(path)) {
-    return {};
-  }
   const std::string_view parent = BelowTop(path);
   std::vector<std::pair<uint32_t, std::string_view>> firsts;  // of each subkey its first heading
   for (auto entry = Sections.upper_bound(parent);

@@ -13,12 +13,9 @@ namespace {
 ExportFormat ReadFormat(const ByteReader& read) {
   char begin[64];
   const std::string_view bytes(begin, read(/*offset=*/0, begin, sizeof begin));
-  ExportFormat format;
-  if (bytes.starts_with("\xFF\xFE")) {
-    format.Begin = format.CharacterWidth = 2;
-  } else if (bytes.starts_with("\xEF\xBB\xBF")) {
-    format.Begin = 3;
-  }
+  const bool isWide = bytes.starts_with("\xFF\xFE");
+  const size_t markSize = isWide ? 2 : bytes.starts_with("\xEF\xBB\xBF") ? 3 : 0;
+  ExportFormat format{markSize, isWide ? size_t{2} : size_t{1}};
   std::string buffer;
   const auto text = Decoded(bytes.substr(format.Begin), format.CharacterWidth, buffer);
   format.IsHexTextWide = !text.starts_with("REGEDIT4");
@@ -26,15 +23,16 @@ ExportFormat ReadFormat(const ByteReader& read) {
 }
 
 std::vector<std::string> NamesThatFit(std::vector<std::string> names) {
-  constexpr size_t longest = 255;
-  names.erase(std::find_if(names.begin(), names.end(),
-                           [](const std::string& name) { return name.size() > longest; }),
-              names.end());
+  const auto isTooLong = [](const std::string& name) { return name.size() > 255; };
+  names.erase(std::find_if(names.begin(), names.end(), isTooLong), names.end());
   return names;
 }
 
-std::string_view WithoutLastBackslash(std::string_view path) {
-  return path.substr(0, path.size() - (path.ends_with('\\') ? 1 : 0));
+// A backslash at the end of a path is ignored. What is no path of a key then names one that no
+// export has.
+std::string_view KeyPathOf(std::string_view path) {
+  path.remove_suffix(path.ends_with('\\') ? 1 : 0);
+  return IsKeyPath(path) ? path : "\\\\";
 }
 
 // The keys beside one are likely to be asked for next. The parent of two names is a hive.
@@ -48,8 +46,7 @@ std::string_view BranchTop(std::string_view path) {
 RegistryExport& MachineRegistry() {
   static std::string currentPath;
   static std::optional<RegistryExport> current;
-  constexpr int32_t commonAppData = 35;
-  const std::string path = GetFolderPath(commonAppData) + "/ZEK/Registry.reg";
+  const std::string path = GetFolderPath(kCommonAppDataFolder) + "/ZEK/Registry.reg";
   if (path != currentPath) {
     current.emplace([file = std::make_shared<SharedFile>(path, LinkPolicy::kFollow)](
                         uint64_t offset, char* buffer, size_t size) {
@@ -92,19 +89,17 @@ const RegistryValues& RegistryExport::ValuesOf(std::string_view path) {
 
 RegistryData RegistryExport::Read(const std::string& keyPath, const std::string& valueName,
                                   size_t limit) {
-  const RegistryData* data = ValuesOf(WithoutLastBackslash(keyPath)).Find(valueName);
-  if (data == nullptr) {
-    return {};
-  }
-  return data->Bytes.size() > limit ? RegistryData{data->Type, ""} : *data;
+  const RegistryData* found = ValuesOf(KeyPathOf(keyPath)).Find(valueName);
+  const RegistryData data = found == nullptr ? RegistryData() : *found;
+  return data.Bytes.size() > limit ? RegistryData{data.Type, ""} : data;
 }
 
 std::vector<std::string> RegistryExport::ValueNames(const std::string& keyPath) {
-  return NamesThatFit(ValuesOf(WithoutLastBackslash(keyPath)).Names());
+  return NamesThatFit(ValuesOf(KeyPathOf(keyPath)).Names());
 }
 
 std::vector<std::string> RegistryExport::SubKeyNames(const std::string& keyPath) {
-  const std::string_view path = WithoutLastBackslash(keyPath);
+  const std::string_view path = KeyPathOf(keyPath);
   return NamesThatFit(BranchOf(path).SubKeyNames(path));
 }
 

@@ -128,10 +128,8 @@ class LineParser {
 
   // What comes after "hex": the kind of value in parentheses, if it is not binary, and its bytes.
   RegistryData TakeHexData() {
-    constexpr uint32_t expandableText = 2;
-    constexpr uint32_t binary = 3;
-    constexpr uint32_t multipleText = 7;
-    RegistryData data{binary, ""};
+    enum : uint32_t { kExpandableText = 2, kBinary = 3, kMultipleText = 7 };
+    RegistryData data{kBinary, ""};
     if (Take("(")) {
       data.Type = TakeHexNumber();
       Expect(")");
@@ -139,7 +137,7 @@ class LineParser {
     Expect(":");
     data.Bytes = TakeHexBytes();
     const bool isText =
-        data.Type == kRegistryText || data.Type == expandableText || data.Type == multipleText;
+        data.Type == kRegistryText || data.Type == kExpandableText || data.Type == kMultipleText;
     if (isText && IsHexTextWide) {
       NarrowInto(data.Bytes, std::string(data.Bytes));
     }
