@@ -4,10 +4,12 @@
     compare-windows.py WINDOWS_PROGRAM LINUX_PROGRAM SCRATCH_FOLDER
 
 Exit results, output, history files, reports, summaries and archives must be the same, but for
-separators, line ends, times and what shows the machine itself. Ends with 1 and the differences.
+separators, line ends, times and what shows the machine itself. The readers beside the programs must
+give the same answers for an archive. Ends with 1 and the differences.
 WINEPREFIX names a Windows of its own: its history and its registry keys of the tool are replaced.
 """
 import difflib
+import json
 import os
 import re
 import shutil
@@ -320,12 +322,42 @@ def run_killed(side):
     return "whole"
 
 
-def compare(name, run, windows, linux):
-    texts = [run(side).split("\n") for side in (windows, linux)]
+def read_archive(side, readers):
+    """What both builds of the reader say of the side's archive, each in a text."""
+    folder = side.files
+
+    def read(reader, *arguments):
+        process = subprocess.run(
+            reader + ["--from", "out.zip", *arguments], cwd=folder, stdin=subprocess.DEVNULL,
+            stdout=subprocess.PIPE, stderr=subprocess.DEVNULL, check=False)
+        output = process.stdout.decode("utf-8").replace("\r\n", "\n")
+        return "%s\nresult %d: %s" % (arguments, process.returncode, output)
+
+    events = [json.loads(line)["event"] for line in subprocess.run(
+        readers[1] + ["--from", "out.zip", "list", "--json"], cwd=folder, stdout=subprocess.PIPE,
+        check=True).stdout.splitlines()]
+    calls = [["list", "--json"], ["list"], ["check", "--json"], ["find", "--json", "e"]]
+    calls += [["show", "--json", "--", event] for event in dict.fromkeys(events)]
+    return ["\n".join(read(reader, *call) for call in calls) for reader in readers]
+
+
+def same_texts(name, texts):
+    texts = [text.split("\n") for text in texts]
     difference = list(difflib.unified_diff(*texts, "Windows", "Linux", lineterm="", n=2))
     print("%-40s %s (%d lines)" % (name, "differs" if difference else "same", len(texts[0])))
     print("\n".join(difference[:60]), end="\n" if difference else "")
     return not difference
+
+
+def compare(name, run, windows, linux):
+    return same_texts(name, [run(side) for side in (windows, linux)])
+
+
+def compare_readers(windows, linux, readers):
+    """Both builds of the reader over the archives that the scenario has left."""
+    return all([same_texts("  read, archive of " + system, read_archive(side, readers))
+                for system, side in (("Windows", windows), ("Linux", linux))
+                if os.path.exists(os.path.join(side.files, "out.zip"))])
 
 
 def main():
@@ -348,13 +380,17 @@ def main():
         file.write(sample)
     load_registry(windows, export)
     export_registry(windows, export)
-    same = [compare("the sample machine", lambda s: run_steps(s, WHOLE_EVENT), windows, linux)]
+    readers = [[WINE, os.path.join(os.path.dirname(windows_program), "orxhistory.exe")],
+               [os.path.join(os.path.dirname(linux_program), "orxhistory")]]
+    same = [compare("the sample machine", lambda s: run_steps(s, WHOLE_EVENT), windows, linux),
+            compare_readers(windows, linux, readers)]
 
     with open(export, "wb") as file:
         file.write(limits_export())
     load_registry(windows, export)
     for name, steps in SCENARIOS.items():
         same.append(compare(name, lambda s: run_steps(s, steps), windows, linux))
+    same.append(compare_readers(windows, linux, readers))
     same.append(compare("section names at the limit", run_section_names, windows, linux))
     same.append(compare("overlapping starts", run_overlapping, windows, linux))
     same.append(compare("killed starts", run_killed, windows, linux))
