@@ -12,7 +12,7 @@ enum class FileKind {
 };
 
 // The kind of the file at the path; of a symbolic link, that of its target.
-// Windows: _stat64, and CreateFileA to tell a file from a device. POSIX: stat.
+// Windows: CreateFileA and GetFileInformationByHandle, else GetFileAttributesA. POSIX: stat.
 FileKind KindOf(const std::string& path);
 
 // True if the last part of the path is a symbolic link or, on Windows, a junction. False if nothing

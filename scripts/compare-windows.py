@@ -89,8 +89,10 @@ class Side:
         with zipfile.ZipFile(path) as archive:
             entries = {}
             for info in archive.infolist():
-                assert self.separator == "/" or "/" not in info.filename, info.filename
-                name = info.filename.replace("\\", "/")
+                # The names have no mark for their code page, so that they come decoded as cp437.
+                name = info.filename.encode("cp437").decode(self.encoding)
+                assert self.separator == "/" or "/" not in name, name
+                name = name.replace("\\", "/")
                 assert "/" not in name or name.rsplit("/", 1)[0] in entries, name
                 kind = "folder" if info.external_attr & 0x10 else "file"
                 entries[name] = "%s, read-only %d:\n%s" % (
@@ -258,6 +260,12 @@ SCENARIOS = {
         ["-end", "4", "-CopyName", "C", "-l", "{files}/ORXInstallEvent.Log"]] + REPORT + REPORT,
 }
 
+# In code page 932 the second byte of 表 is that of a backslash.
+JAPANESE = [
+    ["-start", "1", "-Product", "製品表", "-l", "{files}/予定表.log"],
+    ["-end", "1", "-CopyName", "試験表", "-Result", "成功表"],
+    ["-start", "表", "-t", "{files}/表/予定表.log"], ["-end", "表", "-CopyName", "C"]] + REPORT
+
 
 def outcome(side, outputs):
     return "\n".join(outputs + list(side.tree()) + list(side.archive()))
@@ -265,10 +273,12 @@ def outcome(side, outputs):
 
 def run_steps(side, steps):
     side.reset()
-    os.makedirs(os.path.join(side.files, "sub"))
-    for name in ("setup.log", "sub/setup.log", "setup.rsp", "setup.trc", "ORXInstallEvent.Log"):
-        with open(os.path.join(side.files, name), "w", encoding="ascii") as file:
-            file.write("the installer's " + name)
+    for name in ("sub", "表"):
+        os.makedirs(os.path.join(side.files, name))
+    for name in ("setup.log", "sub/setup.log", "setup.rsp", "setup.trc", "ORXInstallEvent.Log",
+                 "予定表.log", "表/予定表.log"):
+        with open(os.path.join(side.files, name), "w", encoding="utf-8") as file:
+            file.write("the installer's file of %d letters" % len(name))
     return outcome(side, [side.run(step) for step in steps])
 
 
@@ -299,6 +309,29 @@ def run_overlapping(side):
         name = item.split(":\n", 1)[0]
         results += sorted(item.split(separators[name])) if name in separators else [item]
     return "\n".join(results)
+
+
+def run_links(side):
+    """A link in place of the history folder, then of the maker's: nothing is written through it."""
+    texts = []
+    target = os.path.join(side.files, "elsewhere")
+    for linked in (side.history, side.maker):
+        side.reset()
+        os.makedirs(os.path.join(target, "ORXHistory"))
+        kept = linked + ".kept"
+        if os.path.exists(linked):
+            os.rename(linked, kept)
+        os.symlink(target, linked)
+        try:
+            texts += [side.run(step) for step in WHOLE_EVENT[:1] + REPORT]
+        finally:
+            os.unlink(linked)
+            if os.path.exists(kept):
+                os.rename(kept, linked)
+        names = sorted(name for _, folders, files in os.walk(target) for name in folders + files)
+        texts.append("elsewhere: %s" % names)
+        assert names == ["ORXHistory"], names
+    return "\n".join(texts)
 
 
 def run_killed(side):
@@ -391,6 +424,13 @@ def main():
     for name, steps in SCENARIOS.items():
         same.append(compare(name, lambda s: run_steps(s, steps), windows, linux))
     same.append(compare_readers(windows, linux, readers))
+    same.append(compare("links in place of the folders", run_links, windows, linux))
+    windows.environment["ORX_LOCALE"] = "ja_JP.UTF-8"
+    windows.encoding = "cp932"
+    same.append(compare("second bytes like separators", lambda s: run_steps(s, JAPANESE), windows,
+                        linux))
+    del windows.environment["ORX_LOCALE"]
+    windows.encoding = "cp1252"
     same.append(compare("section names at the limit", run_section_names, windows, linux))
     same.append(compare("overlapping starts", run_overlapping, windows, linux))
     same.append(compare("killed starts", run_killed, windows, linux))

@@ -20,8 +20,33 @@ for import in $imports; do
   esac
 done
 
+# Locales whose code pages Wine takes: 932, where the second byte of a character can be that of a
+# separator, and 1251.
+export LOCPATH="$PWD/build/locale"
+mkdir -p "$LOCPATH"
+for language in ja_JP ru_RU; do
+  localedef -f UTF-8 -i "$language" "$LOCPATH/$language.UTF-8"
+done
+
 export WINEPREFIX="$PWD/build/wine"
 rm -rf "$WINEPREFIX"
 scripts/wine.sh wineboot --init
 trap 'wineserver --kill || true' EXIT  # it may have ended by itself
+
+# The unit tests once more, without the runs of the program, which ctest does.
+run_unit_tests() {
+  for tests in orx_tests orx_platform_tests; do
+    scripts/wine.sh "build/windows/tests/$tests.exe" --gtest_brief=1 --gtest_filter=-Run.*
+  done
+}
+for language in ja_JP ru_RU; do
+  echo "Unit tests: $language"
+  ORX_LOCALE="$language.UTF-8" run_unit_tests
+done
+for version in vista win7 win8 win81 win10; do
+  echo "Unit tests: $version"
+  scripts/wine.sh reg add 'HKCU\Software\Wine' /v Version /d "$version" /f > /dev/null
+  run_unit_tests
+done
+
 ctest --preset windows

@@ -3,7 +3,8 @@
 # and without the questions of a first start.
 set -eu
 export WINEPREFIX="${WINEPREFIX:-$(cd "$(dirname "$0")/.." && pwd)/build/wine}"
-export WINEARCH=win64 WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml,winemenubuilder.exe="
-export LC_ALL=C.UTF-8  # for the code page of Western Europe
+export WINEARCH=win64 WINEDEBUG=-all
+export WINEDLLOVERRIDES="${WINEDLLOVERRIDES:+$WINEDLLOVERRIDES;}mscoree,mshtml,winemenubuilder.exe="
+export LC_ALL="${ORX_LOCALE:-C.UTF-8}"  # decides the code page: without it that of Western Europe
 unset DISPLAY
 exec wine "$@"

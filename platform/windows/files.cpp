@@ -1,7 +1,5 @@
 #include "platform/files.h"
 
-#include <sys/stat.h>
-
 #include <algorithm>
 #include <cstdint>
 
@@ -25,17 +23,18 @@ static std::optional<BY_HANDLE_FILE_INFORMATION> IdentityOf(const std::string& p
   return identity;
 }
 
+// Not _stat, which takes a second byte that equals a backslash for a separator at the end.
 FileKind KindOf(const std::string& path) {
-  struct _stat64 status = {};
-  if (::_stat64(path.c_str(), &status) != 0) {
+  const auto identity = IdentityOf(path);
+  const DWORD attributes =
+      identity ? identity->dwFileAttributes : ::GetFileAttributesA(path.c_str());
+  if (attributes == INVALID_FILE_ATTRIBUTES) {
     return FileKind::kNone;
   }
-  const int kind = status.st_mode & _S_IFMT;
-  if (kind == _S_IFDIR) {
+  if ((attributes & FILE_ATTRIBUTE_DIRECTORY) != 0) {
     return FileKind::kFolder;
   }
-  // The status of a name like "CON" can be that of a file.
-  return kind == _S_IFREG && IdentityOf(path) ? FileKind::kFile : FileKind::kOther;
+  return identity ? FileKind::kFile : FileKind::kOther;  // a device has attributes too
 }
 
 bool IsSymbolicLink(const std::string& path) {

@@ -102,6 +102,7 @@ TEST_F(Run, CountsWhileAProgramOpensTheHistoryFileAgainAndAgain) {
   EXPECT_EQ(ReadProfileInt(GetHistoryFilePath(), "History", "Count", 0), starts);
 }
 
+// Under Wine this needs WINEDLLOVERRIDES, as in CMakeLists.txt: else its own libraries come first.
 TEST_F(Run, LoadsNoLibraryFromItsOwnFolder) {
   fs::copy(ORX_PROGRAM, In("program.exe"));
   for (const char* library : {"netapi32.dll", "psapi.dll", "secur32.dll", "shfolder.dll"}) {

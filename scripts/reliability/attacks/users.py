@@ -5,23 +5,26 @@ import shutil
 import stat
 
 import history
-from harness import NOBODY, as_nobody, attack, digest
+from harness import MARKER, NOBODY, as_nobody, attack, digest
 from history import check
 from planted import RUNS, run_any
 
 
-@attack()
-def linked_history_folder(machine):
-    """An administrator may keep the history elsewhere: it is then what the link leads to."""
+@attack(("history folder", history.HISTORY), ("maker's folder", "ZEK"))
+def linked_folder(machine, name):
+    """Whoever came first may have placed it: nothing is written through it, nothing packed."""
     elsewhere = machine.scratch / "elsewhere"
-    machine.history.rmdir()
-    elsewhere.mkdir()
-    machine.history.symlink_to(elsewhere)
+    (elsewhere / "ORXHistory").mkdir(parents=True)
+    (elsewhere / "ORXHistory" / "file").write_bytes(MARKER)
+    link = machine.root / name
+    shutil.rmtree(link)
+    link.symlink_to(elsewhere)
     machine.watch()
-    for words in RUNS:
-        run_any(machine, words)
-    check((elsewhere / "C1").is_dir() or (elsewhere / "7").is_dir(), "nothing recorded")
-    check("History.ini" in history.read_archive(machine.archive), "nothing packed")
+    for words in RUNS[:-1]:
+        machine.must(*words, result=1)
+    machine.must("-report", str(machine.archive), result=3)
+    found = sorted(path.name for path in elsewhere.rglob("*"))
+    check(found == ["ORXHistory", "file"], f"made through the link: {found}")
 
 
 @attack(needs_root=True)
