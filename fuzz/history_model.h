@@ -5,49 +5,86 @@
 #include <string_view>
 #include <vector>
 
+#include "app/install_event.h"
 #include "fuzz/profile_model.h"
 #include "platform/ascii_case.h"
 
-// What the command lines of runs say and what the history file keeps of them, told as plainly as
+// What the command lines of runs mean and what the history file keeps of them, as plainly as
 // possible.
+
+// A key of an event: the option that sets it, the field that holds the option's value, and the
+// key's operations.
+struct KeyRoute {
+  const char* Key;
+  std::string (CInstallEvent::*Get)() const;
+  const char* Option = nullptr;
+  std::string CInstallEvent::*Field = nullptr;
+  void (CInstallEvent::*Set)(const std::string&) = nullptr;
+};
+
+using Event = CInstallEvent;
+
+inline constexpr KeyRoute kKeyRoutes[] = {
+    {"Event_ID", &Event::GetEventID},
+    {"Complete_Flag", &Event::GetCompleteFlag},
+    {"Event_Log_File", &Event::GetEventLogFile},
+    {"Command_Line", &Event::GetCommandLine, "-Command", &Event::CommandLine,
+     &Event::SetCommandLine},
+    {"Copy_Name", &Event::GetCopyName, "-CopyName", &Event::CopyName, &Event::SetCopyName},
+    {"Type", &Event::GetType, "-Type", &Event::Type, &Event::SetType},
+    {"Version", &Event::GetVersion, "-Version", &Event::Version, &Event::SetVersion},
+    {"Service_Level", &Event::GetServiceLevel, "-ServiceLevel", &Event::ServiceLevel,
+     &Event::SetServiceLevel},
+    {"Result", &Event::GetResult, "-Result", &Event::Result, &Event::SetResult},
+    {"Product", &Event::GetProduct, "-Product", &Event::Product, &Event::SetProduct},
+    {"Path", &Event::GetPath, "-Path", &Event::Path, &Event::SetPath},
+    {"Action", &Event::GetAction, "-Action", &Event::Action, &Event::SetAction},
+    {"Log_File_Name", &Event::GetLogFileName, "-l", &Event::LogFile, &Event::SetLogFileName},
+    {"Trace_File", &Event::GetTraceFile, "-t", &Event::TraceFile, &Event::SetTraceFile},
+    {"Response_File", &Event::GetResponseFile, "-u", &Event::ResponseFile, &Event::SetResponseFile},
+};
 
 struct CommandLineModel {
   explicit CommandLineModel(const std::vector<std::string>& words) {
     for (size_t i = 0; i + 1 < words.size(); ++i) {
-      for (const char* option : {"-start", "-end", "-logmessage", "-Command", "-message",
-                                 "-CopyName", "-Type", "-Version", "-ServiceLevel", "-Result",
-                                 "-Product", "-Path", "-Action", "-l", "-t", "-u"}) {
-        if (EqualsIgnoringCase(words[i], option)) {
-          Take(option, words[i + 1]);
-          ++i;  // a value is no option, whatever it says; what no option owns is looked at itself
-          break;
-        }
-      }
+      // A value is no option, whatever its text; a word that is no option takes no value.
+      i += Take(words[i], words[i + 1]) ? 1 : 0;
     }
   }
 
   bool NamesEvent() const { return !Mode.empty() && !Identity.empty(); }
 
-  const std::string& Value(const std::string& option) const {
-    static const std::string none;
-    const auto found = Values.find(option);
-    return found == Values.end() ? none : found->second;
+  // The value of the option that sets the key.
+  std::string Value(std::string_view key) const {
+    const auto found = Values.find(key);
+    return found == Values.end() ? "" : found->second;
   }
 
   std::string Mode;
   std::string Identity;
+  std::string Message;
 
  private:
-  void Take(const std::string& option, const std::string& value) {
-    if (option == "-start" || option == "-end" || option == "-logmessage") {
-      Mode = option;
-      Identity = value;
-    } else {
-      Values[option] = value;
+  bool Take(const std::string& option, const std::string& value) {
+    for (const char* mode : {"-start", "-end", "-logmessage"}) {
+      if (EqualsIgnoringCase(option, mode)) {
+        Mode = mode;
+        Identity = value;
+        return true;
+      }
     }
+    for (const KeyRoute& route : kKeyRoutes) {
+      if (route.Option != nullptr && EqualsIgnoringCase(option, route.Option)) {
+        Values[route.Key] = value;
+        return true;
+      }
+    }
+    const bool isMessage = EqualsIgnoringCase(option, "-message");
+    Message = isMessage ? value : Message;
+    return isMessage;
   }
 
-  std::map<std::string, std::string> Values;
+  std::map<std::string, std::string, std::less<>> Values;
 };
 
 class HistoryModel {
@@ -68,26 +105,15 @@ class HistoryModel {
   }
 
   void Start(const CommandLineModel& line, const std::string& time, const std::string& logPath) {
-    const std::pair<const char*, std::string> keys[] = {
-        {"Event_ID", line.Identity},
-        {"Command_Line", line.Value("-Command")},
-        {"Start_Time", time},
-        {"End_Time", ""},
-        {"Action", line.Value("-Action")},
-        {"Type", line.Value("-Type")},
-        {"Product", line.Value("-Product")},
-        {"Version", line.Value("-Version")},
-        {"Service_Level", line.Value("-ServiceLevel")},
-        {"Path", line.Value("-Path")},
-        {"Copy_Name", "(Unknown)"},
-        {"Complete_Flag", "FALSE"},
-        {"Log_File_Name", line.Value("-l")},
-        {"Trace_File", line.Value("-t")},
-        {"Response_File", line.Value("-u")},
-        {"Event_Log_File", logPath},
-        {"Result", ""},
-    };
-    for (const auto& [key, value] : keys) {
+    for (const char* key : {
+#include "tests/support/event_keys.inc"
+         }) {
+      Set(line.Identity, key, line.Value(key));
+    }
+    const std::pair<const char*, std::string> others[] = {
+        {"Event_ID", line.Identity}, {"Start_Time", time},        {"Copy_Name", "(Unknown)"},
+        {"Complete_Flag", "FALSE"},  {"Event_Log_File", logPath}, {"Result", ""}};
+    for (const auto& [key, value] : others) {
       Set(line.Identity, key, value);
     }
     File.Set("History", "Count", std::to_string(++StartCount));
@@ -95,21 +121,21 @@ class HistoryModel {
 
   void End(const CommandLineModel& line, const std::string& time) {
     Set(line.Identity, "End_Time", time);
-    Set(line.Identity, "Copy_Name", line.Value("-CopyName"));
+    Set(line.Identity, "Copy_Name", line.Value("Copy_Name"));
     Set(line.Identity, "Complete_Flag", "TRUE");
-    SetIfGiven(line.Identity, "Action", line.Value("-Action"));
-    Set(line.Identity, "Result", line.Value("-Result"));
-    SetIfGiven(line.Identity, "Log_File_Name", line.Value("-l"));
-    SetIfGiven(line.Identity, "Trace_File", line.Value("-t"));
-    SetIfGiven(line.Identity, "Response_File", line.Value("-u"));
-    SetIfGiven(line.Identity, "Path", line.Value("-Path"));
+    for (const std::string key :
+         {"Action", "Result", "Log_File_Name", "Trace_File", "Response_File", "Path"}) {
+      if (key == "Result" || !line.Value(key).empty()) {
+        Set(line.Identity, key, line.Value(key));
+      }
+    }
   }
 
   void Set(const std::string& section, const std::string& key, const std::string& value) {
     File.Set(OnOneLine(section), key, OnOneLine(value));
   }
 
-  // Without the limit of a getter; empty if there is none.
+  // Without blanks and quotation marks around it; empty if it is not in the file.
   std::string Stored(const std::string& section, const std::string& key) const {
     return std::string(File.Find(OnOneLine(section), key).value_or(""));
   }
@@ -120,8 +146,8 @@ class HistoryModel {
   }
 
   static std::string OnOneLine(std::string text) {
-    for (size_t place = 0; (place = text.find("\r\n", place)) != std::string::npos;) {
-      text.erase(place, 1);
+    for (size_t at = 0; (at = text.find("\r\n", at)) != std::string::npos;) {
+      text.erase(at, 1);
     }
     std::replace(text.begin(), text.end(), '\r', ' ');
     std::replace(text.begin(), text.end(), '\n', ' ');
@@ -129,12 +155,6 @@ class HistoryModel {
   }
 
  private:
-  void SetIfGiven(const std::string& section, const std::string& key, const std::string& value) {
-    if (!value.empty()) {
-      Set(section, key, value);
-    }
-  }
-
   ProfileModel File;
   int StartCount = 0;
 };

@@ -5,13 +5,13 @@
 #include <vector>
 
 #include "fuzz/profile_model.h"
-#include "fuzz/require.h"
+#include "fuzz/support.h"
 #include "platform/profile_text.h"
 
 // The first line of the input is a program, the rest is a profile file. Three characters of the
-// program are a change: a section, a key and a value, by their numbers in the tables below, to
-// which the names of the file's own sections are added. Before and after each change ProfileText is
-// what the model is, byte for byte, and reads as the model reads.
+// program are a change: a section, a key and a value, as indices of the tables below; the file's
+// own sections are added to the table of sections. Before and after each change ProfileText equals
+// the model byte for byte and reads as the model does.
 
 namespace {
 
@@ -64,10 +64,10 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     text.Set(change.Section, change.Key, change.Value);
     model.Set(change.Section, change.Key, change.Value);
     Require(text.Get() == model.Text());
-    Require(text.Find(change.Section, change.Key) == ProfileModel::Clean(change.Value));
+    Require(text.Find(change.Section, change.Key) == ProfileModel::ValueOf(change.Value));
   }
   CompareAnswers(text, model, changes);
-  // The places that were kept through the changes are those of a fresh reading.
+  // The offsets that were kept through the changes are those of a new ProfileText.
   CompareAnswers(ProfileText(text.Get()), model, changes);
   return 0;
 }

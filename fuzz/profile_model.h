@@ -9,9 +9,8 @@
 
 #include "platform/ascii_case.h"
 
-// Profile files as one would describe them: a list of lines, each looked at anew for each question.
-// Slow and plain, as something to compare ProfileText with; an operation does what its namesake
-// there does.
+// A profile file as a list of lines, each parsed again for each question. Slow and plain, to
+// compare ProfileText with; the operations are those of ProfileText.
 class ProfileModel {
  public:
   explicit ProfileModel(std::string_view text) {
@@ -46,7 +45,7 @@ class ProfileModel {
     if (line == Lines.size()) {
       return std::nullopt;
     }
-    return Clean(std::string_view(Lines[line]).substr(Lines[line].find('=') + 1));
+    return ValueOf(std::string_view(Lines[line]).substr(Lines[line].find('=') + 1));
   }
 
   void Set(const std::string& section, const std::string& key, const std::string& value) {
@@ -65,14 +64,6 @@ class ProfileModel {
     AddAt(place, key + "=" + value + "\n");
   }
 
-  // A value as it is read: without blanks, then without one pair of quotation marks.
-  static std::string_view Clean(std::string_view raw) {
-    const std::string_view value = Trim(raw);
-    const bool isQuoted = value.size() > 1 && value.front() == value.back() &&
-                          (value.front() == '"' || value.front() == '\'');
-    return isQuoted ? value.substr(1, value.size() - 2) : value;
-  }
-
   static std::string_view Trim(std::string_view text) {
     const auto isBlank = [](char c) { return c == ' ' || (c >= '\t' && c <= '\r'); };
     while (!text.empty() && isBlank(text.front())) {
@@ -82,6 +73,14 @@ class ProfileModel {
       text.remove_suffix(1);
     }
     return text;
+  }
+
+  // What is read of a text after a "=".
+  static std::string_view ValueOf(std::string_view text) {
+    text = Trim(text);
+    const bool isQuoted = text.size() > 1 && text.front() == text.back() &&
+                          (text.front() == '"' || text.front() == '\'');
+    return isQuoted ? text.substr(1, text.size() - 2) : text;
   }
 
  private:
@@ -95,7 +94,7 @@ class ProfileModel {
     return isHeader ? std::optional(Trim(text.substr(1, close - 1))) : std::nullopt;
   }
 
-  // The three below give a line's number, or that of all lines if there is no such line.
+  // The next three return a line's index, or the number of lines if there is no such line.
   size_t HeaderOf(std::string_view section) const {
     size_t line = 0;
     while (line < Lines.size()) {

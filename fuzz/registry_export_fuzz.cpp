@@ -1,10 +1,12 @@
 #include <cstdint>
+#include <exception>
+#include <filesystem>
 #include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
 
-#include "fuzz/require.h"
+#include "fuzz/support.h"
 #include "platform/posix/registry/registry_export.h"
 
 // Any bytes as the registry export of the machine: every key and value is asked for, the limits of
@@ -40,52 +42,21 @@ std::string Dump(const std::string& bytes) {
   return text;
 }
 
-// Takes one character off the text; nothing if it does not begin with one.
-std::optional<uint32_t> TakeCharacter(std::string_view& utf8) {
-  const auto byteAt = [&](size_t at) -> uint32_t { return static_cast<uint8_t>(utf8[at]); };
-  const uint32_t first = byteAt(0);
-  const size_t size = first < 0x80 ? 1 : first < 0xE0 ? 2 : first < 0xF0 ? 3 : 4;
-  if ((first >= 0x80 && first < 0xC2) || first > 0xF4 || utf8.size() < size) {
-    return std::nullopt;
-  }
-  uint32_t character = size == 1 ? first : first & (0x7FU >> size);
-  for (size_t i = 1; i < size; ++i) {
-    if (byteAt(i) >> 6 != 2) {
-      return std::nullopt;
-    }
-    character = character << 6 | (byteAt(i) & 0x3F);
-  }
-  constexpr uint32_t lowest[] = {0, 0x80, 0x800, 0x10000};
-  const bool isSurrogate = character >= 0xD800 && character < 0xE000;
-  if (character < lowest[size - 1] || isSurrogate || character > 0x10FFFF) {
-    return std::nullopt;
-  }
-  utf8.remove_prefix(size);
-  return character;
-}
-
-void AppendUnit(std::string& utf16, uint32_t unit) {
-  utf16 += static_cast<char>(unit & 0xFF);
-  utf16 += static_cast<char>(unit >> 8);
-}
-
-// The same text in the other encoding; nothing if it is no UTF-8.
+// The same text in the other encoding; nothing if it is no UTF-8. The conversion accepts
+// surrogates.
 std::optional<std::string> AsUtf16(std::string_view utf8) {
   utf8.remove_prefix(utf8.starts_with("\xEF\xBB\xBF") ? 3 : 0);
-  std::string wide = "\xFF\xFE";
-  while (!utf8.empty()) {
-    const std::optional<uint32_t> character = TakeCharacter(utf8);
-    if (!character) {
+  for (size_t at = 0; (at = utf8.find('\xED', at)) != std::string_view::npos; ++at) {
+    if (at + 1 < utf8.size() && static_cast<uint8_t>(utf8[at + 1]) >= 0xA0) {
       return std::nullopt;
     }
-    if (*character < 0x10000) {
-      AppendUnit(wide, *character);
-    } else {
-      AppendUnit(wide, 0xD800 + ((*character - 0x10000) >> 10));
-      AppendUnit(wide, 0xDC00 + ((*character - 0x10000) & 0x3FF));
-    }
   }
-  return wide;
+  try {
+    const std::u16string wide = std::filesystem::path(utf8).u16string();
+    return "\xFF\xFE" + std::string(reinterpret_cast<const char*>(wide.data()), 2 * wide.size());
+  } catch (const std::exception&) {
+    return std::nullopt;
+  }
 }
 
 }  // namespace

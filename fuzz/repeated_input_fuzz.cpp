@@ -1,23 +1,22 @@
 #include <algorithm>
 #include <cstdint>
+#include <cstdlib>
 #include <ctime>
 #include <string>
 #include <string_view>
 
-#include "fuzz/require.h"
-#include "fuzz/words.h"
+#include "fuzz/support.h"
 #include "history/ini_file.h"
 #include "history/locations.h"
 #include "platform/posix/registry/registry_export.h"
 #include "platform/profile_text.h"
 #include "report/zip_names.h"
-#include "tests/support/scratch_history.h"
 
 // A head and a unit, with a NUL between them: the head is followed by as many units as make a large
-// text, which is given to every reader. What takes time by the square of the length, and so would
-// hold up a run that meets such a file or argument, is far above the limit; what goes over the text
-// some times is far below, also with sanitizers. Time is that of the processor, so that a busy
-// machine does not count.
+// text, which every parser reads. Work that grows with the square of the length, which would hold
+// up a run that meets such a file or argument, is far above the limit; work that grows with the
+// length is far below it, also with sanitizers. CPU time is measured, so that a busy machine does
+// not matter.
 
 namespace {
 
@@ -54,7 +53,8 @@ void ReadRegistry(const std::string& text) {
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  static const ScratchHistory scratch;
+  // No such folder: what is parsed of an argument is of interest here, not the files.
+  ::setenv("ORX_COMMON_APPDATA", "/no/folder", /*overwrite=*/1);
   constexpr size_t fileSize = 256 * 1024;
   constexpr size_t argumentSize = 128 * 1024;  // more than a system takes
   const std::vector<std::string> parts = Split(std::string(data, data + size), '\0');

@@ -8,20 +8,19 @@
 
 #include "app/install_event.h"
 #include "app/install_history.h"
-#include "fuzz/archive_names.h"
 #include "fuzz/history_model.h"
-#include "fuzz/require.h"
-#include "fuzz/words.h"
+#include "fuzz/support.h"
 #include "history/locations.h"
 #include "platform/path.h"
 #include "platform/profile_text.h"
+#include "tests/support/archive_reader.h"
 #include "tests/support/run_tool.h"
 #include "tests/support/scratch_history.h"
 
 // The command lines of up to four runs over one new history: arguments with a NUL between them,
-// runs with an RS (0x1E). After each run the history file is byte for byte that of a model, the
-// event reads as the model says, and nothing lies outside the history folder, which has a link that
-// leads out.
+// runs with an RS (0x1E). After each run the history file is byte for byte that of the model, the
+// event reads as the model does, and nothing was made outside the history folder, which has a link
+// that leads out.
 
 namespace {
 
@@ -40,35 +39,18 @@ std::string TimeNow(const std::string& section, const std::string& key) {
 }
 
 void CheckGetters(const HistoryModel& model, const std::string& identity) {
-  const std::pair<const char*, std::string (CInstallEvent::*)() const> getters[] = {
-      {"Event_ID", &CInstallEvent::GetEventID},
-      {"Command_Line", &CInstallEvent::GetCommandLine},
-      {"Action", &CInstallEvent::GetAction},
-      {"Type", &CInstallEvent::GetType},
-      {"Product", &CInstallEvent::GetProduct},
-      {"Version", &CInstallEvent::GetVersion},
-      {"Service_Level", &CInstallEvent::GetServiceLevel},
-      {"Path", &CInstallEvent::GetPath},
-      {"Copy_Name", &CInstallEvent::GetCopyName},
-      {"Complete_Flag", &CInstallEvent::GetCompleteFlag},
-      {"Log_File_Name", &CInstallEvent::GetLogFileName},
-      {"Trace_File", &CInstallEvent::GetTraceFile},
-      {"Response_File", &CInstallEvent::GetResponseFile},
-      {"Event_Log_File", &CInstallEvent::GetEventLogFile},
-      {"Result", &CInstallEvent::GetResult},
-  };
   const CInstallEvent event(identity);
-  for (const auto& [key, getter] : getters) {
-    Require((event.*getter)() == model.Read(identity, key));
+  for (const KeyRoute& route : kKeyRoutes) {
+    Require((event.*route.Get)() == model.Read(identity, route.Key));
   }
 }
 
-// A folder that has been moved is told by its key; which names can be moved is the system's affair.
+// Whether a folder was moved shows in its key; which names can be moved depends on the system.
 void FollowMove(HistoryModel& model, const CommandLineModel& line) {
   const std::string& identity = line.Identity;
   if (StoredNow(identity, "Event_Log_File") != model.Stored(identity, "Event_Log_File")) {
     const std::string folder =
-        JoinPath(JoinPath(GetHistoryDir(), line.Value("-CopyName")), identity);
+        JoinPath(JoinPath(GetHistoryDir(), line.Value("Copy_Name")), identity);
     Require(fs::is_directory(folder));
     model.Set(identity, "Event_Log_File", JoinPath(folder, "ORXInstallEvent.Log"));
   }
@@ -80,10 +62,11 @@ void CheckLog(const CommandLineModel& line, const std::string& before, bool isWr
       JoinPath(JoinPath(GetHistoryDir(), line.Identity), "ORXInstallEvent.Log");
   const std::string after = FileText(path);
   if (line.Mode == "-logmessage") {
-    Require(after == (isWritable ? before + line.Value("-message") + '\n' : before));
+    Require(after == (isWritable ? before + line.Message + '\n' : before));
   } else if (line.Mode == "-start" && isWritable) {
     Require(after.starts_with("---------- ORX Installation History Logger ( Start )"));
-    Require(after.find("\nCommandLine   :" + line.Value("-Command") + '\n') != std::string::npos);
+    Require(after.find("\nCommandLine   :" + line.Value("Command_Line") + '\n') !=
+            std::string::npos);
   }
 }
 
@@ -113,11 +96,11 @@ void RunEvent(HistoryModel& model, const Words& words) {
   CheckGetters(model, line.Identity);
 }
 
-// The installer's files that were collected are told by their keys too.
+// Which of the installer's files were collected shows in their keys too.
 void RunReport(HistoryModel& model, const std::string& archive) {
   Require(CInstallHistory().Report(archive) == 1);
-  for (const std::string& name : ArchiveNames(archive)) {
-    Require(!name.starts_with('/') && !LeadsElsewhere(name));
+  for (const ArchiveEntry& entry : ReadArchive(archive)) {
+    Require(entry.IsWhole && !entry.Name.starts_with('/') && !LeadsElsewhere(entry.Name));
   }
   for (const std::string& section : model.EventSections()) {
     for (const char* key : {"Log_File_Name", "Trace_File", "Response_File"}) {
