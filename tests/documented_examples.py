@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 """Runs the examples of README.md and docs/integrating.md as they are written there.
 
-usage: documented_examples.py PROGRAMS          the README's sessions and the shell script
+usage: documented_examples.py PROGRAMS          the sessions of both and the shell script
        documented_examples.py PROGRAMS --wine   the batch file, with the programs for Windows
 """
 import os
@@ -80,16 +80,17 @@ def without_variables(line):
     return " ".join(line.split())
 
 
-def check_sessions(programs, scratch):
-    """The README's sessions, as one: the lines that it shows come in their order."""
-    session = "".join(blocks("README.md", "console"))
+def check_sessions(programs, scratch, page, before):
+    """The sessions of a page, as one: the lines that it shows come in their order."""
+    session = f"$ {before}\n" + "".join(blocks(page, "console"))
     steps = re.findall(r"^\$ (.*)\n((?:(?!\$ ).*\n)*)", session, re.M)
     (scratch / "scripts").symlink_to(REPOSITORY / "scripts")
-    environment = dict(os.environ, PATH=f"{programs}:{os.environ['PATH']}", TMPDIR=str(scratch))
+    environment = dict(os.environ, PATH=f"{programs}:{os.environ['PATH']}", TMPDIR=str(scratch),
+                       ORX_COMMON_APPDATA=str(scratch))
     run = subprocess.run(["sh", "-ev"], input="".join(f"{command}\n" for command, _ in steps),
                          cwd=scratch, env=environment, text=True,
                          stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
-    check(run.returncode == 0, "The README's session failed", run.stdout)
+    check(run.returncode == 0, f"The session of {page} failed", run.stdout)
     printed = iter([without_variables(line) for line in run.stdout.splitlines()])
     for command, output in steps:
         for line in [command, *output.splitlines()]:
@@ -102,7 +103,10 @@ def main():
         cases = [(check_batch_file, programs, status) for status in (0, 3)]
     else:
         cases = [(check_shell_script, programs, status) for status in (0, 3)]
-        cases += [(check_shell_script, None, 0), (check_sessions, programs)]
+        cases += [(check_shell_script, None, 0)]
+        start = 'ORXInstallEventLog -start 43 -Product "ORX Client 9.5" -Action Install'
+        cases += [(check_sessions, programs, "README.md", ":"),
+                  (check_sessions, programs, GUIDE, start)]
     for function, *arguments in cases:
         with tempfile.TemporaryDirectory() as scratch:
             function(arguments[0], pathlib.Path(scratch), *arguments[1:])
