@@ -17,7 +17,8 @@ inline bool EqualsIgnoringCase(std::string_view a, std::string_view b) {
 // Removes the prefix from the text if the text begins with it; else false, and the text is as it
 // was.
 inline bool TakePrefixIgnoringCase(std::string_view& text, std::string_view prefix) {
-  if (!EqualsIgnoringCase(text.substr(0, prefix.size()), prefix)) {
+  // Most texts have the case of the prefix, and that comparison is fast.
+  if (!text.starts_with(prefix) && !EqualsIgnoringCase(text.substr(0, prefix.size()), prefix)) {
     return false;
   }
   text.remove_prefix(prefix.size());

@@ -224,7 +224,7 @@ def bench_registry(folder, short):
         cat = Side("cat", "cat", export)
         take_turns([whole, alone, cat], 5 if short else 20)
         for ours in whole, alone:
-            show(f"registry export of {megabytes} MB, {code}", ours, cat, 5)
+            show(f"registry export of {megabytes} MB, {code}", ours, cat, 10)
 
 
 @contextlib.contextmanager

@@ -17,7 +17,7 @@ UniqueKey OpenKey(const std::string& path, RegistryAccess access) {
   return UniqueKey(status == ERROR_SUCCESS ? key : nullptr);
 }
 
-// The names that a call gives for one index after the other, until it gives none.
+// The names that a call returns for the indices from 0 on, until it fails.
 template <typename Call>
 std::vector<std::string> EnumNames(const std::string& path, Call call) {
   std::vector<std::string> names;

@@ -68,6 +68,7 @@ std::vector<std::string> RegistryBranch::SubKeyNames(std::string_view path) cons
   }
   std::sort(firsts.begin(), firsts.end());
   std::vector<std::string> names;
+  names.reserve(firsts.size());
   for (const auto& [begin, name] : firsts) {
     names.emplace_back(name);
   }

@@ -182,6 +182,7 @@ std::vector<std::string> RegistryValues::Names() const {
     ordered.emplace(value.Number, name);
   }
   std::vector<std::string> names;
+  names.reserve(ordered.size());
   for (auto& [number, name] : ordered) {
     names.push_back(std::move(name));
   }
