@@ -15,7 +15,7 @@ struct FileKey {
   void (CInstallEvent::*Set)(const std::string&);
 };
 
-// In the order of handling: of two files with one name the first is taken.
+// In the order of handling: of two files with the same name the first is copied.
 constexpr FileKey fileKeys[] = {
     {&CInstallEvent::GetLogFileName, &CInstallEvent::SetLogFileName},
     {&CInstallEvent::GetTraceFile, &CInstallEvent::SetTraceFile},
@@ -60,7 +60,7 @@ void CollectFiles(std::span<CInstallEvent> events) {
   if (collected.empty()) {
     return;
   }
-  // No other run waits for the copying above, so one may have named another file in the meantime.
+  // The copies were made without the guard, so another run may have named another file since.
   const ProfileGuard guard(GetHistoryFilePath());
   for (const CollectedFile& file : collected) {
     if ((file.Event.*file.Key.Get)() == file.Source) {

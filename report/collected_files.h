@@ -4,6 +4,6 @@
 
 #include "app/install_event.h"
 
-// CInstallEvent::CollectFiles for each of the events, with one change of the history file for all
-// of their keys: a change costs as much as the file is long, however little is changed.
+// CInstallEvent::CollectFiles for each of the events, with one replacement of the history file for
+// all of their keys: its cost depends on the size of the file, not on what is changed.
 void CollectFiles(std::span<CInstallEvent> events);

@@ -12,10 +12,10 @@
 
 namespace {
 
-// A stream that stays closed swallows its lines, as one that failed to open does.
+// A stream that stays closed ignores what is written to it, as one that failed to open does.
 void OpenBelowHistory(std::ofstream& stream, const std::string& name) {
   const std::string path = JoinPath(GetHistoryDir(), name);
-  // A pipe would hold the report up until somebody reads from it.
+  // Opening a pipe would wait for its reader.
   if (!LeadsElsewhere(name) && KindOf(path) != FileKind::kOther) {
     stream.open(path, std::ios::out | std::ios::trunc);
   }
@@ -23,7 +23,7 @@ void OpenBelowHistory(std::ofstream& stream, const std::string& name) {
 
 void OpenCopySummary(std::ofstream& stream, const std::string& copyName) {
   const std::string name = JoinPath(copyName, "Summary.txt");
-  // A copy called "." has the overall summary in its folder, which is being written already.
+  // The folder of a copy called "." contains the overall summary, which is open already.
   const std::string overall = JoinPath(GetHistoryDir(), "Summary.txt");
   if (!IsSameFile(JoinPath(GetHistoryDir(), name), overall)) {
     OpenBelowHistory(stream, name);
@@ -69,13 +69,13 @@ void WriteCopy(std::ostream& overall, const CCopyEvents& copy) {
   OpenCopySummary(own, copy.Name);
   WriteCopyHead(overall, copy, "Count of Events      :");
   WriteCopyHead(own, copy, "Count of Events:");
-  // A run that is killed between the copying of files and the turning of their keys leaves keys
-  // that no later run turns: those of at most so many events.
+  // A run that is killed after it copied files and before it set their keys leaves keys that no
+  // later run corrects: those of at most so many events.
   constexpr size_t most = 64;
   std::vector<CInstallEvent> events = copy.Events;
   for (size_t begin = 0; begin < events.size(); begin += most) {
     const auto some = std::span(events).subspan(begin, std::min(most, events.size() - begin));
-    CollectFiles(some);  // first, as it turns keys that are printed below
+    CollectFiles(some);  // first, as it sets keys that are printed below
     for (const CInstallEvent& event : some) {
       WriteEventBlock(overall, event);
       overall << std::endl;
