@@ -237,7 +237,7 @@ ROUNDS = (("undisturbed", UndisturbedCrowd, 0.5), ("killed", KilledCrowd, 0.35),
           ("without locks", UnlockedCrowd, 0.15))
 
 
-def attack_together(program, outcome, seconds):
+def attack_together(program, outcome, seconds, _):
     for name, kind, share in ROUNDS:
         with Machine(program) as machine:
             crowd = kind(machine, seconds * share)

@@ -5,7 +5,7 @@
 
 Without options every attack runs against build/release/ORXInstallEventLog; what does not hold is
 printed under the attack's name, and the result is 1. "--only NAME" runs the attacks whose name
-contains NAME, "--program" another program, for example an older one that must fail.
+contains NAME ("kill: report, write 117" is one of a family), "--program" another program, for example an older one that must fail.
 "--seconds N" limits the three large families (kill, overlap, planted) to about N seconds together,
 as a sample; all other attacks always run.
 
@@ -65,7 +65,8 @@ def main():
     options = parser.parse_args()
     load_attacks()
     attacks = [entry for entry in ATTACKS if options.only in entry.name]
-    families = [family for family in FAMILIES if options.only in family[0]]
+    families = [family for family in FAMILIES
+                if options.only in family[0] or options.only.startswith(family[0] + ": ")]
     if options.list:
         print("\n".join([entry.name for entry in attacks] + [family[0] for family in families]))
         return
@@ -81,7 +82,9 @@ def main():
     shares = sum(share for _, _, share, _ in families)
     for name, attack_family, share, whole in families:
         seconds = options.seconds * share / shares if options.seconds else whole
-        outcome.attempt(name, lambda f=attack_family, s=seconds: f(options.program, outcome, s))
+        only = options.only if ":" in options.only else ""
+        outcome.attempt(name, lambda f=attack_family, s=seconds, o=only: f(
+            options.program, outcome, s, o))
     print(outcome.summary())
     sys.exit(1 if outcome.faults else 0)
 
