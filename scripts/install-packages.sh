@@ -10,7 +10,7 @@ packages_of() {
       libcli11-dev nlohmann-json3-dev libgtest-dev" ;;
     tests) echo "libnss-wrapper python3 sqlite3" ;;
     style) echo "git clang-format clang-tidy python3 pycodestyle pyflakes3 shellcheck" ;;
-    reliability) echo "acl attr binutils python3 strace unzip" ;;
+    reliability) echo "acl attr binutils libnss-wrapper python3 strace unzip" ;;
     page) echo "chromium python3" ;;
     fuzz) echo "clang libclang-rt-dev cmake ninja-build zlib1g-dev libminizip-dev libsystemd-dev \
       libcli11-dev nlohmann-json3-dev" ;;

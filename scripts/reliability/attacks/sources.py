@@ -1,12 +1,14 @@
 """What the machine says about itself: a name service, a registry export, a process, in any state."""
 
+import contextlib
 import os
 import resource
 import shutil
 import subprocess
 import time
+from pathlib import Path
 
-from harness import attack
+from harness import Skipped, attack
 from history import check
 
 HEADER = "Windows Registry Editor Version 5.00\n\n"
@@ -86,13 +88,16 @@ def silent_name_service(machine):
     seconds = time.monotonic() - began
     check(seconds < 12, f"{seconds:.0f} s")
     check(b"6) ORX ODBC Driver Info:" in report, "the rest of the snapshot is missing")
-    left = subprocess.run(["pgrep", "-f", machine.program], stdout=subprocess.PIPE, check=False)
-    check(not left.stdout, "a process is left")
+    for path in Path("/proc").glob("[0-9]*/cmdline"):
+        with contextlib.suppress(OSError):  # a process that has ended meanwhile
+            check(bytes(machine.program) not in path.read_bytes(), "a process is left")
 
 
 @attack()
 def groups_with_one_name(machine):
     wrapper = "/usr/lib/x86_64-linux-gnu/libnss_wrapper.so"
+    if not Path(wrapper).exists():
+        raise Skipped("needs the package libnss-wrapper")
     passwd, group = machine.scratch / "passwd", machine.scratch / "group"
     passwd.write_text("root:x:0:0::/:/bin/sh\n")
     group.write_text("twice:x:100:ana\ntwice:x:101:bo\n")
