@@ -52,4 +52,10 @@ bool MoveFolder(const std::string& source, const std::string& target);
 // cannot be copied.
 // Windows: ReadFile, WriteFile, SetFileTime, SetFileAttributesA; a source that is in use is waited
 // for, up to 0.2 seconds. POSIX: sendfile, fchmod, futimens.
-bool CopyToNewFile(const std::string& source, const std::string& target);
+//
+// The source is opened with the rights of the owner of the file "trusted", where they are less than
+// those of this process: who can write a path to the trusted file cannot have a file copied that he
+// may not read. POSIX: setfsuid, setfsgid and setgroups, if the process is root's. Windows: not
+// possible; the access list of FolderAccess::kShared takes its place.
+bool CopyToNewFile(const std::string& source, const std::string& target,
+                   const std::string& trusted);

@@ -33,7 +33,7 @@ struct CollectedFile {
 bool CopyIntoHistory(const std::string& source, const std::string& targetName) {
   const std::string target = JoinPath(GetHistoryDir(), targetName);
   return FileExists(source) && !FileExists(target) && !LeadsElsewhere(targetName) &&
-         CopyToNewFile(source, target);
+         CopyToNewFile(source, target, /*trusted=*/GetHistoryFilePath());
 }
 
 void CopyFilesOf(CInstallEvent& event, std::vector<CollectedFile>& collected) {

@@ -10,6 +10,7 @@
 
 #include "platform/posix/descriptor.h"
 #include "platform/posix/file_calls.h"
+#include "platform/posix/owner_rights.h"
 #include "platform/temporary_file.h"
 
 FileKind KindOf(const std::string& path) {
@@ -85,10 +86,16 @@ static bool CopyContents(const Descriptor& source, const struct stat& status,
   return true;
 }
 
-bool CopyToNewFile(const std::string& source, const std::string& target) {
+static Descriptor OpenSource(const std::string& source, const std::string& trusted) {
+  const OwnerRights rights(trusted);
   // Without O_NONBLOCK the opening of a pipe would wait for its writer.
-  const Descriptor from(
+  return Descriptor(
       RetryOnInterrupt([&] { return ::open(source.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC); }));
+}
+
+bool CopyToNewFile(const std::string& source, const std::string& target,
+                   const std::string& trusted) {
+  const Descriptor from = OpenSource(source, trusted);
   struct stat status = {};
   if (!from.IsOpen() || !StatusOf(from, status) || !S_ISREG(status.st_mode)) {
     return false;

@@ -122,7 +122,8 @@ static bool CopyContents(const std::string& source, const std::string& target) {
   return true;
 }
 
-bool CopyToNewFile(const std::string& source, const std::string& target) {
+bool CopyToNewFile(const std::string& source, const std::string& target,
+                   const std::string& /*trusted*/) {
   TemporaryFile copy(target);
   return copy.Exists() && CopyContents(source, copy.Path()) && copy.MoveToNew();
 }

@@ -70,14 +70,14 @@ TEST_F(Files, CopiesToANewFileOnly) {
   fs::permissions(source, fs::perms::owner_read);
   const std::string taken = Make("taken", "old");
   Make("folder/");
-  EXPECT_TRUE(CopyToNewFile(source, In("copy")));
+  EXPECT_TRUE(CopyToNewFile(source, In("copy"), /*trusted=*/Root));
   EXPECT_EQ(FileText(In("copy")), text);
   EXPECT_EQ(fs::last_write_time(In("copy")), fs::last_write_time(source));
   for (const std::string& target : {taken, source, In("folder"), In("none/copy")}) {
-    EXPECT_FALSE(CopyToNewFile(source, target)) << target;
+    EXPECT_FALSE(CopyToNewFile(source, target, /*trusted=*/Root)) << target;
   }
-  EXPECT_FALSE(CopyToNewFile(In("none"), In("new")));
-  EXPECT_FALSE(CopyToNewFile(In("folder"), In("new")));
+  EXPECT_FALSE(CopyToNewFile(In("none"), In("new"), /*trusted=*/Root));
+  EXPECT_FALSE(CopyToNewFile(In("folder"), In("new"), /*trusted=*/Root));
   EXPECT_EQ(FileText(taken), "old");
   EXPECT_EQ(Tree(), "copy\nfolder/\nsource\ntaken\n");
   fs::permissions(source, fs::perms::owner_all);  // Windows removes no file that is read-only

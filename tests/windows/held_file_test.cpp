@@ -32,7 +32,7 @@ TEST_F(HeldFile, IsWaitedForBeforeItIsPacked) {
 
 TEST_F(HeldFile, IsWaitedForBeforeItIsCopied) {
   const Holder holder(Opens(/*share=*/0), 100ms);
-  EXPECT_TRUE(CopyToNewFile(File, In("copy")));
+  EXPECT_TRUE(CopyToNewFile(File, In("copy"), /*trusted=*/Root));
 }
 
 TEST_F(HeldFile, IsWaitedForBeforeALogIsWritten) {

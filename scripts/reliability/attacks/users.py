@@ -28,6 +28,24 @@ def linked_folder(machine, name):
 
 
 @attack(needs_root=True)
+def planted_section(machine):
+    """The owner of a history has root collect files: his own, and one that only root may read."""
+    os.chown(machine.history, NOBODY, NOBODY)
+    secret, own = machine.outside / "file", machine.outside / "folder" / "own.log"
+    own.write_text("the user's own words\n")
+    os.chown(own, NOBODY, NOBODY)
+    for path in (secret, own):
+        path.chmod(0o600)
+    machine.watch()
+    machine.must("-start", "7", "-l", str(secret), "-t", str(own), preexec_fn=as_nobody)
+    machine.must("-end", "7", preexec_fn=as_nobody)
+    machine.must("-report", str(machine.archive))
+    packed = history.read_archive(machine.archive)
+    check(MARKER not in b"".join(packed.values()), "packed what its owner may not read")
+    check("7/own.log" in packed, "an honest file is missing")
+
+
+@attack(needs_root=True)
 def foreign_history(machine):
     """The history folder of another user: root adds to it and leaves it to its owner."""
     os.chown(machine.history, NOBODY, NOBODY)
