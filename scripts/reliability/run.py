@@ -5,9 +5,9 @@
 
 Without options every attack runs against build/release/ORXInstallEventLog; what does not hold is
 printed under the attack's name, and the result is 1. "--only NAME" runs the attacks whose name
-contains NAME ("kill: report, write 117" is one of a family), "--program" another program, for example an older one that must fail.
-"--seconds N" limits the three large families (kill, overlap, planted) to about N seconds together,
-as a sample; all other attacks always run.
+contains NAME ("kill: report, write 117" is one of a family), "--program" another program, for
+example an older one that must fail. "--seconds N" limits the three large families (kill, overlap,
+planted) to about N seconds together, as a sample; all other attacks always run.
 
 To add an attack, write a short function in one of the files of attacks/:
 

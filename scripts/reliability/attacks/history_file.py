@@ -10,7 +10,8 @@ from history import check
 
 
 def injecting(call, fault):
-    return ("strace", "-f", "-o", "/dev/null", "-e", f"trace={call}", "-e", f"inject={call}:{fault}")
+    return ("strace", "-f", "-o", "/dev/null", "-e", f"trace={call}",
+            "-e", f"inject={call}:{fault}")
 
 
 @attack(*((call, call) for call in ("fchown", "fchmod")))

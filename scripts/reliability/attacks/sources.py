@@ -1,4 +1,4 @@
-"""What the machine says about itself: a name service, a registry export, a process, in any state."""
+"""The sources of a snapshot in any state: a name service, a registry export, processes."""
 
 import contextlib
 import os
