@@ -48,7 +48,7 @@ std::optional<Mark> BoxAt(std::string_view text, size_t offset) {
 }
 
 std::optional<Mark> HeadingAt(std::string_view text, size_t offset) {
-  const size_t part = static_cast<size_t>(text[offset] - '1');
+  const auto part = static_cast<size_t>(text[offset] - '1');
   const std::string_view rest = text.substr(offset);
   if (part >= headings.size() || !rest.starts_with(headings[part]) || offset < 2 ||
       text[offset - 2] != '\n') {
