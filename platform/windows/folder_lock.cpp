@@ -11,7 +11,13 @@
 // of the folder's path.
 static std::string MutexName(const std::string& folder) {
   std::string path = AbsolutePath(folder + '.').value_or(folder);
-  ::CharLowerBuffA(path.data(), static_cast<DWORD>(path.size()));
+  // All spellings of a path lead to one lock. CharLowerBuffA would need user32.dll.
+  const int size = static_cast<int>(path.size());
+  std::string lower(path.size(), '\0');
+  if (::LCMapStringA(LOCALE_SYSTEM_DEFAULT, LCMAP_LOWERCASE, path.data(), size, lower.data(),
+                     size) == size) {
+    path = lower;
+  }
   uint64_t hash = 0xCBF29CE484222325;
   for (const char c : path) {
     hash = (hash ^ static_cast<unsigned char>(c)) * 0x100000001B3;
