@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <memory>
 #include <optional>
 
 // The terminal that a standard stream writes to.
@@ -23,10 +24,9 @@ class Utf8Terminal {
 
   // False if the terminal of the output shows escape sequences as text (Windows before 10; POSIX:
   // the terminal "dumb"), or if there is none.
-  bool HasColours() const { return ShowsColours; }
+  bool HasColours() const;
 
  private:
-  bool ShowsColours = false;
-  [[maybe_unused]] unsigned EarlierCodePage = 0;  // only Windows has something to restore
-  [[maybe_unused]] unsigned long EarlierMode = 0;
+  struct State;
+  std::unique_ptr<State> Shared;
 };

@@ -120,14 +120,13 @@ bool Archive::Unpack(const ArchiveEntry& entry, const std::function<bool(std::st
       ::unzOpenCurrentFile(Handle) != UNZ_OK) {
     return false;
   }
-  std::string piece(1 << 16, '\0');
   uint64_t total = 0;
   int count = 0;
   bool isWanted = true;
-  while (isWanted && (count = ::unzReadCurrentFile(Handle, piece.data(),
-                                                   static_cast<unsigned>(piece.size()))) > 0) {
+  while (isWanted && (count = ::unzReadCurrentFile(Handle, Piece.data(),
+                                                   static_cast<unsigned>(Piece.size()))) > 0) {
     total += static_cast<uint64_t>(count);
-    isWanted = sink(std::string_view(piece).substr(0, static_cast<size_t>(count)));
+    isWanted = sink({Piece.data(), static_cast<size_t>(count)});
   }
   const bool isIntact = ::unzCloseCurrentFile(Handle) == UNZ_OK;
   return isWanted && isIntact && count == 0 && total == entry.Size;

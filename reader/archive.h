@@ -59,4 +59,5 @@ class Archive {
   std::vector<ArchiveEntry> AllEntries;
   std::vector<std::string> AllComplaints;
   size_t LongNames = 0;
+  std::vector<char> Piece = std::vector<char>(1 << 16);  // of an entry that is unpacked
 };

@@ -23,19 +23,17 @@ zlib_filefunc64_def Archive::Stream::Functions() {
 }
 
 size_t Archive::Stream::Read(char* buffer, size_t size) {
-  constexpr size_t windowSize = 1 << 16;
   size_t done = 0;
   while (done < size) {
-    if (Offset < WindowOffset || Offset >= WindowOffset + Window.size()) {
-      Window.resize(windowSize);
+    if (Offset < WindowOffset || Offset >= WindowOffset + WindowSize) {
       WindowOffset = Offset;
-      Window.resize(Bytes.ReadAt(Offset, Window.data(), Window.size()));
-      if (Window.empty()) {
+      WindowSize = Bytes.ReadAt(Offset, Window.data(), Window.size());
+      if (WindowSize == 0) {
         break;
       }
     }
     const auto begin = static_cast<size_t>(Offset - WindowOffset);
-    const size_t count = std::min(size - done, Window.size() - begin);
+    const size_t count = std::min(size - done, WindowSize - begin);
     std::memcpy(buffer + done, Window.data() + begin, count);
     done += count;
     Offset += count;

@@ -2,7 +2,7 @@
 
 #include <minizip/unzip.h>
 
-#include <string>
+#include <vector>
 
 #include "reader/archive.h"
 
@@ -22,5 +22,6 @@ class Archive::Stream {
   ArchiveBytes Bytes;
   uint64_t Offset = 0;
   uint64_t WindowOffset = 0;
-  std::string Window;
+  size_t WindowSize = 0;  // the bytes of the window that are in use
+  std::vector<char> Window = std::vector<char>(1 << 16);
 };

@@ -18,10 +18,16 @@ std::optional<size_t> TerminalWidth(OutputStream stream) {
   return result == 0 && size.ws_col > 0 ? size.ws_col : 80;
 }
 
-Utf8Terminal::Utf8Terminal() {
+struct Utf8Terminal::State {
+  bool HasColours = false;
+};
+
+Utf8Terminal::Utf8Terminal() : Shared(std::make_unique<State>()) {
   const char* kind = std::getenv("TERM");
-  ShowsColours =
+  Shared->HasColours =
       ::isatty(STDOUT_FILENO) != 0 && kind != nullptr && kind != std::string_view("dumb");
 }
 
 Utf8Terminal::~Utf8Terminal() = default;
+
+bool Utf8Terminal::HasColours() const { return Shared->HasColours; }

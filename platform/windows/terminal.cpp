@@ -16,22 +16,30 @@ std::optional<size_t> TerminalWidth(OutputStream stream) {
   return width > 0 ? static_cast<size_t>(width) : 80;
 }
 
-Utf8Terminal::Utf8Terminal() : EarlierCodePage(::GetConsoleOutputCP()) {
+// What the console had before; zero without a console.
+struct Utf8Terminal::State {
+  UINT CodePage = ::GetConsoleOutputCP();
+  DWORD Mode = 0;
+  bool HasColours = false;
+};
+
+Utf8Terminal::Utf8Terminal() : Shared(std::make_unique<State>()) {
   // Without a console these calls fail and nothing changes.
   ::SetConsoleOutputCP(CP_UTF8);
   const HANDLE output = ::GetStdHandle(STD_OUTPUT_HANDLE);
-  DWORD mode = 0;
-  if (::GetConsoleMode(output, &mode) != FALSE) {
-    EarlierMode = mode;
-    ShowsColours = ::SetConsoleMode(output, mode | ENABLE_VIRTUAL_TERMINAL_PROCESSING) != FALSE;
+  if (::GetConsoleMode(output, &Shared->Mode) != FALSE) {
+    Shared->HasColours =
+        ::SetConsoleMode(output, Shared->Mode | ENABLE_VIRTUAL_TERMINAL_PROCESSING) != FALSE;
   }
 }
 
 Utf8Terminal::~Utf8Terminal() {
-  if (ShowsColours) {
-    ::SetConsoleMode(::GetStdHandle(STD_OUTPUT_HANDLE), EarlierMode);
+  if (Shared->HasColours) {
+    ::SetConsoleMode(::GetStdHandle(STD_OUTPUT_HANDLE), Shared->Mode);
   }
-  if (EarlierCodePage != 0) {
-    ::SetConsoleOutputCP(EarlierCodePage);
+  if (Shared->CodePage != 0) {
+    ::SetConsoleOutputCP(Shared->CodePage);
   }
 }
+
+bool Utf8Terminal::HasColours() const { return Shared->HasColours; }
