@@ -5,7 +5,6 @@
 #include <sys/stat.h>
 #include <sys/wait.h>
 
-#include <algorithm>
 #include <cstdlib>
 #include <filesystem>
 #include <string>
@@ -66,34 +65,6 @@ TEST_F(Run, GivesItsExitResults) {
   EXPECT_EQ(FileText(Root + "/output"), "Initialiation Failed:\n");
 }
 
-TEST_F(Run, OverlappingStartsAllCount) {
-  EXPECT_EQ(Shell("seq 200 | xargs -P 16 -I% $ORX -start % -Product P%"), 0);
-  const ProfileText history = HistoryFile();
-  EXPECT_EQ(history.Find("History", "Count"), "200");
-  EXPECT_EQ(history.SectionNames().size(), 201U);
-  for (int i = 1; i <= 200; ++i) {
-    const std::string id = std::to_string(i);
-    EXPECT_EQ(history.Find(id, "Event_ID"), id);
-    EXPECT_EQ(history.Find(id, "Product"), "P" + id);
-    EXPECT_TRUE(FileText(History + id + "/ORXInstallEvent.Log")
-                    .ends_with(" Starts  \n" + std::string(94, '*') + "\n"));
-  }
-}
-
-TEST_F(Run, OverlappingMessagesStayWhole) {
-  Call("-start 7");
-  std::string messages;
-  for (char c = 'a'; c <= 'z'; ++c) {
-    messages += std::string(20000, c) + '\n';
-  }
-  WriteFileText(Root + "/messages", messages);
-  EXPECT_EQ(Shell("cd ZEK/ORXHistory/7; : >ORXInstallEvent.Log;"
-                  "xargs -P 16 -n 1 -a ../../../messages $ORX -logmessage 7 -message;"
-                  "sort -o ORXInstallEvent.Log ORXInstallEvent.Log"),
-            0);
-  EXPECT_EQ(FileText(History + "7/ORXInstallEvent.Log"), messages);
-}
-
 TEST_F(Run, SurvivesHistoryFilesOfAnyKind) {
   std::string many = "[History]\nCount=4\n";
   for (int i = 0; i < 100000; ++i) {
@@ -134,11 +105,6 @@ TEST_F(Run, LeavesAHistoryFileThatItCannotRead) {
     EXPECT_EQ(Call("-start 1"), 0);
     EXPECT_EQ(Shell("cd ZEK/ORXHistory; " + std::string(after)), 0) << after;
   }
-}
-
-TEST_F(Run, WaitsForNoReaderOfALog) {
-  ASSERT_EQ(Shell("cd ZEK/ORXHistory; mkdir 1; mkfifo 1/ORXInstallEvent.Log"), 0);
-  EXPECT_EQ(Call("-logmessage 1 -message x"), 0);
 }
 
 TEST_F(Run, NeitherFollowsNorPacksLinksAndPipes) {
@@ -201,27 +167,6 @@ TEST_F(Run, ReportsUnderTheLockOfTheHistoryFile) {
   EXPECT_EQ(Shell("cd ZEK/ORXHistory; exec 9<.; flock 9; $ORX -report $OLDPWD/b.zip 9<&- &"
                   "sleep 0.5; test ! -e $OLDPWD/b.zip; flock -u 9; wait $!"),
             0);
-}
-
-TEST_F(Run, TakesArgumentsOfAnyKind) {
-  const std::string big(64 * 1024, 'v');
-  const std::vector<std::string> identities = {"]",    "=",        "a=b",          "[x]",
-                                               "a\nb", "\t",       "\xC3\x28\xFF", "a\\b",
-                                               ";c",   "\x01\x7F", ".History.tmp"};
-  for (const std::string& id : identities) {
-    const std::string quoted = " '" + id + "' ";
-    EXPECT_EQ(Call("-start" + quoted + "-Path 'x\n[History]\nCount=99' -Command " + big), 0);
-    EXPECT_EQ(Call("-logmessage" + quoted + "-message " + big), 0);
-    EXPECT_EQ(Call("-end" + quoted + "-CopyName 'C" + id + "' -Result " + big), 0);
-  }
-  const ProfileText history = HistoryFile();
-  EXPECT_EQ(history.Find("History", "Count"), std::to_string(identities.size()));
-  for (std::string id : identities) {
-    std::replace(id.begin(), id.end(), '\n', ' ');
-    EXPECT_EQ(history.Find(id, "Command_Line"), big) << id;
-    EXPECT_EQ(history.Find(id, "Path"), "x [History] Count=99") << id;
-    EXPECT_EQ(history.Find(id, "Complete_Flag"), "TRUE") << id;
-  }
 }
 
 }  // namespace

@@ -12,6 +12,9 @@ HOSTILE = ("..", "../outside", "../../../outside", "a/../../../../outside", ".",
            "a=b", ";c", "#", "a\nb", "a\r\n[History]\r\nCount=99", "\t", "\x01\x7f", "a/b/c",
            "/", "//", "n" * 256, "n/" * 3000, "\udcc3(\udcff", "C1", "%s%n", "~", "$(id)", "*")
 
+PATH = "x\n[History]\nCount=99"
+LONG = "v" * 65536
+
 
 @attack()
 def hostile_names(machine):
@@ -19,8 +22,9 @@ def hostile_names(machine):
     os.symlink(machine.outside / "folder", machine.history / "linked")
     names = (*HOSTILE, "linked", "linked/new", str(machine.outside), str(machine.outside / "new"))
     for number, name in enumerate(names):
-        for words in (("-start", name), ("-logmessage", name, "-message", name),
-                      ("-end", name, "-CopyName", f"copy{number}", "-Result", name),
+        for words in (("-start", name, "-Path", PATH, "-Command", LONG),
+                      ("-logmessage", name, "-message", LONG),
+                      ("-end", name, "-CopyName", f"copy{number}", "-Result", LONG),
                       ("-start", f"event{number}"),
                       ("-end", f"event{number}", "-CopyName", name)):
             run_any(machine, words)
@@ -29,6 +33,10 @@ def hostile_names(machine):
     sections = machine.sections()
     check(sections["History"]["Count"] == str(2 * len(names) + 1), "count")
     check("last" in sections, "last start")
+    for name in names:
+        keys = sections[name.replace("\r\n", " ").replace("\n", " ").strip()]
+        check((keys["Path"], keys["Command_Line"], keys["Result"]) ==
+              ("x [History] Count=99", LONG, LONG), f"values of {name!r}")
 
 
 @attack()
