@@ -24,8 +24,8 @@ enum class EndStatus {
 
 struct EndBlocks {
   EndStatus Status = EndStatus::kWhole;
-  ResultBlock Result;
-  size_t End = 0;  // offset after them
+  ResultBlock Result;  // a value that was not reached has null data
+  size_t End = 0;      // offset after them
 };
 
 // Reads the result block and the end block that begin at the offset.

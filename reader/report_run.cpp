@@ -158,7 +158,7 @@ class RunReader {
       const Ending ending = EndingAt(AllMarks.subspan(i));
       if (IsEndOfFacts(ending)) {
         whole = ending;
-      } else if (ending.Blocks.Status == EndStatus::kBreaksOff) {
+      } else if (IsBrokenEndOfFacts(ending)) {
         broken = ending;
       } else if (IsEarlierEndOfFacts(ending)) {
         earlier = ending;
@@ -191,19 +191,30 @@ class RunReader {
   }
 
   bool HasStartOfFacts(const Ending& ending) const {
-    return ending.Blocks.Status == EndStatus::kWhole &&
-           (!Facts.StartTime || ending.Blocks.Result.StartTime == *Facts.StartTime);
+    return !Facts.StartTime || ending.Blocks.Result.StartTime == *Facts.StartTime;
+  }
+
+  bool HasEndOfFacts(const Ending& ending) const {
+    return !Facts.EndTime || ending.Blocks.Result.EndTime == *Facts.EndTime;
   }
 
   bool IsEndOfFacts(const Ending& ending) const {
-    return HasStartOfFacts(ending) &&
-           (!Facts.EndTime || ending.Blocks.Result.EndTime == *Facts.EndTime);
+    return ending.Blocks.Status == EndStatus::kWhole && HasStartOfFacts(ending) &&
+           HasEndOfFacts(ending);
+  }
+
+  // What there is of the result block must not contradict.
+  bool IsBrokenEndOfFacts(const Ending& ending) const {
+    const ResultBlock& result = ending.Blocks.Result;
+    return ending.Blocks.Status == EndStatus::kBreaksOff &&
+           (result.StartTime.data() == nullptr || HasStartOfFacts(ending)) &&
+           (result.EndTime.data() == nullptr || HasEndOfFacts(ending));
   }
 
   // A second end finds the folder moved: it changes the time in the history file, not the report.
   bool IsEarlierEndOfFacts(const Ending& ending) const {
-    return HasStartOfFacts(ending) && ending.Blocks.Result.EndTime < *Facts.EndTime &&
-           ending.Blocks.End == Text.size();
+    return ending.Blocks.Status == EndStatus::kWhole && HasStartOfFacts(ending) && Facts.EndTime &&
+           ending.Blocks.Result.EndTime < *Facts.EndTime && ending.Blocks.End == Text.size();
   }
 
   void TakeEnding(const Ending& ending) {

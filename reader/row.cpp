@@ -23,15 +23,22 @@ bool IsNumber(std::string_view text) {
 }
 
 // The column's text without its padding. Nothing without padding: then the text fills the column,
-// or is longer and runs on into the next.
+// or is longer and runs on into the next. Nothing too for a text with a blank at its other end:
+// then an overlong one before has shifted it.
 std::optional<std::string_view> Column(std::string_view row, size_t begin, size_t width,
                                        Padding padding) {
   if (row.size() < begin + width) {
     return std::nullopt;
   }
   const std::string_view column = row.substr(begin, width);
-  const char edge = padding == Padding::kRight ? column.back() : column.front();
-  return edge == ' ' ? std::optional(Trim(column, padding)) : std::nullopt;
+  const std::string_view text = Trim(column, padding);
+  const bool isShifted = padding == Padding::kRight ? text.starts_with(' ') : text.ends_with(' ');
+  return text.size() < width && !isShifted ? std::optional(text) : std::nullopt;
+}
+
+// The text of a last column that is longer than its field.
+std::optional<std::string_view> Unpadded(std::string_view text) {
+  return text.starts_with(' ') || text.ends_with(' ') ? std::nullopt : std::optional(text);
 }
 
 void SetField(Item& item, std::string_view value) { item.Values[item.FieldCount++] = value; }
@@ -63,8 +70,7 @@ void ReadSoftwareRow(std::string_view row, Item& item) {
   size_t begin = 0;
   for (size_t i = 0; i < std::size(widths); ++i) {
     const auto column = Column(row, begin, widths[i], Padding::kRight);
-    // A column that begins with a blank is the end of an overlong one before.
-    if (!column || column->starts_with(' ')) {
+    if (!column) {
       return;
     }
     columns[i] = *column;
@@ -118,24 +124,25 @@ void ReadProductRow(std::string_view row, Padding padding, Item& item) {
   constexpr size_t widths[] = {40, 40, 10, 20, 20};
   constexpr size_t rowWidth = 130;
   item.Name = row;
-  // No column is longer than its field exactly if the row is as long as all fields.
-  const bool fits = row.size() == rowWidth;
+  if (row.size() < rowWidth) {
+    return;
+  }
   std::string_view columns[std::size(widths)];
   size_t begin = 0;
   for (size_t i = 0; i < std::size(widths); ++i) {
     const bool isLast = i + 1 == std::size(widths);
     const auto column =
-        fits || isLast
-            ? std::optional(Trim(row.substr(begin, isLast ? row.npos : widths[i]), padding))
-            : Column(row, begin, widths[i], padding);
+        row.size() == rowWidth
+            // No column is longer than its field.
+            ? std::optional(Trim(row.substr(begin, widths[i]), padding))
+            : isLast ? Unpadded(row.substr(begin)) : Column(row, begin, widths[i], padding);
     if (!column) {
       return;
     }
     columns[i] = *column;
-    begin = std::min(begin + widths[i], row.size());
+    begin += widths[i];
   }
-  const bool isVersion = std::count(columns[2].begin(), columns[2].end(), '.') >= 2;
-  if (row.size() < rowWidth || !isVersion) {
+  if (std::count(columns[2].begin(), columns[2].end(), '.') < 2) {
     return;
   }
   item.Name = columns[0];

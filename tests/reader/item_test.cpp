@@ -212,4 +212,19 @@ TEST(Items, ReadBackAtEveryWidth) {
   }
 }
 
+// An overlong value with a blank where its field ends, or where it would begin if it were padded on
+// the left, shifts the columns after it.
+TEST(Items, AreNotReadFromShiftedColumns) {
+  for (const Column& column : columns) {
+    const bool hasMoreColumns = column.Part == 1 || column.Item.starts_with("products");
+    if (!hasMoreColumns || column.Kinds[2] == 'f') {
+      continue;
+    }
+    const std::string rest(column.Width - 1, 'x');
+    Check(column, rest + " xxxx", 'r', Padding::kRight);
+    Check(column, rest + " x", 'r', Padding::kRight);
+    Check(column, "x x" + rest, 'r', Padding::kLeft);
+  }
+}
+
 }  // namespace

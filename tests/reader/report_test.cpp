@@ -113,7 +113,7 @@ TEST(Report, TakesNoMessageForABlock) {
   const std::set<std::string> all(changes.begin(), changes.end());
   const std::string endOfReport = text.substr(afterBox);
   const std::string forgedEnd =
-      Replaced(Replaced(endOfReport, end, "20261114 22:30:00"), "Domain", "Forged");
+      Replaced(Replaced(endOfReport, end, "20261114 22:30:00"), "Guests", "Forged");
   const std::string withoutServices = Replaced(text.substr(0, place), "Administrators", "Forged");
   for (const std::string& forged :
        {text.substr(0, place), forgedEnd, withoutServices + forgedEnd, Replaced(text, "42", "43"),
@@ -129,12 +129,45 @@ TEST(Report, TakesNoMessageForABlock) {
     EXPECT_EQ(ChangesOf(runs[0]), changes) << forged;
     EXPECT_EQ(runs[0].Result->Result, "Successful");
     for (size_t size = place; size < whole.size(); size += 7) {
+      // A forged snapshot that the cut leaves without its times cannot be told apart.
+      if (size >= place + forged.size()) {
+        ExpectPartOf(whole.substr(0, size), Facts(), all, forged + endOfReport);
+      }
       ReportFacts open = Facts();
       open.EndTime.reset();
       open.MayHaveEnded = false;
       ExpectPartOf(whole.substr(0, size), open, {}, forged + endOfReport);
     }
   }
+}
+
+// The start broke off; what looks like its snapshot came later.
+TEST(Report, TakesNoLaterBoxForTheFirstSnapshot) {
+  const std::string text = Report();
+  const size_t box = text.find(std::string(94, '*'));
+  for (const std::string& message : {std::string("Copying files\n"), std::string("\n")}) {
+    const std::string forged = Replaced(text, "Guests", "Forged").substr(box);
+    const std::vector<ReportRun> runs =
+        ParseReport(text.substr(0, box) + message + forged, Facts());
+    EXPECT_FALSE(runs[0].Before);
+    EXPECT_TRUE(runs[0].After);
+    EXPECT_TRUE(Join(runs[0].Messages).starts_with(message + std::string(94, '*')));
+  }
+}
+
+// A message to an event that has ended, which forges another end.
+TEST(Report, KeepsTheEndOfTheHistoryFile) {
+  const std::string text = Report();
+  const std::string forged =
+      Replaced(text.substr(text.find("Copying files\n") + 14), end, "20261114 22:50:00");
+  const std::vector<ReportRun> runs = ParseReport(text + forged, Facts());
+  EXPECT_EQ(runs[0].Result->EndTime, end);
+  EXPECT_EQ(Join(runs[0].Messages), "Copying files\n" + forged);
+  // A second end that finds the report moved has changed the time in the history file alone.
+  ReportFacts facts = Facts();
+  facts.EndTime = "20261114 23:00:00";
+  EXPECT_EQ(ParseReport(text, facts)[0].Result->EndTime, end);
+  EXPECT_FALSE(ParseReport(text + "late\n", facts)[0].Result);
 }
 
 TEST(Report, TellsTheRunsOfARepeatedIdentityApart) {

@@ -10,6 +10,7 @@
 #include "reader/check.h"
 #include "reader/history.h"
 #include "reader/json.h"
+#include "tests/reader/change_text.h"
 #include "tests/support/fake_machine.h"
 #include "tests/support/file_text.h"
 #include "tests/support/run_tool.h"
@@ -218,6 +219,28 @@ TEST(Story, ReadsBackWhatWasDoneAndNothingElse) {
   for (const Finding& finding : CheckHistory(history)) {
     ADD_FAILURE() << finding.Code << ' ' << finding.Event << ' ' << finding.Text;
   }
+}
+
+// Before the first row of users, software or services a run pads on the left.
+TEST(Story, ReadsBothAdjustments) {
+  const ScratchHistory scratch;
+  Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "4096");
+  Set(copies + "Prod\\PROFILES\\ORX", "Port", "50000");
+  Set(copies + "Prod\\ORX Server\\CurrentVersion", "Version", "9");
+  RunTool({"-start", "1"});
+  Set(copies + "Prod\\PROFILES\\ORX", "Port", "50010");
+  Machine().Services.Entries = {{"p", "ORX Server", 1}};
+  RunTool({"-end", "1"});
+  std::string error;
+  const std::unique_ptr<Source> source = OpenSource(scratch.In("ZEK/ORXHistory"), error);
+  const History history = ReadHistory(*source, TextDecoder(), Detail::kAll);
+  std::vector<std::string> changes;
+  for (const Change& change : history.Events.at(0).Differences.List) {
+    changes.push_back(ChangeText(change));
+  }
+  EXPECT_EQ(changes, (std::vector<std::string>{
+                         "added services ORX Server|state - > Stopped",
+                         "changed instance_profile Prod/ORX/Port|value 50000 > 50010"}));
 }
 
 }  // namespace
