@@ -1,5 +1,6 @@
 #!/usr/bin/env python3
-"""Runs the examples of README.md and docs/integrating.md as they are written there.
+"""Runs the examples of README.md and docs/integrating.md as they are written there, and follows the
+links of all documents.
 
 usage: documented_examples.py PROGRAMS          the sessions of both and the shell script
        documented_examples.py PROGRAMS --wine   the batch file, with the programs for Windows
@@ -26,6 +27,12 @@ def blocks(page, language):
 def check(condition, what, evidence=""):
     if not condition:
         sys.exit(f"{what}\n{evidence}")
+
+
+def check_links(_programs, _scratch):
+    for page in [*REPOSITORY.glob("*.md"), *REPOSITORY.glob("docs/*.md")]:
+        for link in re.findall(r"\]\(([^)#:]+)", page.read_text(encoding="utf-8")):
+            check((page.parent / link).exists(), f"{page} has a link to {link}")
 
 
 def check_recorded(scratch, history, result):
@@ -102,7 +109,8 @@ def main():
     if "--wine" in sys.argv:
         cases = [(check_batch_file, programs, status) for status in (0, 3)]
     else:
-        cases = [(check_shell_script, programs, status) for status in (0, 3)]
+        cases = [(check_links, None)]
+        cases += [(check_shell_script, programs, status) for status in (0, 3)]
         cases += [(check_shell_script, None, 0)]
         start = 'ORXInstallEventLog -start 43 -Product "ORX Client 9.5" -Action Install'
         cases += [(check_sessions, programs, "README.md", ":"),
