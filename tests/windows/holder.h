@@ -4,7 +4,7 @@
 
 #include <chrono>
 #include <functional>
-#include <semaphore>
+#include <future>
 #include <string>
 #include <thread>
 
@@ -18,26 +18,23 @@ inline UniqueHandle OpenExisting(const std::string& path, DWORD access, DWORD sh
 // Another program: what it acquires it keeps until the object ends, or for the time given.
 class Holder {
  public:
-  Holder(std::function<UniqueHandle()> acquire, std::chrono::steady_clock::duration time)
-      : Thread([this, acquire = std::move(acquire), time] {
+  Holder(const std::function<UniqueHandle()>& acquire, std::chrono::steady_clock::duration time)
+      : Thread([this, acquire, time] {
           const UniqueHandle held = acquire();
-          IsHeld = held != nullptr;
-          Acquired.release();
-          Ended.try_acquire_for(time);
+          Acquired.set_value(held != nullptr);
+          Ended.get_future().wait_for(time);
         }) {
-    Acquired.acquire();
-    EXPECT_TRUE(IsHeld);
+    EXPECT_TRUE(Acquired.get_future().get());
   }
   ~Holder() {
-    Ended.release();
+    Ended.set_value();
     Thread.join();
   }
   Holder(const Holder&) = delete;
   Holder& operator=(const Holder&) = delete;
 
  private:
-  bool IsHeld = false;
-  std::binary_semaphore Acquired{0};
-  std::binary_semaphore Ended{0};
+  std::promise<bool> Acquired;
+  std::promise<void> Ended;
   std::thread Thread;
 };
