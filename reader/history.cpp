@@ -14,7 +14,7 @@
 
 namespace {
 
-constexpr std::string_view reportName = "ORXInstallEvent.Log";
+const std::string reportName = "ORXInstallEvent.Log";
 
 // Of the changes and messages that are kept, over all events.
 constexpr size_t mostBytesKept = 96 << 20;
@@ -107,6 +107,7 @@ class HistoryReader {
       facts.Identity = section.Name;
       facts.StartTime = IfNotEmpty(section.StartTime);
       facts.EndTime = IfNotEmpty(section.EndTime);
+      facts.IsPlaced = Files.PathOf(*report) != Decoder.ToUtf8(section.Name) + '/' + reportName;
       facts.MayHaveEnded = HasEnded(section);
       ReadReport(*report, facts);
     }
@@ -118,7 +119,7 @@ class HistoryReader {
     if (const auto file = Files.FindNamed(eventLogFile)) {
       return file;
     }
-    const std::string ownPath = event.Identity + '/' + std::string(reportName);
+    const std::string ownPath = event.Identity + '/' + reportName;
     const auto file = event.Copy.empty() ? std::nullopt : Files.Find(event.Copy + '/' + ownPath);
     return file || !eventLogFile.empty() ? file : Files.Find(ownPath);
   }

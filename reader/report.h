@@ -51,6 +51,7 @@ struct ReportFacts {
   std::optional<std::string> Identity;
   std::optional<std::string> StartTime;
   std::optional<std::string> EndTime;
+  bool IsPlaced = false;     // the report is in the folder of its copy, where no later run writes
   bool MayHaveEnded = true;  // false for an event that is open: nothing in its report is an end
 };
 

@@ -211,10 +211,11 @@ class RunReader {
            (result.EndTime.data() == nullptr || HasEndOfFacts(ending));
   }
 
-  // A second end finds the folder moved: it changes the time in the history file, not the report.
+  // A second end finds the folder moved: it changes the time in the history file, and no report.
   bool IsEarlierEndOfFacts(const Ending& ending) const {
-    return ending.Blocks.Status == EndStatus::kWhole && HasStartOfFacts(ending) && Facts.EndTime &&
-           ending.Blocks.Result.EndTime < *Facts.EndTime && ending.Blocks.End == Text.size();
+    return Facts.IsPlaced && ending.Blocks.Status == EndStatus::kWhole && HasStartOfFacts(ending) &&
+           Facts.EndTime && ending.Blocks.Result.EndTime < *Facts.EndTime &&
+           ending.Blocks.End == Text.size();
   }
 
   void TakeEnding(const Ending& ending) {

@@ -113,6 +113,20 @@ TEST(Changes, PairItemsOfOneIdentity) {
   }
 }
 
+TEST(Changes, AreNotReadFromATableThatIsNone) {
+  const std::string before = Services({{"ORX", "Started"}});
+  for (const std::string& after :
+       {before.substr(0, before.size() - 1), before + "\n", "\n" + before, std::string()}) {
+    Snapshot old;
+    Snapshot now;
+    old.Parts[3] = before;
+    now.Parts[3] = after;
+    const Changes changes = CompareSnapshots(old, now, TextDecoder(), ChangeDetail::kList);
+    EXPECT_TRUE(changes.List.empty());
+    EXPECT_FALSE(changes.Compared[static_cast<size_t>(Section::kServices)]);
+  }
+}
+
 class HistoryOf {
  public:
   explicit HistoryOf(const std::string& folder, const std::optional<std::string>& identity = {})

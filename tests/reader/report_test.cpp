@@ -119,6 +119,7 @@ TEST(Report, TakesNoMessageForABlock) {
        {text.substr(0, place), forgedEnd, withoutServices + forgedEnd, Replaced(text, "42", "43"),
         endOfReport.substr(0, endOfReport.size() / 2) + '\n',
         endOfReport.substr(0, endOfReport.find("Result of")),
+        forgedEnd.substr(0, forgedEnd.find("ORX Products & Build Level   :")),
         std::string("---------- ORX Installation History Logger ( End ) ----------") + end + '\n',
         std::string(94, '*') + '\n', std::string("\n2) Software Installed on the machine:\n")}) {
     std::string whole = text;
@@ -128,9 +129,11 @@ TEST(Report, TakesNoMessageForABlock) {
     EXPECT_EQ(Join(runs[0].Messages), forged);
     EXPECT_EQ(ChangesOf(runs[0]), changes) << forged;
     EXPECT_EQ(runs[0].Result->Result, "Successful");
+    const size_t forgedToo = place + forged.size();
+    ExpectPartOf(whole.substr(0, forgedToo), Facts(), all, forged);
     for (size_t size = place; size < whole.size(); size += 7) {
       // A forged snapshot that the cut leaves without its times cannot be told apart.
-      if (size >= place + forged.size()) {
+      if (size > forgedToo) {
         ExpectPartOf(whole.substr(0, size), Facts(), all, forged + endOfReport);
       }
       ReportFacts open = Facts();
@@ -166,6 +169,8 @@ TEST(Report, KeepsTheEndOfTheHistoryFile) {
   // A second end that finds the report moved has changed the time in the history file alone.
   ReportFacts facts = Facts();
   facts.EndTime = "20261114 23:00:00";
+  EXPECT_FALSE(ParseReport(text, facts)[0].Result);
+  facts.IsPlaced = true;
   EXPECT_EQ(ParseReport(text, facts)[0].Result->EndTime, end);
   EXPECT_FALSE(ParseReport(text + "late\n", facts)[0].Result);
 }
