@@ -1,32 +1,26 @@
 // The report reader: any bytes are a report, in any order of its blocks. Nothing is read beyond the
 // text, what is read back is part of it, and its changes are valid UTF-8.
 
-#include <cstdlib>
 #include <string>
 
+#include "fuzz/support.h"
 #include "reader/change.h"
 #include "reader/report.h"
 #include "reader/text_encoding.h"
 
 namespace {
 
-void Demand(bool isTrue) {
-  if (!isTrue) {
-    std::abort();
-  }
-}
-
 void CheckSnapshots(const ReportRun& run) {
   const Snapshot none = {};
   const Changes changes = CompareSnapshots(run.Before.value_or(none), run.After.value_or(none),
                                            TextDecoder(), ChangeDetail::kList);
   const ChangeCounts& counts = changes.Counts;
-  Demand(changes.List.size() == counts.Added + counts.Removed + counts.Changed);
+  Require(changes.List.size() == counts.Added + counts.Removed + counts.Changed);
   for (const Change& change : changes.List) {
-    Demand(IsUtf8(change.Name));
+    Require(IsUtf8(change.Name));
   }
   const Snapshot& whole = run.Before.value_or(none);
-  Demand(CompareSnapshots(whole, whole, TextDecoder(), ChangeDetail::kList).List.empty());
+  Require(CompareSnapshots(whole, whole, TextDecoder(), ChangeDetail::kList).List.empty());
 }
 
 }  // namespace
@@ -40,11 +34,11 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   }
   UnifyLineEnds(text);
   const std::vector<ReportRun> runs = ParseReport(text, facts);
-  Demand(!runs.empty());
+  Require(!runs.empty());
   for (const ReportRun& run : runs) {
     for (const std::string_view piece : run.Messages) {
-      Demand(piece.empty() || (piece.data() >= text.data() &&
-                               piece.data() + piece.size() <= text.data() + text.size()));
+      Require(piece.empty() || (piece.data() >= text.data() &&
+                                piece.data() + piece.size() <= text.data() + text.size()));
     }
     CheckSnapshots(run);
   }

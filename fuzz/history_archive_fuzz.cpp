@@ -2,10 +2,10 @@
 // JSON, are valid UTF-8 without a control character; what cannot be read is a finding or one line.
 
 #include <algorithm>
-#include <cstdlib>
 #include <cstring>
 #include <string>
 
+#include "fuzz/support.h"
 #include "reader/check.h"
 #include "reader/history.h"
 #include "reader/json.h"
@@ -13,12 +13,6 @@
 #include "reader/views.h"
 
 namespace {
-
-void Demand(bool isTrue) {
-  if (!isTrue) {
-    std::abort();
-  }
-}
 
 bool IsHarmless(const std::string& text) {
   return IsUtf8(text) && std::none_of(text.begin(), text.end(), [](char c) {
@@ -30,12 +24,12 @@ void Show(const History& history) {
   std::vector<const Event*> events;
   for (const Event& event : history.Events) {
     events.push_back(&event);
-    Demand(IsHarmless(ShowText(event, {})));
-    Demand(IsHarmless(ChangesText(event, {60, false, true})));
-    Demand(IsHarmless(EventDetailsJson(history.Source, event)));
+    Require(IsHarmless(ShowText(event, {})));
+    Require(IsHarmless(ChangesText(event, {60, false, true})));
+    Require(IsHarmless(EventDetailsJson(history.Source, event)));
   }
-  Demand(IsHarmless(ListText(events, {60, false, false})));
-  Demand(IsHarmless(FindingsText(CheckHistory(history), {})));
+  Require(IsHarmless(ListText(events, {60, false, false})));
+  Require(IsHarmless(FindingsText(CheckHistory(history), {})));
 }
 
 }  // namespace
@@ -50,12 +44,12 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   std::string error;
   const std::unique_ptr<Source> source = OpenArchive(bytes, error);
   if (!source) {
-    Demand(!error.empty() && IsHarmless(error));
+    Require(!error.empty() && IsHarmless(error));
     return 0;
   }
   Show(ReadHistory(*source, TextDecoder(), Detail::kAll));
   for (const Finding& finding : source->Findings) {
-    Demand(IsUtf8(finding.Text));
+    Require(IsUtf8(finding.Text));
   }
   return 0;
 }
