@@ -1,6 +1,7 @@
 #include "reader/history.h"
 
 #include <algorithm>
+#include <iterator>
 #include <string>
 #include <unordered_map>
 #include <unordered_set>
@@ -182,15 +183,16 @@ class HistoryReader {
     }
     UnifyLineEnds(*text);
     const std::vector<ReportRun> runs = ParseReport(*text, facts);
-    const Event event = Result.Events.back();
-    TakeRun(runs.back(), Result.Events.back());
-    for (size_t i = 0; i + 1 < runs.size(); ++i) {
-      Event& earlier = Result.Events.emplace_back();
-      earlier.Identity = event.Identity;
-      earlier.Origin = EventOrigin::kEarlierRun;
-      earlier.Report = event.Report;
-      TakeRun(runs[i], earlier);
+    Event& event = Result.Events.back();
+    TakeRun(runs.back(), event);
+    std::vector<Event> earlier(runs.size() - 1);
+    for (size_t i = 0; i < earlier.size(); ++i) {
+      earlier[i].Identity = event.Identity;
+      earlier[i].Origin = EventOrigin::kEarlierRun;
+      earlier[i].Report = event.Report;
+      TakeRun(runs[i], earlier[i]);
     }
+    std::move(earlier.begin(), earlier.end(), std::back_inserter(Result.Events));
   }
 
   void TakeRun(const ReportRun& run, Event& event) {

@@ -4,6 +4,7 @@
 
 #include <filesystem>
 #include <map>
+#include <regex>
 #include <set>
 
 #include "app/install_history.h"
@@ -220,6 +221,25 @@ TEST(Check, WarnsBeforeTheListOfNamesIsFull) {
               !code.empty());
     EXPECT_TRUE(code.empty() || codes.contains(code)) << bytes;
   }
+}
+
+// Two starts at once can leave the report of the earlier one before that of the later.
+TEST(History, HasTheEarlierRunOfAReport) {
+  const ScratchHistory scratch;
+  RunTool({"-start", "1", "-Product", "first"});
+  const std::string first = std::regex_replace(FileText(InHistory("1/ORXInstallEvent.Log")),
+                                               std::regex("[0-9]{8} "), "20200101 ");
+  RunTool({"-start", "1", "-Product", "second"});
+  RunTool({"-end", "1", "-Result", "0"});
+  const std::string log = InHistory("1/ORXInstallEvent.Log");
+  WriteFileText(log, first + FileText(log));
+  const HistoryOf history(FolderOf(scratch));
+  std::string lines;
+  for (const Event& event : history.Result.Events) {
+    lines += event.Product + ' ' + std::string(StateName(event.State)) + '\n';
+  }
+  EXPECT_EQ(lines, "first open\nsecond ok\n");
+  EXPECT_TRUE(Codes(history.Result).contains("warning started-again 1"));
 }
 
 // The facts as the history file has them: names without case, the first of two, no quotation marks;
