@@ -15,9 +15,9 @@
 namespace {
 
 bool IsHarmless(const std::string& text) {
-  return IsUtf8(text) && std::none_of(text.begin(), text.end(), [](char c) {
-           return (c >= 0 && c < ' ' && c != '\n') || c == '\x7F';
-         });
+  return IsUtf8(text) && text.find("\u009B") == std::string::npos &&
+         std::none_of(text.begin(), text.end(),
+                      [](char c) { return (c >= 0 && c < ' ' && c != '\n') || c == '\x7F'; });
 }
 
 void Show(const History& history) {

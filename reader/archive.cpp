@@ -77,8 +77,9 @@ void Archive::ReadDirectory() {
                             std::to_string(info.number_entry) + " entries.");
   }
   if (LongNames > 0) {
-    AllComplaints.push_back(std::to_string(LongNames) + " entries are left out: their names have " +
-                            "more than " + std::to_string(kMostBytesOfName) + " bytes.");
+    AllComplaints.push_back("Entries left out, as their names have more than " +
+                            std::to_string(kMostBytesOfName) +
+                            " bytes: " + std::to_string(LongNames) + ".");
   }
   TurnNamesToPaths(AllEntries);
 }

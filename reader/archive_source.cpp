@@ -39,9 +39,9 @@ ArchiveSource::ArchiveSource(std::unique_ptr<Archive> archive) : Zip(std::move(a
   }
   if (refused > 0) {
     Findings.push_back({FindingLevel::kWarning, "damaged", "",
-                        std::to_string(refused) +
-                            " entries are left out: their names lead out of the archive's folder, "
-                            "are no names, or are there twice."});
+                        "Entries left out, as their names lead out of the archive's folder, are no "
+                        "names, or are there twice: " +
+                            std::to_string(refused) + "."});
   }
 }
 

@@ -9,8 +9,27 @@ namespace {
 
 using Json = nlohmann::ordered_json;
 
+// JSON may have the characters U+007F to U+009F as they are, but a terminal could obey them.
+std::string WithoutControls(const std::string& json) {
+  constexpr char digits[] = "0123456789abcdef";
+  std::string result;
+  result.reserve(json.size());
+  for (size_t i = 0; i < json.size(); ++i) {
+    const bool isPair = json[i] == '\xC2' && (json[i + 1] & 0xE0) == 0x80;
+    i += isPair ? 1 : 0;
+    if (isPair || json[i] == '\x7F') {
+      const auto byte = static_cast<unsigned char>(json[i]);
+      result.append("\\u00") += {digits[byte >> 4], digits[byte & 0xF]};
+    } else {
+      result += json[i];
+    }
+  }
+  return result;
+}
+
 std::string Line(const Json& object) {
-  return object.dump(/*indent=*/-1, ' ', /*ensure_ascii=*/false, Json::error_handler_t::replace);
+  return WithoutControls(
+      object.dump(/*indent=*/-1, ' ', /*ensure_ascii=*/false, Json::error_handler_t::replace));
 }
 
 template <typename T>

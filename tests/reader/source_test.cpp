@@ -85,8 +85,8 @@ TEST(Source, ReadsArchivesOfEveryMaker) {
 TEST(Source, LeavesOutWhatIsHostile) {
   const BuiltEntry good = {ini, "i"};
   const std::string refused =
-      "History.ini=i ! 1 entries are left out: their names lead out of the archive's folder, "
-      "are no names, or are there twice.";
+      "History.ini=i ! Entries left out, as their names lead out of the archive's folder, are no "
+      "names, or are there twice: 1.";
   struct {
     const char* What;
     std::vector<BuiltEntry> Entries;
@@ -102,7 +102,7 @@ TEST(Source, LeavesOutWhatIsHostile) {
       {"a link", {{"a", "/etc/passwd", link}, good}, "History.ini=i"},
       {"a long name",
        {{std::string(5000, 'a'), "x"}, good},
-       "History.ini=i ! 1 entries are left out: their names have more than 4096 bytes."},
+       "History.ini=i ! Entries left out, as their names have more than 4096 bytes: 1."},
       {"encrypted",
        {{ini, "i", 0, 1}},
        "History.ini=? ! History.ini is encrypted; ask for an archive without a password."},
