@@ -150,8 +150,8 @@ TEST(Report, TakesNoLaterBoxForTheFirstSnapshot) {
   const size_t box = text.find(std::string(94, '*'));
   for (const std::string& message : {std::string("Copying files\n"), std::string("\n")}) {
     const std::string forged = Replaced(text, "Guests", "Forged").substr(box);
-    const std::vector<ReportRun> runs =
-        ParseReport(text.substr(0, box) + message + forged, Facts());
+    const std::string whole = text.substr(0, box) + message + forged;
+    const std::vector<ReportRun> runs = ParseReport(whole, Facts());
     EXPECT_FALSE(runs[0].Before);
     EXPECT_TRUE(runs[0].After);
     EXPECT_TRUE(Join(runs[0].Messages).starts_with(message + std::string(94, '*')));
@@ -163,7 +163,8 @@ TEST(Report, KeepsTheEndOfTheHistoryFile) {
   const std::string text = Report();
   const std::string forged =
       Replaced(text.substr(text.find("Copying files\n") + 14), end, "20261114 22:50:00");
-  const std::vector<ReportRun> runs = ParseReport(text + forged, Facts());
+  const std::string whole = text + forged;
+  const std::vector<ReportRun> runs = ParseReport(whole, Facts());
   EXPECT_EQ(runs[0].Result->EndTime, end);
   EXPECT_EQ(Join(runs[0].Messages), "Copying files\n" + forged);
   // A second end that finds the report moved has changed the time in the history file alone.
