@@ -95,8 +95,8 @@ std::string Repeated(const std::string& text, size_t times) {
   return result;
 }
 
-// A line with more than Windows allows is damaged; what is allowed and does not fit the limit of
-// the interface ends a list.
+// A heading with more than Windows allows is damaged; a name that is allowed but does not fit the
+// limit of the interface ends a list.
 TEST(Registry, KeepsTheLimitsOfNames) {
   const std::string longest = Repeated("l", 255);
   const std::string pairs = Repeated("😀", 128);  // 256 characters of Windows
@@ -107,9 +107,9 @@ TEST(Registry, KeepsTheLimitsOfNames) {
             "]\n\"value\"=\"of " + name + "\"\n";
   }
   RegistryExport registry(ReaderOf(text));
-  const std::vector<std::string> names = {longest, "after"};
-  EXPECT_EQ(registry.ValueNames("S"), names);
-  EXPECT_EQ(registry.SubKeyNames("S"), names);
+  EXPECT_EQ(registry.ValueNames("S"), std::vector{longest});
+  EXPECT_EQ(registry.SubKeyNames("S"), (std::vector<std::string>{longest, "after"}));
+  EXPECT_EQ(registry.Read("S", longest + "l", 4).Bytes, "abc\0"s);
   EXPECT_EQ(registry.ValueNames("S\\" + longest + "l").size(), 0U);
   EXPECT_EQ(registry.Read("S\\" + wide, "value", 1000).Bytes, "of " + wide + '\0');
   EXPECT_EQ(registry.Read("S", "after", 4).Bytes, "abc\0"s);

@@ -26,7 +26,7 @@ inline bool IsAtOrBelow(std::string_view path, std::string_view top) {
 
 inline std::string_view FirstName(std::string_view path) { return path.substr(0, path.find('\\')); }
 
-// Windows allows 255 characters, counted in UTF-16: four bytes of UTF-8 are two.
+// Of a key Windows allows 255 characters, counted in UTF-16: four bytes of UTF-8 are two.
 inline bool IsNameTooLong(std::string_view name) {
   size_t characters = 0;
   for (const char c : name) {

@@ -36,7 +36,7 @@ class LineParser {
   std::string TakeName() {
     const std::string_view before = Text;
     std::string name = Take("@") ? "" : TakeQuoted();
-    Failed = Failed || HasLineBreakSince(before) || IsNameTooLong(name);
+    Failed = Failed || HasLineBreakSince(before);
     return name;
   }
 
