@@ -7,8 +7,8 @@
 #include "history/ini_file.h"
 #include "platform/profile_file.h"
 
-// The record of one event. The fields hold what this run's command line says; the accessors read
-// and write what the history file says about the event. Neither follows the other.
+// The record of one event. The fields are the values from this run's command line; the accessors
+// read and write the event's section of the history file. Neither changes the other.
 //
 // Nothing here reports a failure: a step that fails has no effect, and the next steps still run.
 class CInstallEvent {

@@ -37,8 +37,8 @@ class CInstallHistory {
   void GroupEvents(const std::vector<std::string>& sections,
                    std::vector<std::unique_ptr<CCopyEvents>>& groups) const;
 
-  // After Report: false if the archive was not put in place, or lacks what the zip format has no
-  // room for.
+  // After Report: false if the archive could not be completed or renamed to its name, or if a limit
+  // of the zip format left something out of it.
   bool IsArchiveComplete = false;
 
   int32_t EventCount = 0;  // the number of starts so far

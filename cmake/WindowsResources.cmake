@@ -1,5 +1,5 @@
-# Gives a program its manifest (the systems that it knows, and that it runs with its caller's rights)
-# and the resource that names its version. The description is the one line that the system shows.
+# Adds a program's manifest (the systems that it knows, and that it runs with its caller's rights)
+# and the resource with its version. The description is one line, which the system shows.
 enable_language(RC)
 
 function(orx_add_windows_resources target)

@@ -9,8 +9,8 @@
 // file see each other's writes at once.
 //
 // A line break in a section name or value is stored as one blank; a value is read up to its first
-// NUL. A file, section or key that does not exist, or a file that cannot be read, gives the
-// fallback, without an error.
+// NUL. A read returns the fallback if the file cannot be read, or if the file, section or key does
+// not exist; no error is reported.
 class CIniFile {
  public:
   explicit CIniFile(const std::string& path);

@@ -4,10 +4,9 @@
 
 #include "platform/files.h"
 
-// The paths of the history. None is cached: each call works it out again. None ends with a
-// separator.
+// The paths of the history. None is cached: each call computes it again.
 
-// The common application data folder of the machine.
+// The common application data folder of the machine, as GetFolderPath returns it.
 std::string GetCommonAppDataPath();
 
 // The maker's folder, ZEK in the common application data folder.
@@ -19,9 +18,9 @@ std::string GetHistoryDir();
 // The history file, History.ini in the history folder.
 std::string GetHistoryFilePath();
 
-// True if both folders exist afterwards and neither is a link, which anybody could have placed
-// there before the first run; if not, the path of the first one that fails is stored in "failed".
-// Both are made for all users (FolderAccess::kShared).
+// Creates the maker's folder and the history folder, for all users (FolderAccess::kShared), unless
+// they exist. False if one of them does not exist afterwards, or is a link, which any user could
+// have created before the first run; its path is then stored in "failed".
 bool EnsureHistoryDir(std::string& failed);
 
 // True if the history folder exists and neither it nor the maker's folder is a link.

@@ -32,8 +32,8 @@ class CUsersList : public Info {
   void CollectGlobalGroups();
   void CollectGlobalMembers();
 
-  // Two backslashes and the computer name: the only server that is asked. Empty, which means this
-  // machine too, if the name is not known.
+  // The server that is queried: two backslashes and the computer name. Empty, which also means this
+  // machine, if the name is not known.
   std::string ServerName;
 
   std::string LoggedOnUser;  // "DOMAIN\name"; "name" if the domain is not known; or empty

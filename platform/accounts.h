@@ -8,9 +8,9 @@
 // itself. The name of a group, of a member or of a user without a domain that needs more than 128
 // bytes with its terminator is returned as an empty text.
 //
-// POSIX: the name service is asked once in a run, in a child process, and everything below answers
-// from that. It has ten seconds for all of it. When they have passed, there are no groups, and no
-// user if that was not known by then. The server is ignored.
+// POSIX: a child process queries the name service once in a run, for at most ten seconds, and all
+// functions below use its result. After the ten seconds there are no groups, and no user if it was
+// not known by then. The server is ignored.
 
 // The user that runs the tool, as domain, backslash, name; nothing if the system does not know.
 // Windows: GetUserNameExA, at most 1024 bytes. POSIX: getpwuid of the effective user, with the host

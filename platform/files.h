@@ -21,9 +21,9 @@ FileKind KindOf(const std::string& path);
 bool IsSymbolicLink(const std::string& path);
 
 // True if both paths lead to the same existing file or folder: in another spelling, through a link,
-// by another hard link. False for a device.
-// Windows: CreateFileA, GetFileInformationByHandle (volume and file index). POSIX: stat (device and
-// inode).
+// by another hard link.
+// Windows: CreateFileA, GetFileInformationByHandle (volume and file index); false for a device.
+// POSIX: stat (device and inode).
 bool IsSameFile(const std::string& first, const std::string& second);
 
 enum class FolderAccess {
@@ -42,7 +42,8 @@ bool CreateFolder(const std::string& path, FolderAccess access = FolderAccess::k
 // Moves a folder with its contents in one step. False, with nothing moved, if anything of the
 // target's name exists (an empty folder too), or the source is not a folder or is a link to one.
 // Windows: MoveFileA; a folder with a file in use is waited for, up to 0.2 seconds. POSIX:
-// renameat2 with RENAME_NOREPLACE.
+// renameat2 with RENAME_NOREPLACE; on a file system without that flag, an empty folder that is
+// created at the same moment can be replaced.
 bool MoveFolder(const std::string& source, const std::string& target);
 
 // Copies a regular file to a name that nothing has yet, with its last-write time and permissions
@@ -54,8 +55,8 @@ bool MoveFolder(const std::string& source, const std::string& target);
 // for, up to 0.2 seconds. POSIX: sendfile, fchmod, futimens.
 //
 // The source is opened with the rights of the owner of the file "trusted", where they are less than
-// those of this process: who can write a path to the trusted file cannot have a file copied that he
-// may not read. POSIX: setfsuid, setfsgid and setgroups, if the process is root's. Windows: not
-// possible; the access list of FolderAccess::kShared takes its place.
+// those of this process: whoever can write a path into the trusted file cannot have a file copied
+// that he may not read. POSIX: setfsuid, setfsgid and setgroups, if the process is root's. Windows:
+// not possible; the access list of FolderAccess::kShared protects the trusted file instead.
 bool CopyToNewFile(const std::string& source, const std::string& target,
                    const std::string& trusted);

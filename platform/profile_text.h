@@ -20,8 +20,8 @@ struct ProfileLine {
 // not count, nor does the case of the letters A to Z. If two sections, or two keys of one section,
 // have the same name, the first one counts. A byte order mark (UTF-8) at the start is skipped.
 //
-// Set changes only the key that it is given: blank lines, comments, damaged lines and line ends of
-// a file edited by hand stay as they are.
+// Set changes only the named key: blank lines, comments, damaged lines and line ends of a file
+// edited by hand stay as they are.
 class ProfileText {
  public:
   explicit ProfileText(std::string text);

@@ -7,7 +7,7 @@
 
 // Read access to the registry below HKEY_LOCAL_MACHINE. A key path is names with one backslash
 // between them; one at its end is ignored. Names are found without regard to case and returned as
-// the registry holds them. What cannot be opened is empty.
+// the registry stores them. What cannot be opened is empty.
 //
 // Windows: RegOpenKeyExA, RegQueryValueExA, RegEnumValueA, RegEnumKeyExA, RegCloseKey.
 // POSIX: the registry export ZEK/Registry.reg below the common application data folder, opened with

@@ -2,11 +2,11 @@
 
 #include <string>
 
-// A file that is written under a temporary name and then takes its place in one step, so that
+// A file that is written under a temporary name and then renamed to its target in one step, so that
 // nobody sees it half written. The constructor creates it empty, in the folder of its target, with
-// a name of RandomPathBeside that nothing had yet. Only its owner may read it (POSIX: mode 0600;
-// Windows: the security that the folder gives to new files). The destructor removes it unless it
-// took its place. What a killed process leaves keeps its name, which begins with a dot.
+// an unused name from RandomPathBeside. Only its owner may read it (POSIX: mode 0600; Windows: the
+// security that new files inherit from the folder). The destructor removes it unless it was
+// renamed. A killed process leaves it under its temporary name, which begins with a dot.
 class TemporaryFile {
  public:
   explicit TemporaryFile(const std::string& target);

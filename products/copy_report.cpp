@@ -10,7 +10,7 @@ void PrintProductRow(const CORXProduct& product) {
   const CORXVersion& version = product.VersionInfo;
   CLogger& log = CLogger::GetInstance();
   log << std::setw(40) << product.Name << std::setw(40) << product.ProductCode;
-  // One text, so that the field pads the whole of it.
+  // Joined first, so that the field width applies to the whole version.
   log << std::setw(10) << version.Version + '.' + version.Release + '.' + version.Modification;
   log << std::setw(20) << version.ServiceLevel << std::setw(20) << product.LastModifiedDate
       << std::endl;

@@ -44,7 +44,7 @@ class Archive {
 
   // Unpacks an entry piece by piece into the sink, which returns false to stop. False, and the
   // reason as the end of a sentence that begins with the entry's name, if it cannot be unpacked
-  // whole; what the sink got until then is worth nothing.
+  // whole; the bytes that the sink got by then may be damaged.
   bool Unpack(const ArchiveEntry& entry, const std::function<bool(std::string_view)>& sink,
               std::string& reason);
 

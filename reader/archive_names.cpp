@@ -10,8 +10,9 @@ namespace {
 using Names = std::unordered_set<std::string_view>;
 
 // The recorder on Windows writes names in the machine's code page, where a backslash can be the
-// second byte of a character. The first byte of such a character is never ASCII; and in doubt the
-// entry of the folder shows, which the recorder writes before those of its contents.
+// second byte of a character. The first byte of such a character is never ASCII. After another byte
+// the backslash is a separator if what is before it is the name of a folder's entry, which the
+// recorder writes for every folder.
 bool IsSeparator(std::string_view name, size_t at, const Names& folders) {
   return name[at] == '\\' && (at == 0 || static_cast<uint8_t>(name[at - 1]) < 0x80 ||
                               folders.empty() || folders.contains(name.substr(0, at)));

@@ -6,13 +6,13 @@
 
 #include "reader/archive.h"
 
-// The file functions through which minizip reads the bytes of an archive. It asks for single bytes
-// and goes to and fro, so that a window of the bytes is kept.
+// The file functions through which minizip reads the bytes of an archive. It reads single bytes and
+// seeks back and forth, so a window of the bytes is kept in memory.
 class Archive::Stream {
  public:
   explicit Stream(ArchiveBytes bytes) : Bytes(std::move(bytes)) {}
 
-  // Good as long as this object lives and stays where it is.
+  // Valid as long as this object lives and is not moved.
   zlib_filefunc64_def Functions();
 
  private:

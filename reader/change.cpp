@@ -14,7 +14,8 @@ using Items = std::vector<Item>;
 using Indices = std::vector<size_t>;
 
 auto IdentityOf(const Item& item) {
-  // With fields or without is part of it: a row that could not be told apart is no value.
+  // The number of fields is part of it: a row whose columns could not be separated has none, and is
+  // never a changed form of one with fields.
   return std::tie(item.Where, item.Path, item.Name, item.FieldCount);
 }
 
@@ -22,14 +23,14 @@ auto ContentOf(const Item& item) { return std::tie(item.Values, item.Count); }
 
 // Makes one item of all processes of a name, with their number.
 void CountProcesses(Items& items) {
-  std::unordered_map<std::string_view, size_t> places;
+  std::unordered_map<std::string_view, size_t> indices;  // in the list below
   Items counted;
   for (const Item& item : items) {
-    const auto [place, isNew] = places.try_emplace(item.Name, counted.size());
+    const auto [entry, isNew] = indices.try_emplace(item.Name, counted.size());
     if (isNew) {
       counted.push_back(item);
     } else {
-      ++counted[place->second].Count;
+      ++counted[entry->second].Count;
     }
   }
   items = std::move(counted);

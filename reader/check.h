@@ -7,7 +7,7 @@
 #include "reader/history.h"
 
 // What is wrong or missing in a history that was read with Detail::kCounts or more, in the order of
-// its events. What the source itself found (Source::Findings) is not in it.
+// its events. It does not include Source::Findings.
 std::vector<Finding> CheckHistory(const History& history);
 
 // "error", "warning" or "note".

@@ -75,7 +75,7 @@ void DefineCommandLine(CLI::App& app, const std::string& version, CommandLine& l
   app.require_subcommand(0, 1);
 }
 
-// On one line, whatever an argument holds.
+// Printable, as an argument may contain line breaks.
 void PrintError(const std::string& text) {
   std::cerr << "orxhistory: " << Printable(TextDecoder().ToUtf8(text))
             << " (orxhistory --help shows the commands)" << std::endl;

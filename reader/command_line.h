@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-// What the caller asks for. All texts are as the system passes them.
+// The parsed command line. All texts are in the system's encoding.
 
 enum class Command { kList, kShow, kChanges, kFind, kCheck, kPage, kUnpack };
 

@@ -28,9 +28,12 @@ struct EventSection {
   std::string_view Result;
 };
 
-// Reads a section of the history file. False if it has no key of an event.
+// Reads the section of that index (ProfileText::NameOf). False if it has no key of an event. The
+// values are views into the text.
 bool ReadSection(const ProfileText& text, size_t section, EventSection& values);
 
+// True if the complete flag is TRUE or there is an end time.
 bool HasEnded(const EventSection& section);
 
+// kNoStart if the section has neither a start time nor an Event_ID; else open, or by its result.
 EventState StateOf(const EventSection& section);

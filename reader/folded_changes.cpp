@@ -11,7 +11,7 @@
 
 namespace {
 
-// Copies, instances and drivers hold the items whose paths begin with their own path and name.
+// Copies, instances and drivers contain the items whose paths begin with their own path and name.
 bool IsHolder(Section section) {
   return section == Section::kCopies || section == Section::kInstances ||
          section == Section::kDrivers;
@@ -36,7 +36,7 @@ Holder HolderOf(const Change& change) {
   return {change.Kind, IsOfDrivers(change.Where), path};
 }
 
-// The outermost of the holders that a change belongs to; none if it stands for itself.
+// The outermost of the holders that contain the item of a change; end() if none does.
 std::set<Holder>::const_iterator OutermostHolder(const std::set<Holder>& holders,
                                                  const Change& change) {
   if (!IsOfDrivers(change.Where) && !IsOfCopies(change.Where)) {

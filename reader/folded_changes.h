@@ -31,4 +31,5 @@ struct Category {
   bool HasChanges = false;
 };
 
+// All of them, in the order of the sections.
 std::vector<Category> CategoriesOf(const Changes& changes);

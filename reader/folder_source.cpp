@@ -23,7 +23,7 @@ class FolderSource : public Source {
   std::vector<std::string> Paths;  // by SourceFile::Entry, below Folder
 };
 
-// The folders nearest to the top come first, so that a limit costs what is deepest.
+// Breadth first, so that at the limit the deepest files are left out.
 FolderSource::FolderSource(const std::string& folder) : Folder(folder) {
   for (std::deque<std::string> folders = {""}; !folders.empty(); folders.pop_front()) {
     const std::string path = folders.front();

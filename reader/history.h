@@ -33,7 +33,7 @@ struct EventFile {
   std::string_view Key;    // "Log_File_Name", "Trace_File" or "Response_File"
   std::string Path;        // as the history file has it
   std::string Name;        // the last part of the path
-  bool IsPresent = false;  // it lies in the folder of the event
+  bool IsPresent = false;  // it is in the folder of the event
   uint64_t Size = 0;       // in bytes
 };
 

@@ -14,7 +14,7 @@ class HistoryFiles {
  public:
   HistoryFiles(const Source& source, const TextDecoder& decoder);
 
-  // The index in Source::Files.
+  // The index in Source::Files; nothing if there is no such file.
   std::optional<size_t> Find(std::string_view path) const;
   std::optional<size_t> FindIgnoringCase(std::string_view path) const;
 
@@ -22,6 +22,7 @@ class HistoryFiles {
   // of letters does not count for a path of Windows.
   std::optional<size_t> FindNamed(std::string_view fullPath) const;
 
+  // The path of Source::Files[file] as UTF-8.
   std::string PathOf(size_t file) const;
 
  private:

@@ -14,9 +14,9 @@ static bool Contains(std::string_view text, std::string_view wanted) {
 
 std::vector<Hit> FindInEvent(const Event& event, std::string_view text) {
   std::vector<Hit> hits;
-  const auto add = [&](std::string_view kind, std::string_view name, std::string_view place) {
-    if (Contains(place, text)) {
-      hits.push_back({kind, std::string(name), std::string(place)});
+  const auto add = [&](std::string_view kind, std::string_view name, std::string_view content) {
+    if (Contains(content, text)) {
+      hits.push_back({kind, std::string(name), std::string(content)});
     }
   };
   for (const Fact& fact : FactsOf(event)) {

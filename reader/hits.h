@@ -6,7 +6,7 @@
 
 #include "reader/history.h"
 
-// Where a text that was looked for is in an event. All texts are UTF-8.
+// A part of an event that contains the text searched for. All texts are UTF-8.
 struct Hit {
   std::string_view Kind;  // "fact", "message" or "change"
   std::string Name;       // of the fact, or the section of the change; empty for a message

@@ -37,7 +37,7 @@ std::span<const std::string_view> FieldNames(Section section);
 struct Item {
   Section Where = Section::kUser;
   uint8_t PathSize = 0;
-  uint8_t FieldCount = 0;  // 0 if the columns of the row cannot be told apart; then Name is the row
+  uint8_t FieldCount = 0;  // 0 if the columns of the row cannot be separated; then Name is the row
   std::array<std::string_view, 2> Path;
   std::string_view Name;
   std::array<std::string_view, 4> Values;

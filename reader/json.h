@@ -16,11 +16,12 @@ std::string EventJson(std::string_view source, const Event& event);
 // The same, with its command line, report, files, messages and changes.
 std::string EventDetailsJson(std::string_view source, const Event& event);
 
+// One change of an event: its kind, section, path, name and fields.
 std::string ChangeJson(std::string_view source, const Event& event, const Change& change);
 
+// The level, code, event and text of a finding.
 std::string FindingJson(std::string_view source, const Finding& finding);
 
-// A place in an event that has the text that was looked for: the kind of place ("fact", "message",
-// "change"), what it is there, and its text.
+// Something in an event that contains the text searched for; the last three are those of a Hit.
 std::string HitJson(std::string_view source, const Event& event, std::string_view kind,
                     std::string_view name, std::string_view text);

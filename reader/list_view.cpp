@@ -84,13 +84,13 @@ void FitInto(size_t width, Widths& widths) {
   while (SumOf(widths) > width) {
     size_t& widest = *std::max_element(
         widths.begin(), widths.end(), [&widths](const size_t& a, const size_t& b) {
-          const auto room = [&widths](const size_t& columns) -> size_t {
+          const auto spare = [&widths](const size_t& columns) -> size_t {
             const auto column = &columns - widths.data();
             const bool isFree =
                 column == kAction || column == kProduct || column == kCopy || column == kEvent;
             return isFree ? columns : 0;
           };
-          return room(a) < room(b);
+          return spare(a) < spare(b);
         });
     if (widest <= least) {
       return;

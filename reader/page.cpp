@@ -12,7 +12,7 @@
 
 namespace {
 
-// How a state is shown without its colour, and the CSS class that gives it one.
+// How a state is shown without colour, and the CSS class that sets its colour.
 struct StateLook {
   EventState State;
   const char* Class;
@@ -45,7 +45,7 @@ std::string TextElement(std::string_view tag, std::string_view text) {
 // Kept apart from the text around it, whatever direction its characters have.
 std::string Isolated(std::string_view text) { return TextElement("bdi", text); }
 
-// Numbers, not identities: these may hold anything, and two events can share one.
+// A number, not the identity: that can be any text, and two events can share it.
 std::string AnchorOf(size_t number) { return "event-" + std::to_string(number + 1); }
 
 std::string StateBadge(EventState state) {

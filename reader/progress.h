@@ -4,11 +4,11 @@
 #include <cstddef>
 #include <string>
 
-// Shows on standard error how far a long work is, in one line that is removed with the object, if
-// that is a terminal and the work takes more than a moment.
+// Shows the progress of a long operation on standard error, if that is a terminal and the operation
+// takes more than 0.7 seconds: one line, which the destructor removes.
 class Progress {
  public:
-  // What is counted, as "reports".
+  // The unit is what is counted, such as "reports".
   explicit Progress(std::string unit);
   ~Progress();
   Progress(const Progress&) = delete;

@@ -29,7 +29,7 @@ static std::vector<size_t> FindStarts(std::string_view text, Marks marks,
     }
     identity = block->Identity;
   }
-  // None is of the facts, so that nothing tells the others from messages.
+  // No start matches the facts, so the further ones cannot be distinguished from messages.
   starts.erase(starts.begin() + std::min<ptrdiff_t>(1, std::ssize(starts)), starts.end());
   return starts;
 }

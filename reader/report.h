@@ -8,7 +8,7 @@
 #include "reader/snapshot.h"
 
 // An event's report, ORXInstallEvent.Log, read back. It has a start block and a snapshot, the
-// messages, a snapshot, a result block and an end block. Anything may stand in a message, whole
+// messages, a snapshot, a result block and an end block. A message can contain any text, whole
 // blocks too, and a run may break off at any byte. So a block counts only where the order of the
 // blocks, the identity and the times of the event allow it; all other lines are messages.
 //
@@ -59,5 +59,5 @@ struct ReportFacts {
 // without a start block has one run, without Start.
 std::vector<ReportRun> ParseReport(std::string_view text, const ReportFacts& facts);
 
-// Makes every CR LF a LF. Reports of Windows have the former.
+// Replaces every CR LF, as reports of Windows have them, by LF.
 void UnifyLineEnds(std::string& text);

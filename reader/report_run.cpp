@@ -10,7 +10,7 @@
 
 namespace {
 
-// The second snapshot of a run, as far as it goes.
+// The second snapshot of a run and the blocks after it, whole or not.
 struct Ending {
   Marks Box;  // its mark and those after it
   const Mark* BoxEnd = nullptr;
@@ -203,7 +203,7 @@ class RunReader {
            HasEndOfFacts(ending);
   }
 
-  // What there is of the result block must not contradict.
+  // The lines of the result block that are there must not contradict the facts.
   bool IsBrokenEndOfFacts(const Ending& ending) const {
     const ResultBlock& result = ending.Blocks.Result;
     return ending.Blocks.Status == EndStatus::kBreaksOff &&

@@ -9,6 +9,6 @@
 
 using Marks = std::span<const Mark>;
 
-// Reads one run of a report. The text ends where the run ends; begin is the offset of its first
-// byte. The marks are those of the run, from its start block on if it has one.
+// Reads one run of a report. The run is the text from the offset "begin" to its end. The marks are
+// those of the run, from its start block on if it has one.
 ReportRun ReadRun(std::string_view text, size_t begin, Marks marks, const ReportFacts& facts);

@@ -22,9 +22,9 @@ bool IsNumber(std::string_view text) {
   return !text.empty() && text.find_first_not_of("0123456789") == std::string_view::npos;
 }
 
-// The column's text without its padding. Nothing without padding: then the text fills the column,
-// or is longer and runs on into the next. Nothing too for a text with a blank at its other end:
-// then an overlong one before has shifted it.
+// The column's text without its padding. Nothing if there is no padding, as the text may then be
+// longer than the column; and nothing if the text has a blank at its other end, as an overlong
+// column before it has then shifted it.
 std::optional<std::string_view> Column(std::string_view row, size_t begin, size_t width,
                                        Padding padding) {
   if (row.size() < begin + width) {

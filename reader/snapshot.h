@@ -22,6 +22,7 @@ struct Snapshot {
 // was written, and on the right from then on.
 enum class Padding { kLeft, kRight };
 
+// The padding at the start of a part, by the rows of the parts before it.
 Padding PaddingOfPart(const Snapshot& snapshot, size_t part);
 
 // The part that has the items of a section.

@@ -7,7 +7,7 @@
 
 static std::string MegabytesOf(uint64_t bytes) { return std::to_string(bytes >> 20) + " MB"; }
 
-// Empty if nothing speaks against reading the file.
+// Why the file exceeds a limit; empty if it does not.
 std::string Source::WhyNotRead(size_t file) const {
   const uint64_t size = Files[file].Size;
   if (size > kMostBytesOfFile) {

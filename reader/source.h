@@ -11,8 +11,8 @@
 #include "reader/archive.h"
 #include "reader/finding.h"
 
-// Where a history is read from: a folder or an archive. Nothing is written there and no lock is
-// taken. What is beyond these limits is left out, with a finding.
+// The folder or archive that a history is read from. Nothing is written there and no lock is taken.
+// What exceeds these limits is left out, with a finding.
 
 inline constexpr uint64_t kMostBytesOfFile = 32 << 20;  // of one file that is read
 inline constexpr uint64_t kMostBytesRead = 1 << 30;     // of all files that are read
@@ -55,8 +55,8 @@ class Source {
 // followed.
 std::unique_ptr<Source> OpenSource(const std::string& path, std::string& error);
 
-// The bytes of an archive's file. Nothing, and the reason as the end of a sentence that begins with
-// the path, if it is no regular file or cannot be opened.
+// The bytes of an archive. Nothing, and the reason as the end of a sentence that begins with the
+// path, if it is no regular file or cannot be opened.
 std::optional<ArchiveBytes> OpenArchiveFile(const std::string& path, std::string& error);
 
 // As OpenSource for a history folder or a folder above one, and for the bytes of an archive; the

@@ -10,6 +10,6 @@ struct TimeTick {
   std::string Label;  // a date, or a time of day within a short range
 };
 
-// The round times within a range, at most nine: minutes, hours, days, months or years, whatever
-// suits its length; the beginning alone, if there is none. Labels of one axis have the same form.
+// The round times within a range, at most nine: minutes, hours, days, months or years, depending on
+// its length; only its beginning if there is none. All labels have the same form.
 std::vector<TimeTick> TicksBetween(LocalTime begin, LocalTime end);

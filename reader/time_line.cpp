@@ -10,7 +10,7 @@ namespace {
 // In SVG units; the picture is as wide as a page on a desk and scrolls on a phone.
 constexpr int width = 960;
 constexpr int plotLeft = 150;
-constexpr int plotRight = width - 110;  // leaves room for the last label
+constexpr int plotRight = width - 110;  // leaves space for the last label
 constexpr int axisHeight = 26;
 constexpr int rowHeight = 22;
 constexpr int lanePadding = 6;
@@ -73,8 +73,8 @@ TimeScale ScaleOf(const std::vector<TimeLineBar>& bars) {
   return scale;
 }
 
-// Puts the bar into the first row of the lane that is free there.
-void Place(Lane& lane, const TimeLineBar& bar, const TimeScale& scale, bool hasLabels) {
+// Adds the bar to the first row of the lane that is free at that time.
+void AddToLane(Lane& lane, const TimeLineBar& bar, const TimeScale& scale, bool hasLabels) {
   const int left = scale.At(bar.Begin);
   const int barWidth = std::max(scale.At(bar.End) - left, leastBar);
   const auto isFree = [left](int rowEnd) { return rowEnd <= left; };
@@ -86,7 +86,7 @@ void Place(Lane& lane, const TimeLineBar& bar, const TimeScale& scale, bool hasL
   lane.Bars.push_back({&bar, left, barWidth, static_cast<int>(row - lane.RowEnds.begin())});
 }
 
-std::vector<Lane> PlaceInLanes(const std::vector<TimeLineBar>& bars, const TimeScale& scale) {
+std::vector<Lane> LanesOf(const std::vector<TimeLineBar>& bars, const TimeScale& scale) {
   std::vector<const TimeLineBar*> order;
   std::vector<Lane> lanes;
   for (const TimeLineBar& bar : bars) {
@@ -100,8 +100,8 @@ std::vector<Lane> PlaceInLanes(const std::vector<TimeLineBar>& bars, const TimeS
                    [](const TimeLineBar* a, const TimeLineBar* b) { return a->Begin < b->Begin; });
   for (const TimeLineBar* bar : order) {
     const auto hasName = [bar](const Lane& lane) { return lane.Name == bar->Lane; };
-    Place(*std::find_if(lanes.begin(), lanes.end(), hasName), *bar, scale,
-          bars.size() <= mostLabels);
+    AddToLane(*std::find_if(lanes.begin(), lanes.end(), hasName), *bar, scale,
+              bars.size() <= mostLabels);
   }
   return lanes;
 }
@@ -167,7 +167,7 @@ std::string DrawTimeLine(const std::vector<TimeLineBar>& bars) {
     return "";
   }
   const TimeScale scale = ScaleOf(bars);
-  const std::vector<Lane> lanes = PlaceInLanes(bars, scale);
+  const std::vector<Lane> lanes = LanesOf(bars, scale);
   std::string content;
   int top = axisHeight;
   for (const Lane& lane : lanes) {

@@ -7,23 +7,24 @@
 #include "reader/history.h"
 #include "reader/terminal_text.h"
 
-// The texts that the commands print. Nothing from the history reaches a terminal that it could
-// obey.
+// The texts that the commands print, in UTF-8. They contain no character of the history that a
+// terminal could obey (Printable).
 
 // A line for each of the events, in columns as wide as their contents, or cut to the terminal's
 // width; then a line that counts them.
 std::string ListText(const std::vector<const Event*>& events, const ViewOptions& options);
 
-// Its facts, messages, files and changes.
+// The facts, messages, files and changes of an event.
 std::string ShowText(const Event& event, const ViewOptions& options);
 
-// What differs between its snapshots, what does not and what cannot be compared; then its messages
-// and files.
+// What differs between the snapshots of an event, what does not and what cannot be compared; then
+// its messages and files.
 std::string ChangesText(const Event& event, const ViewOptions& options);
 
-// The first part of it: without title, messages and files.
+// The same without title, messages and files.
 std::string DifferencesText(const Event& event, const ViewOptions& options);
 
+// The messages, or the installer's files, below a heading; empty if there are none.
 std::string MessagesText(const Event& event);
 std::string FilesText(const Event& event);
 

@@ -17,8 +17,8 @@ struct ZipFileInfo {
   uint32_t UncompressedSize = 0;  // bytes written to entries, modulo 4 GiB
 };
 
-// What minizip 1.1 can store so that other programs read it. It leaves no room for sizes of 64
-// bits, so that the size of an entry must stay below 4 GiB - 1, compressed as well: what cannot be
+// What minizip 1.1 can store so that other programs read it. It reserves no space for sizes of 64
+// bits, so the size of an entry must stay below 4 GiB - 1, compressed as well: what cannot be
 // compressed becomes 0.031 percent larger. And it writes the end record that can count more entries
 // only for an archive of 4 GiB or more.
 struct ZipLimits {
@@ -28,8 +28,8 @@ struct ZipLimits {
 
 // Writes one zip archive at a time. Files are streamed and never held in memory.
 //
-// A new archive is a TemporaryFile until Close, which puts it in place of an older one of its name.
-// If a write has failed by then, or there is no room to finish it, the older one stays. The archive
+// A new archive is a TemporaryFile until Close, which renames it over an older one of its name. If
+// a write has failed by then, or Close cannot finish the archive, the older one stays. The archive
 // must be a regular file, or nothing of its name may exist: a link is not followed. Only its owner
 // may read it (on Windows, whoever the folder allows).
 //

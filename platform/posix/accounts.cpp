@@ -22,8 +22,8 @@ struct NameServiceAnswers {
   NamesByGroup Members;
 };
 
-// The child asks the name service and writes records, each a letter and a text, ended by a zero
-// byte: u the user that runs the tool; g a group and then each m a member of it; e the end.
+// The child writes what the name service returns as records, each a letter and a text, ended by a
+// zero byte: u the user that runs the tool; g a group, and after it m for each member; e the end.
 void AppendRecord(std::string& records, char kind, std::string_view text) {
   records += kind;
   records += text;
@@ -42,8 +42,8 @@ UsersByNumber ReadUsersByPrimaryGroup() {
   return users;
 }
 
-// One walk through each database serves all groups: a walk for each would cost groups times groups,
-// and users times groups.
+// Reads each database once for all groups: reading it for each group would take time proportional
+// to groups times groups, and users times groups.
 void AskNameService(const Descriptor& output) {
   std::string records;
   if (const passwd* user = ::getpwuid(::geteuid())) {
@@ -69,7 +69,7 @@ void AskNameService(const Descriptor& output) {
   WriteAll(output, records);
 }
 
-// Groups without an end are not all groups, or not all of their members: then there are none.
+// Without the end record some groups or members are missing: then it returns no groups at all.
 NameServiceAnswers ParseRecords(std::string_view records) {
   NameServiceAnswers answers;
   bool isComplete = false;
@@ -83,11 +83,11 @@ NameServiceAnswers ParseRecords(std::string_view records) {
         answers.OwnUser = text;
         break;
       case 'g': {
-        const auto [place, isNew] = answers.Members.try_emplace(text);
+        const auto [entry, isNew] = answers.Members.try_emplace(text);
         if (isNew) {
           answers.Groups.push_back(text);
         }
-        members = &place->second;
+        members = &entry->second;
         break;
       }
       case 'm':
@@ -101,7 +101,7 @@ NameServiceAnswers ParseRecords(std::string_view records) {
   return isComplete ? answers : NameServiceAnswers{answers.OwnUser, {}, {}};
 }
 
-// Kept for the whole run, which asks the name service once and so waits for it once.
+// Kept for the whole run, so that it waits for the name service once.
 const NameServiceAnswers& NameService() {
   static const NameServiceAnswers answers =
       ParseRecords(ChildOutput(&AskNameService, std::chrono::seconds(10)));

@@ -29,13 +29,13 @@ static bool SetOwner(const Descriptor& file, uid_t user, gid_t group) {
 static mode_t WithoutGroup(mode_t mode) { return (mode & ~070U) | (mode & 070 & (mode & 07) << 3); }
 
 void CopyAccess(const Descriptor& source, const struct stat& status, const Descriptor& target) {
-  // The owner first, as a change of it can clear bits of the mode. Not everybody may give a file
-  // away, but its owner may give it to any of his groups.
+  // The owner first, as a change of it can clear bits of the mode. Only root may change the owner,
+  // but an owner may set any group that he is in.
   constexpr auto sameUser = static_cast<uid_t>(-1);
   const bool keepsGroup =
       SetOwner(target, status.st_uid, status.st_gid) || SetOwner(target, sameUser, status.st_gid);
   const std::optional<std::string> list = AccessListOf(source);
-  // A list that the folder gives to new files would count as soon as the mode allows it.
+  // A list inherited from the folder would take effect as soon as the mode allows it.
   RetryOnInterrupt([&] { return ::fremovexattr(target.Get(), kAccessList); });
   const mode_t mode = status.st_mode & 07777;
   const bool isPlain = keepsGroup && list && list->empty();

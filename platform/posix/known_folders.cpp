@@ -9,6 +9,7 @@ std::string GetFolderPath(int32_t csidl) {
     return "";
   }
   const char* folder = std::getenv("ORX_COMMON_APPDATA");
-  // Absolute, as the paths that the history file keeps must lead to the same place in every run.
+  // Absolute, as the history file stores paths below it, which must not depend on the working
+  // directory of a later run.
   return AbsolutePath(folder == nullptr ? "" : folder).value_or("/var/lib");
 }

@@ -35,7 +35,7 @@ void ProfileStore::Read(const std::string& path, File& file) {
   file.Text.reset();
   file.Opened.Reset(-1);
   file.Status = {};
-  // A link could lead anywhere, and a pipe would hold up the run.
+  // A link could lead anywhere, and opening a pipe would block the run.
   Descriptor opened(RetryOnInterrupt(
       [&] { return ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC); }));
   if (!opened.IsOpen()) {

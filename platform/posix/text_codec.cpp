@@ -39,9 +39,9 @@ std::string TextCodec::ToUtf8(std::string_view text) const {
   while (left > 0) {
     char piece[1024];
     char* output = piece;
-    size_t room = sizeof piece;
-    const size_t converted = ::iconv(Shared->Converter, &input, &left, &output, &room);
-    result.append(piece, sizeof piece - room);
+    size_t space = sizeof piece;
+    const size_t converted = ::iconv(Shared->Converter, &input, &left, &output, &space);
+    result.append(piece, sizeof piece - space);
     if (converted == static_cast<size_t>(-1) && errno != E2BIG) {
       result += "\xEF\xBF\xBD";
       ++input;

@@ -9,10 +9,10 @@
 std::optional<std::string> ReadAll(const Descriptor& file) {
   struct stat status = {};
   const bool isSizeKnown = StatusOf(file, status) && status.st_size > 0;
-  // Room behind the end, so that a little text that the caller adds needs no growth.
-  constexpr size_t room = 4096;
+  // Spare capacity, so that a small addition by the caller does not reallocate.
+  constexpr size_t spare = 4096;
   std::string text;
-  text.reserve((isSizeKnown ? static_cast<size_t>(status.st_size) : 0) + room);
+  text.reserve((isSizeKnown ? static_cast<size_t>(status.st_size) : 0) + spare);
   char piece[65536];
   for (;;) {
     const ssize_t count = RetryOnInterrupt([&] { return ::read(file.Get(), piece, sizeof piece); });

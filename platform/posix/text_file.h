@@ -5,11 +5,11 @@
 
 #include "platform/posix/descriptor.h"
 
-// All bytes from a descriptor's place to its end; nothing if a read fails.
+// All bytes from a descriptor's current offset to the end; nothing if a read fails.
 std::optional<std::string> ReadAll(const Descriptor& file);
 
 // All bytes of a file; nothing if it cannot be opened or read.
 std::optional<std::string> ReadTextFile(const std::string& path);
 
-// True when all bytes of the text were written.
+// False if not all bytes of the text were written.
 bool WriteAll(const Descriptor& file, const std::string& text);

@@ -10,8 +10,8 @@ class AccessList {
   AccessList(const AccessList&) = delete;
   AccessList& operator=(const AccessList&) = delete;
 
-  // For the call that makes the object. Null, which stands for default security, if the system did
-  // not accept the text.
+  // For the call that creates the object. Null, which means default security, if the system did not
+  // accept the text.
   SECURITY_ATTRIBUTES* Get();
 
  private:

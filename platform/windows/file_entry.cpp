@@ -14,7 +14,7 @@ std::optional<WIN32_FIND_DATAA> FindEntry(const std::string& path) {
 }
 
 bool IsLink(const WIN32_FIND_DATAA& entry) {
-  // The bit for tags that stand for another named file; symbolic links and junctions have it.
+  // The bit of tags that refer to another named file; symbolic links and junctions have it.
   constexpr DWORD nameSurrogate = 0x20000000;
   const DWORD tag = entry.dwReserved0;
   return (entry.dwFileAttributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0 &&

@@ -5,8 +5,8 @@
 
 #include "platform/windows/system.h"
 
-// A mutex of the whole machine that stands for a folder, owned for as long as the object lives.
-// Whichever session or user the processes belong to, they get the same one.
+// A mutex named after a folder, owned for as long as the object lives. It is one for the whole
+// machine: processes of any session and user share it.
 class FolderLock {
  public:
   // Waits for another process at most as long as timeLeft says, and subtracts what it waited.

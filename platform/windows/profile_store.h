@@ -7,8 +7,7 @@
 #include "platform/windows/folder_lock.h"
 #include "platform/windows/system.h"
 
-// The locks that this process holds, and the copies of profile files that take what is written
-// under them.
+// The locks that this process holds, and the copies of profile files that are changed under them.
 //
 // The system's calls change a profile file in place and lose keys when two processes do so at once.
 // So every access, a read too, is made inside Enter and Leave; and the writes go to a copy in the

@@ -35,12 +35,12 @@ size_t SharedFile::ReadAt(uint64_t offset, char* buffer, size_t size) const {
   size_t done = 0;
   while (IsOpen() && done < size) {
     constexpr size_t most = 1 << 30;  // in one call
-    OVERLAPPED place = {};
-    place.Offset = static_cast<DWORD>(offset + done);
-    place.OffsetHigh = static_cast<DWORD>((offset + done) >> 32);
+    OVERLAPPED position = {};
+    position.Offset = static_cast<DWORD>(offset + done);
+    position.OffsetHigh = static_cast<DWORD>((offset + done) >> 32);
     DWORD count = 0;
     if (::ReadFile(HandleOf(Handle), buffer + done, static_cast<DWORD>(std::min(size - done, most)),
-                   &count, &place) == FALSE ||
+                   &count, &position) == FALSE ||
         count == 0) {
       break;
     }

@@ -7,8 +7,8 @@
 #include "platform/posix/registry/export_text.h"
 
 enum class HeadingKind {
-  kKey,      // [HKEY_LOCAL_MACHINE\SOFTWARE\ZEK]
-  kRemoval,  // [-HKEY_LOCAL_MACHINE\SOFTWARE\ZEK]: this key and all below it
+  kKey,      // [HKEY_LOCAL_MACHINE\SOFTWARE]
+  kRemoval,  // [-HKEY_LOCAL_MACHINE\SOFTWARE]: this key and all below it
   kOther,    // of another root, or without a closing bracket
 };
 

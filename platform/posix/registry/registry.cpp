@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "platform/known_folders.h"
+#include "platform/path.h"
 #include "platform/posix/registry/registry_export.h"
 #include "platform/shared_file.h"
 
@@ -41,12 +42,12 @@ std::string_view BranchTop(std::string_view path) {
   return parent.find('\\') == std::string_view::npos ? path : parent;
 }
 
-// Kept for the whole run: the interface has free functions, and to read the export takes long.
-// Another folder, as in tests, makes another registry.
+// Kept for the whole run, as the interface has free functions and reading the export is slow. If
+// the folder changes, as in tests, the registry of the new folder replaces it.
 RegistryExport& MachineRegistry() {
   static std::string currentPath;
   static std::optional<RegistryExport> current;
-  const std::string path = GetFolderPath(kCommonAppDataFolder) + "/ZEK/Registry.reg";
+  const std::string path = JoinPath(GetFolderPath(kCommonAppDataFolder), "ZEK/Registry.reg");
   if (path != currentPath) {
     current.emplace([file = std::make_shared<SharedFile>(path, LinkPolicy::kFollow)](
                         uint64_t offset, char* buffer, size_t size) {
