@@ -14,8 +14,10 @@ if [ "$1" = format ]; then
   git ls-files '*.py' | xargs pycodestyle --max-line-length=100
 else
   scripts/build.sh release
+  # The shallow mode of the path analysis takes a third of the time, and skips calls of calls.
   git ls-files 'app/*.cpp' 'history/*.cpp' 'eventlog/*.cpp' 'inventory/*.cpp' 'products/*.cpp' \
     'report/*.cpp' 'reader/*.cpp' 'platform/*.cpp' ':!platform/windows' |
     xargs -P "$(nproc)" -n 4 clang-tidy -p build/release --quiet \
-      --extra-arg=-Wno-unknown-warning-option
+      --extra-arg=-Wno-unknown-warning-option --extra-arg=-Xclang --extra-arg=-analyzer-config \
+      --extra-arg=-Xclang --extra-arg=mode=shallow
 fi

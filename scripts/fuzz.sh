@@ -16,9 +16,7 @@ export TMPDIR
 trap 'rm -rf "$TMPDIR"' EXIT
 
 cd build/fuzz
-for seeds in ../../fuzz/corpus/*; do
-  target=$(basename "$seeds")
-  mkdir -p "grown/$target"
-  "fuzz/${target}_fuzz" -max_total_time="$seconds" -timeout=10 -max_len=4096 -print_final_stats=1 \
-    "grown/$target" "$seeds"
-done
+find ../../fuzz/corpus -mindepth 1 -maxdepth 1 -printf "%f\n" | xargs -P "$(nproc)" -I{} sh -ec '
+  mkdir -p grown/{}
+  fuzz/{}_fuzz -max_total_time='"$seconds"' -timeout=10 -max_len=4096 -print_final_stats=1 \
+    grown/{} ../../fuzz/corpus/{}'

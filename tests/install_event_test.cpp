@@ -137,6 +137,21 @@ TEST(InstallEvent, CountsOnWhenACopyTookTheNameOfTheGrowingFile) {
   EXPECT_EQ(CInstallHistory().EventCount, 1);
 }
 
+TEST(InstallEvent, LeavesTheCountOfAnExistingFile) {
+  const ScratchHistory scratch;
+  RunTool({});
+  WriteFileText(GetHistoryFilePath(), "[1]\nResult=\n");
+  RunTool({"-logmessage", "1"});
+  EXPECT_EQ(HistoryText(scratch), "[1]\nResult=\n");
+}
+
+TEST(InstallEvent, HasNamesThatLeadElsewhere) {
+  const ScratchHistory scratch;
+  for (const char* name : {"..", "...", ". . .", "a/.. /b", "a/..", ".... "}) {
+    EXPECT_TRUE(LeadsElsewhere(scratch.Native(name))) << name;
+  }
+}
+
 TEST(InstallEvent, FailsWithoutTheHistoryFolder) {
   const ScratchHistory scratch;
   scratch.Make("ZEK/ORXHistory");  // a file in the way

@@ -65,6 +65,13 @@ TEST_F(Run, GivesItsExitResults) {
   EXPECT_EQ(FileText(Root + "/output"), "Initialiation Failed:\n");
 }
 
+TEST_F(Run, RecordsLocalTimes) {
+  EXPECT_EQ(Shell("export TZ=Far-13; before=$(date '+%Y%m%d %H'); $ORX -start 7;"
+                  "grep -e \"Start_Time=$before\" -e \"Start_Time=$(date '+%Y%m%d %H')\""
+                  " ZEK/ORXHistory/History.ini"),
+            0);
+}
+
 TEST_F(Run, SurvivesHistoryFilesOfAnyKind) {
   std::string many = "[History]\nCount=4\n";
   for (int i = 0; i < 100000; ++i) {
