@@ -47,7 +47,7 @@ Archive::~Archive() {
   }
 }
 
-std::unique_ptr<Archive> Archive::Open(ArchiveBytes bytes, std::string& error) {
+std::unique_ptr<Archive> Archive::Open(const ArchiveBytes& bytes, std::string& error) {
   std::unique_ptr<Archive> archive(new Archive);
   archive->Bytes = std::make_unique<Stream>(bytes);
   zlib_filefunc64_def functions = archive->Bytes->Functions();

@@ -30,7 +30,7 @@ class Archive {
  public:
   // Reads the directory. Nothing, and one line that says what is wrong and what to do, if the bytes
   // are no archive or the directory is lost.
-  static std::unique_ptr<Archive> Open(ArchiveBytes bytes, std::string& error);
+  static std::unique_ptr<Archive> Open(const ArchiveBytes& bytes, std::string& error);
 
   ~Archive();
   Archive(const Archive&) = delete;

@@ -60,8 +60,8 @@ std::optional<std::string> ArchiveSource::ReadBytes(size_t file, std::string& re
 
 }  // namespace
 
-std::unique_ptr<Source> OpenArchive(ArchiveBytes bytes, std::string& error) {
-  std::unique_ptr<Archive> archive = Archive::Open(std::move(bytes), error);
+std::unique_ptr<Source> OpenArchive(const ArchiveBytes& bytes, std::string& error) {
+  std::unique_ptr<Archive> archive = Archive::Open(bytes, error);
   if (!archive) {
     return nullptr;
   }

@@ -54,10 +54,11 @@ std::string DurationOf(const Event& event) {
   if (minutes < 60) {
     return std::to_string(minutes) + " min";
   }
-  if (minutes < 24 * 60) {
-    return std::to_string(minutes / 60) + " h " + TwoDigits(minutes % 60) + " min";
+  const int64_t hours = minutes / 60;
+  if (hours < 24) {
+    return std::to_string(hours) + " h " + TwoDigits(minutes % 60) + " min";
   }
-  return std::to_string(minutes / (24 * 60)) + " d " + TwoDigits(minutes / 60 % 24) + " h";
+  return std::to_string(hours / 24) + " d " + TwoDigits(hours % 24) + " h";
 }
 
 std::vector<Fact> FactsOf(const Event& event) {
@@ -121,7 +122,7 @@ std::string TextOfFields(const Change& change) {
                               : field.After ? *field.After
                                             : field.Before.value_or("");
     if (change.Kind == ChangeKind::kChanged || !value.empty()) {
-      text += (text.empty() ? "" : ", ") + name + value;
+      text.append(text.empty() ? "" : ", ").append(name).append(value);
     }
   }
   return text;

@@ -147,6 +147,7 @@ class Grouping {
 
 std::vector<const Change*> InOrder(const std::vector<Change>& changes) {
   std::vector<const Change*> ordered;
+  ordered.reserve(changes.size());
   for (const Change& change : changes) {
     ordered.push_back(&change);
   }

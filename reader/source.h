@@ -62,4 +62,4 @@ std::optional<ArchiveBytes> OpenArchiveFile(const std::string& path, std::string
 // As OpenSource for a history folder or a folder above one, and for the bytes of an archive; the
 // error is the end of a sentence.
 std::unique_ptr<Source> OpenFolder(const std::string& path, std::string& error);
-std::unique_ptr<Source> OpenArchive(ArchiveBytes bytes, std::string& error);
+std::unique_ptr<Source> OpenArchive(const ArchiveBytes& bytes, std::string& error);

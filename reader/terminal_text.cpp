@@ -46,12 +46,15 @@ size_t ColumnsOfCharacter(char32_t character) {
 }  // namespace
 
 std::string Painted(std::string_view text, Colour colour, const ViewOptions& options) {
-  const std::string plain(text);
   if (!options.HasColours || colour == Colour::kPlain) {
-    return plain;
+    return std::string(text);
   }
   const char* codes[] = {"0", "31", "32", "33", "35", "1"};
-  return std::string("\x1B[") + codes[static_cast<size_t>(colour)] + "m" + plain + "\x1B[0m";
+  std::string painted("\x1B[");
+  return painted.append(codes[static_cast<size_t>(colour)])
+      .append("m")
+      .append(text)
+      .append("\x1B[0m");
 }
 
 std::string Printable(std::string_view text) {

@@ -91,7 +91,9 @@ NameServiceAnswers ParseRecords(std::string_view records) {
         break;
       }
       case 'm':
-        members->push_back(text);
+        if (members != nullptr) {
+          members->push_back(text);
+        }
         break;
       default:
         isComplete = true;

@@ -3,6 +3,7 @@
 #include <iconv.h>
 
 #include <cerrno>
+#include <cstdint>
 
 #include "platform/ascii_case.h"
 
@@ -23,8 +24,8 @@ std::optional<TextCodec> TextCodec::Open(const std::string& encoding) {
   if (name.empty()) {
     return std::nullopt;  // for iconv it is the encoding of the locale
   }
-  const iconv_t converter = ::iconv_open("UTF-8", name.c_str());
-  if (converter == reinterpret_cast<iconv_t>(-1)) {
+  iconv_t converter = ::iconv_open("UTF-8", name.c_str());
+  if (reinterpret_cast<intptr_t>(converter) == -1) {
     return std::nullopt;
   }
   return TextCodec(std::make_shared<State>(converter));
