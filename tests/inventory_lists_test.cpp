@@ -45,7 +45,9 @@ TEST(Lists, ReadTextsAndNumbersAndNothingElse) {
 // They can neither add a line nor reach a terminal. A letter of a code page stays.
 TEST(Lists, ShowControlCharactersAsQuestionMarks) {
   const std::string name = "ORX\n1) \r\t\0\x1B[2J\x7F|\xC2\x85\xC2\x9F|\xC2\xA0\x80\x9F\xC3\x9F~"s;
-  const std::string shown = "ORX?1) ????[2J?|??|\xC2\xA0\x80\x9F\xC3\x9F~";
+  // Where these bytes begin two-byte characters, they are letters.
+  const std::string controls = IsLeadByte('\x85') ? "\xC2\x85\xC2\x9F" : "??";
+  const std::string shown = "ORX?1) ????[2J?|" + controls + "|\xC2\xA0\x80\x9F\xC3\x9F~";
   Machine() = FakeMachine();
   Machine().DomainUser = name;
   Machine().LocalGroups = {{name, {name}}};
