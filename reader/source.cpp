@@ -55,7 +55,7 @@ static std::unique_ptr<Source> OpenFileOrFolder(const std::string& path, std::st
     return OpenFolder(path, error);
   }
   std::optional<ArchiveBytes> bytes = OpenArchiveFile(path, error);
-  return bytes ? OpenArchive(std::move(*bytes), error) : nullptr;
+  return bytes ? OpenArchive(*bytes, error) : nullptr;
 }
 
 std::unique_ptr<Source> OpenSource(const std::string& path, std::string& error) {

@@ -103,7 +103,7 @@ UnpackResult UnpackArchive(const std::string& archive, const std::string& folder
                            const std::function<void()>& onFile) {
   UnpackResult result;
   std::optional<ArchiveBytes> bytes = OpenArchiveFile(archive, result.Error);
-  std::unique_ptr<Archive> zip = bytes ? Archive::Open(std::move(*bytes), result.Error) : nullptr;
+  std::unique_ptr<Archive> zip = bytes ? Archive::Open(*bytes, result.Error) : nullptr;
   if (!zip) {
     result.Error = TextDecoder().ToUtf8(SystemTextToUtf8(archive)) + " " + result.Error + ".";
     return result;
