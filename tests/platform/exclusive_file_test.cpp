@@ -1,15 +1,11 @@
 #include "platform/exclusive_file.h"
 
-#include <gtest/gtest.h>
-
-#include <filesystem>
 #include <fstream>
 
 #include "tests/platform/contract.h"
 
 namespace {
 
-using namespace std::string_literals;
 using Files = Platform;
 
 TEST_F(Files, AreReadExclusively) {
@@ -25,13 +21,11 @@ TEST_F(Files, AreReadExclusively) {
   }
   EXPECT_TRUE(ExclusiveFile(path).IsOpen());
   std::error_code error;
-  std::filesystem::create_symlink(path, In("link"), error);  // not possible everywhere
+  fs::create_symlink(path, In("link"), error);  // not possible everywhere
   for (const std::string& other : {Root, In("none"), In("link"), device}) {
     ExclusiveFile file(other);
     char byte = 0;
-    EXPECT_FALSE(file.IsOpen()) << other;
-    EXPECT_EQ(file.Read(&byte, 1), 0U) << other;
-    EXPECT_EQ(file.Size(), 0U) << other;
+    EXPECT_FALSE(file.IsOpen() || file.Read(&byte, 1) > 0 || file.Size() > 0) << other;
   }
 }
 

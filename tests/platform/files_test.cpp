@@ -1,35 +1,27 @@
 #include "platform/files.h"
 
-#include <gtest/gtest.h>
-
 #include <chrono>
-#include <filesystem>
 
 #include "platform/folder_listing.h"
 #include "tests/platform/contract.h"
 
 namespace {
 
-namespace fs = std::filesystem;
-using namespace std::string_literals;
 using Files = Platform;
 
 TEST_F(Files, HaveAKind) {
   const std::string file = Make("file", "");
   EXPECT_TRUE(CreateFolder(In("folder")));
   for (const std::string& path : {In("folder"), file, In("none/folder"), ""s}) {
-    EXPECT_FALSE(CreateFolder(path)) << path;
-    EXPECT_FALSE(IsSymbolicLink(path)) << path;
+    EXPECT_FALSE(CreateFolder(path) || IsSymbolicLink(path)) << path;
   }
   EXPECT_EQ(KindOf(file), FileKind::kFile);
   EXPECT_EQ(KindOf(In("folder")), FileKind::kFolder);
   for (const std::string& path : {In("none"), In("f*"), In("fil?"), In("file/x"), ""s}) {
     EXPECT_EQ(KindOf(path), FileKind::kNone) << path;
-    EXPECT_FALSE(LastWriteTime(path).has_value()) << path;
-    EXPECT_FALSE(FileAttributes(path).has_value()) << path;
+    EXPECT_FALSE(LastWriteTime(path) || FileAttributes(path)) << path;
   }
-  EXPECT_NE(KindOf(device), FileKind::kFile);
-  EXPECT_NE(KindOf(device), FileKind::kFolder);
+  EXPECT_TRUE(KindOf(device) != FileKind::kFile && KindOf(device) != FileKind::kFolder);
 }
 
 TEST_F(Files, AreTheSameUnderAnySpelling) {
@@ -41,13 +33,11 @@ TEST_F(Files, AreTheSameUnderAnySpelling) {
     EXPECT_TRUE(IsSameFile(file, same)) << same;
   }
   EXPECT_EQ(IsSameFile(file, In("FILE")), isWindows);
-  EXPECT_FALSE(IsSameFile(file, In("other")));
-  EXPECT_FALSE(IsSameFile(file, In("none")));
+  EXPECT_FALSE(IsSameFile(file, In("other")) || IsSameFile(file, In("none")));
   EXPECT_FALSE(IsSameFile(In("none"), In("none")));
 }
 
 TEST_F(Files, MovesAFolderToAFreeNameOnly) {
-  fs::create_directories(fs::path(In("from")) / "sub");
   Make("from/sub/file", "text");
   Make("empty/");
   Make("file", "");
@@ -56,8 +46,7 @@ TEST_F(Files, MovesAFolderToAFreeNameOnly) {
     EXPECT_FALSE(MoveFolder(In("from"), target)) << target;
     EXPECT_EQ(FileText(In("from/sub/file")), "text");
   }
-  EXPECT_FALSE(MoveFolder(In("none"), In("to")));
-  EXPECT_FALSE(MoveFolder(In("file"), In("to")));
+  EXPECT_FALSE(MoveFolder(In("none"), In("to")) || MoveFolder(In("file"), In("to")));
   EXPECT_TRUE(MoveFolder(In("from"), In("to")));
   EXPECT_EQ(FileText(In("to/sub/file")), "text");
   EXPECT_EQ(Tree(), "empty/\nfile\nto/\nto/sub/\nto/sub/file\n");
@@ -76,8 +65,9 @@ TEST_F(Files, CopiesToANewFileOnly) {
   for (const std::string& target : {taken, source, In("folder"), In("none/copy")}) {
     EXPECT_FALSE(CopyToNewFile(source, target, /*trusted=*/Root)) << target;
   }
-  EXPECT_FALSE(CopyToNewFile(In("none"), In("new"), /*trusted=*/Root));
-  EXPECT_FALSE(CopyToNewFile(In("folder"), In("new"), /*trusted=*/Root));
+  for (const char* noFile : {"none", "folder"}) {
+    EXPECT_FALSE(CopyToNewFile(In(noFile), In("new"), /*trusted=*/Root)) << noFile;
+  }
   EXPECT_EQ(FileText(taken), "old");
   EXPECT_EQ(Tree(), "copy\nfolder/\nsource\ntaken\n");
   fs::permissions(source, fs::perms::owner_all);  // Windows removes no file that is read-only

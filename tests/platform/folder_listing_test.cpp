@@ -1,18 +1,14 @@
 #include "platform/folder_listing.h"
 
-#include <gtest/gtest.h>
-
 #include <ctime>
-#include <filesystem>
 #include <numeric>
 #include <set>
+#include <tuple>
 
 #include "tests/platform/contract.h"
 
 namespace {
 
-namespace fs = std::filesystem;
-using namespace std::string_literals;
 using Files = Platform;
 
 // The names in a folder, sorted, each followed by a blank.
@@ -39,8 +35,7 @@ TEST_F(Files, AreListedWithTheirProperties) {
   }
   EXPECT_EQ(Names(Root), ".dot fixed folder plain ");
   EXPECT_EQ(Names(In("folder")), "");
-  EXPECT_TRUE(ListFolder(In("none")).empty());
-  EXPECT_TRUE(ListFolder(In("plain")).empty());
+  EXPECT_TRUE(ListFolder(In("none")).empty() && ListFolder(In("plain")).empty());
   fs::permissions(In("fixed"), fs::perms::owner_all);
 }
 
@@ -51,13 +46,10 @@ TEST_F(Files, KeepTheTimeOfTheirLastWrite) {
   for (const char* name : {"file", "folder"}) {
     const CalendarTime time = LastWriteTime(In(name)).value();
     tm fields = {};
-    fields.tm_year = time.Year - 1900;
-    fields.tm_mon = time.Month - 1;
-    fields.tm_mday = time.Day;
-    fields.tm_hour = time.Hour;
-    fields.tm_min = time.Minute;
-    fields.tm_sec = time.Second;
-    fields.tm_isdst = -1;
+    std::tie(fields.tm_year, fields.tm_mon, fields.tm_mday, fields.tm_hour, fields.tm_min,
+             fields.tm_sec, fields.tm_isdst) =
+        std::tuple(time.Year - 1900, time.Month - 1, time.Day, time.Hour, time.Minute, time.Second,
+                   -1);
     EXPECT_NEAR(std::difftime(std::mktime(&fields), before), 0, 5);
   }
 }

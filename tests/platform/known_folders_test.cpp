@@ -1,10 +1,6 @@
 #include "platform/known_folders.h"
 
-#include <gtest/gtest.h>
-
 #include <cstdlib>
-#include <filesystem>
-#include <string>
 
 #include "tests/platform/contract.h"
 

@@ -2,30 +2,22 @@
 
 #include "platform/path.h"
 
-#include <gtest/gtest.h>
-
-#include <filesystem>
-
 #include "tests/platform/contract.h"
 
 namespace {
-
-namespace fs = std::filesystem;
 
 // A character whose second byte equals a backslash in the Japanese code page; elsewhere its bytes
 // are two characters, and on Windows the second one is a separator.
 const std::string hyou = "\x95\x5C";
 const bool isOneCharacter = IsLeadByte(hyou[0]) || !isWindows;
 
+const std::string root = isWindows ? "C:\\" : "/";
+
 std::string Native(const std::string& path) { return Replaced(path, "/", {kPathSeparator}); }
 
 TEST(Path, IsSplitAtItsLastSeparator) {
-  struct {
-    std::string Path, Folder, Name;
-  } const cases[] = {
-      {"", "", ""},         {"a", "", "a"}, {"a/b", "a/", "b"},
-      {"a/b/", "a/b/", ""}, {"/", "/", ""}, {"a//b", "a//", "b"},
-  };
+  const std::string cases[][3] = {{"", "", ""},         {"a", "", "a"}, {"a/b", "a/", "b"},
+                                  {"a/b/", "a/b/", ""}, {"/", "/", ""}, {"a//b", "a//", "b"}};
   for (const auto& [path, folder, name] : cases) {
     EXPECT_EQ(FolderPart(Native(path)), Native(folder)) << path;
     EXPECT_EQ(BaseName(Native(path)), Native(name)) << path;
@@ -58,7 +50,6 @@ TEST(Path, HasNamesThatTheSystemChanges) {
 }
 
 TEST(Path, HasALimit) {
-  const std::string root = isWindows ? "C:\\" : "/";
   const size_t longest = isWindows ? 259 : 4095;
   EXPECT_TRUE(FitsPathLimit(root + std::string(longest - root.size(), 'x')));
   EXPECT_FALSE(FitsPathLimit(root + std::string(longest + 1 - root.size(), 'x')));
@@ -71,7 +62,6 @@ TEST(Path, IsMadeAbsolute) {
   EXPECT_EQ(AbsolutePath("a"), here + kPathSeparator + "a");
   EXPECT_EQ(AbsolutePath(""), std::nullopt);
   // The longest path that a buffer of 260 bytes holds; POSIX has no such limit.
-  const std::string root = isWindows ? "C:\\" : "/";
   const std::string longest = root + std::string(259 - root.size(), 'x');
   EXPECT_EQ(AbsolutePath(longest), longest);
   EXPECT_EQ(AbsolutePath(longest + 'x').has_value(), !isWindows);

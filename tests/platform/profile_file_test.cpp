@@ -1,9 +1,6 @@
 #include "platform/profile_file.h"
 
-#include <gtest/gtest.h>
-
 #include <algorithm>
-#include <filesystem>
 #include <functional>
 #include <regex>
 #include <sstream>
@@ -11,9 +8,6 @@
 #include "tests/platform/contract.h"
 
 namespace {
-
-namespace fs = std::filesystem;
-using namespace std::string_literals;
 
 class ProfileFile : public Platform {
  protected:
@@ -75,8 +69,7 @@ TEST_F(ProfileFile, ListsSectionsAsFarAsTheyFit) {
     return names.substr(0, names.find("\0\0"s));
   };
   EXPECT_EQ(ReadProfileSectionNames(Ini, 100).substr(0, 2), "\0\0"s);
-  WriteProfileValue(Ini, "ab", "Key", "");
-  WriteProfileValue(Ini, "cde", "Key", "");
+  Make("a.ini", "[ab]\n[cde]\n");
   for (const uint32_t size : {0, 1, 2, 3, 5, 6, 7, 8, 9, 100}) {
     const std::string names = ReadProfileSectionNames(Ini, size);
     const uint32_t counted = std::max(size, 2U);
@@ -94,38 +87,29 @@ TEST_F(ProfileFile, IsNotMadeWhereItCannotBe) {
 }
 
 TEST_F(ProfileFile, ChangesAtOnceWhenTheOutermostGuardEnds) {
-  WriteProfileValue(Ini, "S", "Key", "old");
-  const std::string before = FileText(Ini);
+  const std::string before = "[S]\nKey=b\n";
+  Make("a.ini", before);
+  const std::string other = Make("other/b.ini", before);
+  const auto read = [this, &other] {
+    return ReadProfileValue(Ini, "S", "Key", "none", 256) +
+           ReadProfileValue(Ini, "T", "Key", "none", 256) +
+           ReadProfileValue(other, "S", "Key", "none", 256);
+  };
   {
     const ProfileGuard guard(Ini);
     {
       const ProfileGuard inner(Ini);
-      EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "new"));
-      EXPECT_TRUE(WriteProfileValue(Ini, "T", "Key", "more"));
+      EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "a"));
+      EXPECT_TRUE(WriteProfileValue(Ini, "T", "Key", "t"));
     }
-    EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", 256), "new");
-    EXPECT_EQ(ReadProfileValue(Ini, "T", "Key", "", 256), "more");
-    EXPECT_EQ(FileText(Ini), before);
-  }
-  EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "", 256), "new");
-  EXPECT_NE(FileText(Ini), before);
-  EXPECT_EQ(Tree(), "a.ini\n");
-}
-
-TEST_F(ProfileFile, KeepsSeveralFilesUnderOneGuard) {
-  const std::string other = Make("other/b.ini", "[S]\nKey=b\n");
-  {
-    const ProfileGuard guard(Ini);
-    EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "a"));
-    EXPECT_EQ(ReadProfileValue(other, "S", "Key", "none", 256), "b");
+    EXPECT_EQ(read(), "atb");
     const ProfileGuard ofOther(other);
     EXPECT_TRUE(WriteProfileValue(other, "S", "Key", "new"));
     EXPECT_TRUE(WriteProfileValue(In("c.ini"), "S", "Key", "c"));
-    EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "none", 256), "a");
-    EXPECT_EQ(ReadProfileValue(other, "S", "Key", "none", 256), "new");
+    EXPECT_EQ(read(), "atnew");
+    EXPECT_EQ(FileText(Ini) + FileText(other) + FileText(In("c.ini")), before + before);
   }
-  EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "none", 256), "a");
-  EXPECT_EQ(ReadProfileValue(other, "S", "Key", "none", 256), "new");
+  EXPECT_EQ(read(), "atnew");
   EXPECT_EQ(ReadProfileValue(In("c.ini"), "S", "Key", "none", 256), "c");
   EXPECT_EQ(Tree(), "a.ini\nc.ini\nother/\nother/b.ini\n");
 }

@@ -2,26 +2,24 @@
 
 #include <gtest/gtest.h>
 
+#include <tuple>
+
 namespace {
 
 TEST(ProfileText, ReadsFilesEditedByHand) {
   const ProfileText text(
       "\xEF\xBB\xBF[first]\r\nstray line\r\nKey = a b \t\r\nEmpty=\nkey=second of its name\n"
-      "; Comment=1\n\n[broken\na[b]=c\n  [ x]y ] behind\nSigns==a=b\n[]\n[FIRST]\nLate=1\n"
+      "; Comment=1\n\n[broken\na[b]=c\n  [ x]y ] after\nSigns==a=b\n[]\n[FIRST]\nLate=1\n"
       "[last]\nQuoted = \" q\"\" \nOpen=end");
-  struct {
-    const char* Section;
-    const char* Key;
-    std::optional<std::string_view> Value;
-  } const cases[] = {
+  const std::tuple<const char*, const char*, std::optional<std::string_view>> cases[] = {
       {"first", "key", "a b"},    {" First ", " KEY ", "a b"}, {"first", "Empty", ""},
       {"first", "a[b]", "c"},     {"first", "Comment", {}},    {"stray line", "Key", {}},
       {"first", "Signs", {}},     {"x]y", "Signs", "=a=b"},    {"LAST", "Open", "end"},
       {"broken", "a[b]", {}},     {"none", "Key", {}},         {"first", "Late", {}},
       {"last", "Quoted", " q\""},
   };
-  for (const auto& test : cases) {
-    EXPECT_EQ(text.Find(test.Section, test.Key), test.Value) << test.Section << ' ' << test.Key;
+  for (const auto& [section, key, value] : cases) {
+    EXPECT_EQ(text.Find(section, key), value) << section << ' ' << key;
   }
   EXPECT_EQ(text.SectionNames(), (std::vector<std::string_view>{"first", "x]y", "FIRST", "last"}));
 }
@@ -59,7 +57,7 @@ TEST(ProfileText, ChangesNothingButTheKey) {
   }
 }
 
-TEST(ProfileText, KeepsItsPlacesThroughManyChanges) {
+TEST(ProfileText, KeepsItsOffsetsThroughManyChanges) {
   ProfileText text("[History]\nCount=0\n");
   for (size_t i = 0; i < 200; ++i) {
     const std::string section = "event " + std::to_string(i % 50);
@@ -72,7 +70,6 @@ TEST(ProfileText, KeepsItsPlacesThroughManyChanges) {
     EXPECT_EQ(again.Find(section, key), value);
     EXPECT_EQ(text.Find(section, key), value);
   }
-  EXPECT_EQ(text.SectionNames().size(), 51U);
   EXPECT_EQ(text.Find("History", "Count"), "39601");
 }
 

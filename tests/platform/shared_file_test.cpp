@@ -1,15 +1,11 @@
 #include "platform/shared_file.h"
 
-#include <gtest/gtest.h>
-
-#include <filesystem>
+#include <tuple>
 
 #include "platform/new_file.h"
 #include "tests/platform/contract.h"
 
 namespace {
-
-namespace fs = std::filesystem;
 
 std::string Piece(const SharedFile& file, uint64_t offset, size_t size) {
   std::string bytes(size, '#');
@@ -21,11 +17,7 @@ TEST_F(Platform, SharedFileReadsAtAnyOffset) {
   const SharedFile file(Make("a", "0123456789"), LinkPolicy::kRefuse);
   ASSERT_TRUE(file.IsOpen());
   EXPECT_EQ(file.Size(), 10U);
-  struct {
-    uint64_t Offset;
-    size_t Size;
-    const char* Text;
-  } const cases[] = {
+  const std::tuple<uint64_t, size_t, const char*> cases[] = {
       {0, 10, "0123456789"},      {3, 2, "34"}, {8, 9, "89"}, {10, 1, ""}, {0, 0, ""}, {11, 1, ""},
       {uint64_t{1} << 40, 1, ""},
   };
@@ -35,9 +27,8 @@ TEST_F(Platform, SharedFileReadsAtAnyOffset) {
 }
 
 TEST_F(Platform, SharedFileLetsOthersReplaceTheFile) {
-  const std::string path = Make("a", "old");
-  const SharedFile file(path, LinkPolicy::kRefuse);
-  fs::rename(path, In("b"));
+  const SharedFile file(Make("a", "old"), LinkPolicy::kRefuse);
+  fs::rename(In("a"), In("b"));
   Make("a", "new");
   EXPECT_EQ(Piece(file, 0, 10), "old");
   EXPECT_TRUE(fs::remove(In("b")));
@@ -46,8 +37,7 @@ TEST_F(Platform, SharedFileLetsOthersReplaceTheFile) {
 TEST_F(Platform, SharedFileOpensRegularFilesOnly) {
   for (const std::string& path : {Make("folder/"), In("none"), device, std::string()}) {
     const SharedFile file(path, LinkPolicy::kFollow);
-    EXPECT_FALSE(file.IsOpen()) << path;
-    EXPECT_EQ(Piece(file, 0, 1), "") << path;
+    EXPECT_FALSE(file.IsOpen() || !Piece(file, 0, 1).empty()) << path;
   }
   if (isWindows) {
     return;  // a link needs a privilege there
@@ -57,18 +47,14 @@ TEST_F(Platform, SharedFileOpensRegularFilesOnly) {
   EXPECT_FALSE(SharedFile(In("link"), LinkPolicy::kRefuse).IsOpen());
 }
 
-TEST_F(Platform, NewFileStaysWhenItIsFinished) {
+TEST_F(Platform, NewFileStaysOnlyWhenItIsFinished) {
+  { EXPECT_TRUE(NewFile(In("a")).Write("half")); }
+  EXPECT_EQ(Tree(), "");
   NewFile file(In("a"));
   EXPECT_TRUE(file.Write("one") && file.Write("") && file.Write(std::string("\0\n", 2)));
   EXPECT_TRUE(file.Finish());
-  EXPECT_FALSE(file.Finish());
-  EXPECT_FALSE(file.Write("more"));
+  EXPECT_FALSE(file.Finish() || file.Write("more"));
   EXPECT_EQ(FileText(In("a")), std::string("one\0\n", 5));
-}
-
-TEST_F(Platform, NewFileGoesWhenItIsNotFinished) {
-  { EXPECT_TRUE(NewFile(In("a")).Write("half")); }
-  EXPECT_EQ(Tree(), "");
 }
 
 TEST_F(Platform, NewFileReplacesNothing) {

@@ -1,7 +1,5 @@
 // Files that another program, such as a scanner, keeps open for a moment.
 
-#include <gtest/gtest.h>
-
 #include "eventlog/logger.h"
 #include "platform/exclusive_file.h"
 #include "platform/files.h"

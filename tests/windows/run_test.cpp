@@ -1,10 +1,7 @@
 // The program as an installer runs it: whole processes, among other programs that hold files. The
 // history is that of the machine, which is why these tests must be asked for.
 
-#include <gtest/gtest.h>
-
 #include <cstdlib>
-#include <filesystem>
 #include <thread>
 
 #include "history/locations.h"
@@ -14,7 +11,6 @@
 
 namespace {
 
-namespace fs = std::filesystem;
 using namespace std::chrono_literals;
 
 class Run : public Platform {
