@@ -26,8 +26,7 @@ ServiceListing ListFrom(const std::function<void(int client)>& serve,
   name.copy(address.sun_path + 1, name.size());
   const size_t size = offsetof(sockaddr_un, sun_path) + 1 + name.size();
   const int listener = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0);
-  const auto* place = reinterpret_cast<const sockaddr*>(&address);
-  EXPECT_EQ(::bind(listener, place, static_cast<socklen_t>(size)), 0);
+  ::bind(listener, reinterpret_cast<const sockaddr*>(&address), static_cast<socklen_t>(size));
   EXPECT_EQ(::listen(listener, /*backlog=*/1), 0);
   const pid_t server = ::fork();
   if (server == 0) {
@@ -106,14 +105,13 @@ TEST(Services, AreTheInstalledServiceUnitsInTheOrderOfTheBus) {
 TEST(Services, AreMissingWhereTheAnswerIsNone) {
   ::setenv("DBUS_SYSTEM_BUS_ADDRESS", "unix:path=/no/bus", /*overwrite=*/1);
   EXPECT_EQ(ListServices(std::chrono::seconds(1)).Error, uint32_t{ENOENT});
-  const Answer otherShape = [](sd_bus_message* question) {
-    return sd_bus_reply_method_return(question, "s", "no list");
+  const std::pair<Answer, uint32_t> cases[] = {
+      {[](sd_bus_message* call) { return sd_bus_reply_method_return(call, "s", "no"); }, ENXIO},
+      {[](sd_bus_message* call) { return sd_bus_reply_method_errnof(call, EACCES, "no"); }, EACCES},
   };
-  const Answer refusal = [](sd_bus_message* question) {
-    return sd_bus_reply_method_errnof(question, EACCES, "not for you");
-  };
-  EXPECT_EQ(ListFrom(Manager(otherShape)).Error, uint32_t{ENXIO});
-  EXPECT_EQ(ListFrom(Manager(refusal)).Error, uint32_t{EACCES});
+  for (const auto& [answer, error] : cases) {
+    EXPECT_EQ(ListFrom(Manager(answer)).Error, error);
+  }
 }
 
 TEST(Services, AreNotAwaitedAfterTheLimit) {
