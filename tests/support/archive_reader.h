@@ -34,8 +34,7 @@ inline ArchiveEntry ReadEntry(unzFile archive) {
 inline std::vector<ArchiveEntry> ReadArchive(const std::string& path) {
   const unzFile archive = unzOpen(path.c_str());
   std::vector<ArchiveEntry> entries;
-  int found = archive == nullptr ? UNZ_ERRNO : unzGoToFirstFile(archive);
-  for (; found == UNZ_OK; found = unzGoToNextFile(archive)) {
+  for (int found = unzGoToFirstFile(archive); found == UNZ_OK; found = unzGoToNextFile(archive)) {
     entries.push_back(ReadEntry(archive));
   }
   unzClose(archive);
@@ -50,8 +49,8 @@ inline std::string ArchiveTree(const std::string& path) {
   std::string lines =
       entries.empty() && std::filesystem::file_size(path) != endRecord ? "none" : "";
   for (const ArchiveEntry& entry : entries) {
-    lines += entry.Name + (entry.IsWhole ? "" : " (damaged)");
-    lines += (entry.Attributes & 0x90) == 0x10 ? "/\n" : "\n";
+    lines += entry.Name + (entry.IsWhole ? "" : " (damaged)") +
+             ((entry.Attributes & 0x90) == 0x10 ? "/\n" : "\n");
   }
   return lines;
 }

@@ -92,13 +92,12 @@ std::vector<std::string> EnumRegistrySubKeys(const std::string& keyPath) {
   Machine().RegistryQuestions.push_back(keyPath + "|subkeys");
   std::vector<std::string> names;
   const std::string prefix = keyPath + '\\';
-  for (const auto& entry : Machine().Registry) {
-    if (EqualsIgnoringCase(entry.KeyPath.substr(0, prefix.size()), prefix)) {
-      const std::string below = entry.KeyPath.substr(prefix.size());
-      const std::string name = below.substr(0, below.find('\\'));
-      if (std::find(names.begin(), names.end(), name) == names.end()) {
-        names.push_back(name);
-      }
+  for (const auto& [path, valueName, data] : Machine().Registry) {
+    const bool isBelow = EqualsIgnoringCase(path.substr(0, prefix.size()), prefix);
+    const std::string below = isBelow ? path.substr(prefix.size()) : "";
+    const std::string name = below.substr(0, below.find('\\'));
+    if (isBelow && std::find(names.begin(), names.end(), name) == names.end()) {
+      names.push_back(name);
     }
   }
   return names;
@@ -116,20 +115,17 @@ static bool IsOwnName(const std::string& server) {
 
 static std::vector<std::string> NamesOf(const Groups& groups, const std::string& server) {
   std::vector<std::string> names;
-  for (const auto& [name, members] : groups) {
-    names.push_back(name);
+  for (size_t i = 0; i < groups.size() && IsOwnName(server); ++i) {
+    names.push_back(groups[i].first);
   }
-  return IsOwnName(server) ? names : std::vector<std::string>();
+  return names;
 }
 
 static std::vector<std::string> MembersOf(const Groups& groups, const std::string& server,
                                           const std::string& group) {
-  for (const auto& [name, members] : groups) {
-    if (name == group && IsOwnName(server)) {
-      return members;
-    }
-  }
-  return {};
+  const auto found = std::find_if(groups.begin(), groups.end(),
+                                  [&group](const auto& entry) { return entry.first == group; });
+  return IsOwnName(server) && found != groups.end() ? found->second : std::vector<std::string>();
 }
 
 std::vector<std::string> ListLocalGroups(const std::string& server) {
