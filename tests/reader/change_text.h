@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "reader/change.h"
 
@@ -17,4 +18,12 @@ inline std::string ChangeText(const Change& change) {
             field.After.value_or("-");
   }
   return text;
+}
+
+inline std::vector<std::string> ChangeTexts(const Changes& changes) {
+  std::vector<std::string> texts;
+  for (const Change& change : changes.List) {
+    texts.push_back(ChangeText(change));
+  }
+  return texts;
 }

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <array>
 #include <functional>
 
 #include "app/install_history.h"
@@ -11,6 +12,7 @@
 #include "reader/history.h"
 #include "reader/json.h"
 #include "tests/reader/change_text.h"
+#include "tests/reader/history_of.h"
 #include "tests/support/fake_machine.h"
 #include "tests/support/file_text.h"
 #include "tests/support/run_tool.h"
@@ -55,17 +57,13 @@ void SetState(size_t service, uint32_t state) {
 }
 
 struct Step {
-  const char* Action;
-  const char* Copy;
-  const char* Result;
+  std::array<const char*, 3> Call;  // action, copy, result
   std::function<void()> Change;
   std::vector<std::string> Changes;  // as JSON, without the event and the source
 };
 
 const std::vector<Step> story = {
-    {"Install",
-     "Prod",
-     "Successful",
+    {{"Install", "Prod", "Successful"},
      [] {
        Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "4096");
        Set(copies + "Prod\\PROFILES\\ORX", "Port", "50000");
@@ -81,33 +79,23 @@ const std::vector<Step> story = {
       R"("added","section":"profile","path":["Prod"],"name":"LogSize","fields":{"value":{"before":null,"after":"4096"}})",
       R"("added","section":"instances","path":["Prod"],"name":"ORX","fields":{})",
       R"("added","section":"instance_profile","path":["Prod","ORX"],"name":"Port","fields":{"value":{"before":null,"after":"50000"}})"}},
-    {"Start",
-     "Prod",
-     "0",
+    {{"Start", "Prod", "0"},
      [] { SetState(2, 4); },
      {R"("changed","section":"services","path":[],"name":"ORX Server - Prod","fields":{"state":{"before":"Stopped","after":"Started"}})"}},
-    {"Configure",
-     "Prod",
-     "0",
+    {{"Configure", "Prod", "0"},
      [] { Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "8192"); },
      {R"("changed","section":"profile","path":["Prod"],"name":"LogSize","fields":{"value":{"before":"4096","after":"8192"}})"}},
-    {"Configure",
-     "Prod",
-     "1603",
+    {{"Configure", "Prod", "1603"},
      [] { Set(copies + "Prod\\PROFILES\\ORX", "Port", "50010"); },
      {R"("changed","section":"instance_profile","path":["Prod","ORX"],"name":"Port","fields":{"value":{"before":"50000","after":"50010"}})"}},
-    {"Start",
-     "Prod",
-     "0",
+    {{"Start", "Prod", "0"},
      [] {
        SetProcesses({"init", "orxserver", "orxserver", "orxserver", "orxlistener"});
      },
      {R"("changed","section":"processes","path":[],"name":"orxserver","fields":{"count":{"before":"1","after":"3"}})",
       R"("removed","section":"processes","path":[],"name":"editor","fields":{"count":{"before":"1","after":null}})",
       R"("added","section":"processes","path":[],"name":"orxlistener","fields":{"count":{"before":null,"after":"1"}})"}},
-    {"Configure",
-     "Prod",
-     "0",
+    {{"Configure", "Prod", "0"},
      [] {
        Machine().LocalGroups[0].second = {"H\\ana"};
        Machine().LocalGroups.push_back({"orx operators", {"H\\bob"}});
@@ -118,18 +106,14 @@ const std::vector<Step> story = {
       R"("added","section":"groups","path":[],"name":"orx operators","fields":{})",
       R"("removed","section":"members","path":["Administrators"],"name":"H\\bob","fields":{})",
       R"("added","section":"members","path":["orx operators"],"name":"H\\bob","fields":{})"}},
-    {"Install",
-     "Prod",
-     "0",
+    {{"Install", "Prod", "0"},
      [] {
        Set(drivers + "ODBC Drivers", "ZEK ORX", "Installed");
        Set(drivers + "ZEK ORX", "Driver", "C:\\ZEK\\orx.dll");
      },
      {R"("added","section":"drivers","path":[],"name":"ZEK ORX","fields":{})",
       R"("added","section":"driver_parameters","path":["ZEK ORX"],"name":"Driver","fields":{"value":{"before":null,"after":"C:\\ZEK\\orx.dll"}})"}},
-    {"Upgrade",
-     "Prod",
-     "Successful",
+    {{"Upgrade", "Prod", "Successful"},
      [] {
        SetSoftware("A", "ORX Server", "9.5");
        Remove(software + "T");
@@ -138,27 +122,19 @@ const std::vector<Step> story = {
      {R"("changed","section":"software","path":["ZEK"],"name":"ORX Server","fields":{"version":{"before":"9.4","after":"9.5"}})",
       R"("removed","section":"software","path":["ZEK"],"name":"Tools","fields":{"version":{"before":"1.0","after":null},"date":{"before":"","after":null},"language":{"before":"0","after":null},"location":{"before":"","after":null}})",
       R"("changed","section":"products","path":["Prod"],"name":"ORX Server","fields":{"version":{"before":"9..","after":"10.."}})"}},
-    {"Install",
-     "Test",
-     "0",
+    {{"Install", "Test", "0"},
      [] { Set(copies + "Test", "", ""); },
      {R"("added","section":"copies","path":[],"name":"Test","fields":{})"}},
-    {"Verify",
-     "Test",
-     "Nothing to do",
+    {{"Verify", "Test", "Nothing to do"},
      [] {
        SetProcesses({"orxserver", "init", "orxserver", "orxserver", "orxlistener"});
      },
      {}},
     // Of two services with one name one stops: which, nobody can see.
-    {"Stop",
-     "Test",
-     "Failed (1603), rolled back",
+    {{"Stop", "Test", "Failed (1603), rolled back"},
      [] { SetState(0, 1); },
      {R"("changed","section":"services","path":[],"name":"ORX Listener","fields":{"state":{"before":"Started","after":"Stopped"}})"}},
-    {"Remove",
-     "Test",
-     "0",
+    {{"Remove", "Test", "0"},
      [] { Remove(copies + "Test"); },
      {R"("removed","section":"copies","path":[],"name":"Test","fields":{})"}},
 };
@@ -175,48 +151,41 @@ void SetMachine() {
   SetProcesses({"init", "orxserver", "editor"});
 }
 
-void Record(size_t number, const Step& step) {
-  const std::string identity = std::to_string(1000 + number);
-  RunTool({"-start", identity, "-Action", step.Action, "-Type", "Silent"});
-  RunTool({"-logmessage", identity, "-message", std::string("Message of ") + step.Action});
-  step.Change();
-  RunTool({"-end", identity, "-CopyName", step.Copy, "-Result", step.Result});
-}
-
 TEST(Story, ReadsBackWhatWasDoneAndNothingElse) {
   const ScratchHistory scratch;
   SetMachine();
-  for (size_t i = 0; i < story.size(); ++i) {
-    Record(i, story[i]);
+  std::string identity = "1000";
+  for (const auto& [call, change, changes] : story) {
+    const auto& [action, copy, result] = call;
+    RunTool({"-start", identity, "-Action", action, "-Type", "Silent"});
+    RunTool({"-logmessage", identity, "-message", std::string("Message of ") + action});
+    change();
+    RunTool({"-end", identity, "-CopyName", copy, "-Result", result});
+    identity = std::to_string(std::stoi(identity) + 1);
   }
   const std::string archive = scratch.In("story.zip");
   ASSERT_EQ(CInstallHistory().Report(archive), 1);
 
-  std::string error;
-  const std::unique_ptr<Source> source = OpenSource(archive, error);
-  ASSERT_TRUE(source) << error;
-  const History history = ReadHistory(*source, TextDecoder(), Detail::kAll);
-  ASSERT_EQ(history.Events.size(), story.size());
+  const HistoryOf history(archive);
+  ASSERT_EQ(history.Result.Events.size(), story.size());
   for (size_t i = 0; i < story.size(); ++i) {
-    const Event& event = history.Events[i];
-    const std::string identity = std::to_string(1000 + i);
+    const Event& event = history.Result.Events[i];
+    EXPECT_EQ(event.Identity, std::to_string(1000 + i));
     std::vector<std::string> changes;
     for (const Change& change : event.Differences.List) {
-      changes.push_back(ChangeJson("story.zip", event, change));
+      const std::string json = ChangeJson("story.zip", event, change);
+      const std::string begin = R"({"event":")" + event.Identity + R"(","change":)";
+      EXPECT_TRUE(json.starts_with(begin) && json.ends_with(R"(,"source":"story.zip"})")) << json;
+      changes.push_back(json.substr(begin.size(), json.rfind(',') - begin.size()));
     }
-    std::vector<std::string> expected;
-    for (const std::string& change : story[i].Changes) {
-      expected.push_back(R"({"event":")" + identity + R"(","change":)" + change +
-                         R"(,"source":"story.zip"})");
-    }
-    EXPECT_EQ(changes, expected);
-    EXPECT_EQ(event.Messages, std::string("Message of ") + story[i].Action + '\n');
+    EXPECT_EQ(changes, story[i].Changes);
+    EXPECT_EQ(event.Messages, std::string("Message of ") + story[i].Call[0] + '\n');
     EXPECT_EQ(event.Computer, "ORXHOST");
-    EXPECT_TRUE(std::all_of(event.Differences.Compared.begin(), event.Differences.Compared.end(),
-                            [](bool isCompared) { return isCompared; }));
+    const auto& compared = event.Differences.Compared;
+    EXPECT_EQ(std::count(compared.begin(), compared.end(), false), 0);
   }
-  EXPECT_TRUE(source->Findings.empty());
-  for (const Finding& finding : CheckHistory(history)) {
+  EXPECT_TRUE(history.From->Findings.empty());
+  for (const Finding& finding : CheckHistory(history.Result)) {
     ADD_FAILURE() << finding.Code << ' ' << finding.Event << ' ' << finding.Text;
   }
 }
@@ -224,23 +193,18 @@ TEST(Story, ReadsBackWhatWasDoneAndNothingElse) {
 // Before the first row of users, software or services a run pads on the left.
 TEST(Story, ReadsBothAdjustments) {
   const ScratchHistory scratch;
-  Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "4096");
-  Set(copies + "Prod\\PROFILES\\ORX", "Port", "50000");
-  Set(copies + "Prod\\ORX Server\\CurrentVersion", "Version", "9");
+  story[0].Change();
+  Machine().Services.Entries.clear();
+  Remove(software);
   RunTool({"-start", "1"});
   Set(copies + "Prod\\PROFILES\\ORX", "Port", "50010");
   Machine().Services.Entries = {{"p", "ORX Server", 1}};
   RunTool({"-end", "1"});
-  std::string error;
-  const std::unique_ptr<Source> source = OpenSource(scratch.In("ZEK/ORXHistory"), error);
-  const History history = ReadHistory(*source, TextDecoder(), Detail::kAll);
-  std::vector<std::string> changes;
-  for (const Change& change : history.Events.at(0).Differences.List) {
-    changes.push_back(ChangeText(change));
-  }
-  EXPECT_EQ(changes, (std::vector<std::string>{
-                         "added services ORX Server|state - > Stopped",
-                         "changed instance_profile Prod/ORX/Port|value 50000 > 50010"}));
+  const HistoryOf history(scratch.In("ZEK/ORXHistory"));
+  const std::vector<std::string> changes = {
+      "added services ORX Server|state - > Stopped",
+      "changed instance_profile Prod/ORX/Port|value 50000 > 50010"};
+  EXPECT_EQ(ChangeTexts(history.Result.Events.at(0).Differences), changes);
 }
 
 }  // namespace
