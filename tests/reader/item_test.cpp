@@ -15,7 +15,7 @@
 #include "products/products_list.h"
 #include "reader/snapshot.h"
 #include "tests/reader/item_text.h"
-#include "tests/support/fake_machine.h"
+#include "tests/support/file_text.h"
 #include "tests/support/run_tool.h"
 
 namespace {
@@ -35,82 +35,54 @@ struct Column {
   const char* Kinds;
 };
 
-CProductInfo Software() {
-  CProductInfo product;
-  product.Publisher = "ZEK";
-  product.DisplayName = "Server";
-  product.DisplayVersion = "9.4";
-  product.InstallDate = "20261101";
-  product.InstallLocation = "C:\\ZEK";
-  product.Language = 1033;
-  return product;
-}
-
 Printer PrintSoftware(std::string CProductInfo::*field) {
   return [field](const std::string& value) {
+    CProductInfo product = {"Server", "9.4", "20261101", "C:\\ZEK", "ZEK", 1033};
+    product.*field = value;
+    product.Publisher.replace(0, 3, "ZEK");  // others are not printed
     CProductsList list;
-    list.Products = {Software()};
-    list.Products[0].*field = value;
-    // Printed whatever the publisher is.
-    list.Products[0].Publisher.replace(0, 3, "ZEK");
+    list.Products = {product};
     list.Print();
   };
 }
 
-CORXCopy Copy() {
-  CORXCopy copy("C1");
-  CORXProduct product("C1", "ORX Server");
-  product.ProductCode = "{1}";
-  product.VersionInfo = {"9", "4", "0", "SL"};
-  product.LastModifiedDate = "20261101";
-  copy.Products = {product};
-  return copy;
-}
-
-void PrintCopies(const CORXCopy& copy) {
-  for (const int32_t generation : {0, 1}) {
-    SetCopyGeneration(generation);
+// The copies of both generations: none, and one that the value changes.
+Printer PrintCopy(const std::function<void(CORXCopy&, const std::string&)>& change) {
+  return [change](const std::string& value) {
+    SetCopyGeneration(0);
+    CORXProductsList().Print();
+    CORXProduct product("C1", "ORX Server");
+    product.ProductCode = "{1}";
+    product.VersionInfo = {"9", "4", "0", "SL"};
+    product.LastModifiedDate = "20261101";
     CORXProductsList list;
-    if (generation == 1) {
-      list.Copies = {copy};
-    }
+    list.Copies = {CORXCopy("C1")};
+    list.Copies[0].Products = {product};
+    change(list.Copies[0], value);
+    SetCopyGeneration(1);
     list.Print();
-  }
+  };
 }
 
 Printer PrintProduct(std::string CORXProduct::*field) {
-  return [field](const std::string& value) {
-    CORXCopy copy = Copy();
-    copy.Products[0].*field = value;
-    PrintCopies(copy);
-  };
+  return PrintCopy([field](CORXCopy& copy, const auto& value) { copy.Products[0].*field = value; });
 }
 
 Printer PrintVersion(std::string CORXVersion::*field) {
-  return [field](const std::string& value) {
-    CORXCopy copy = Copy();
+  return PrintCopy([field](CORXCopy& copy, const std::string& value) {
     copy.Products[0].VersionInfo.*field = value;
-    PrintCopies(copy);
-  };
+  });
 }
 
-void PrintProfile(const std::string& name) {
-  CORXCopy copy = Copy();
-  copy.GlobalProfile = {{name, "4096"}};
-  PrintCopies(copy);
+Printer PrintProfile(const std::string& text) {
+  return PrintCopy([text](CORXCopy& copy, const auto& name) {
+    copy.GlobalProfile = {{name, text}};
+  });
 }
 
-void PrintProfileWithColons(const std::string& name) {
-  CORXCopy copy = Copy();
-  copy.GlobalProfile = {{name, "C:\\ZEK"}};
-  PrintCopies(copy);
-}
-
-void PrintInstance(const std::string& name) {
-  CORXCopy copy = Copy();
+void ChangeInstance(CORXCopy& copy, const std::string& name) {
   copy.Instances = {CORXInstance("C1", "I1")};
   copy.Instances[0].Parameters = {{name, "5"}};
-  PrintCopies(copy);
 }
 
 void PrintDriver(const std::string& name) {
@@ -147,8 +119,8 @@ const Column columns[] = {
     {"location", 1, 99, PrintSoftware(&CProductInfo::InstallLocation),
      "software|ZEK|Server|version=9.4|date=20261101|language=1033|location=@", "fff"},
     {"service", 3, 60, PrintService, "services|ORX@|state=The service pause is pending", "fff"},
-    {"profile", 4, 29, PrintProfile, "profile|C1|@|value=4096", "fff"},
-    {"profile, a colon in the value", 4, 29, PrintProfileWithColons, "profile|C1|@|value=C:\\ZEK",
+    {"profile", 4, 29, PrintProfile("4096"), "profile|C1|@|value=4096", "fff"},
+    {"profile, a colon in the value", 4, 29, PrintProfile("C:\\ZEK"), "profile|C1|@|value=C:\\ZEK",
      "frr"},
     {"product", 4, 40, PrintProduct(&CORXProduct::Name),
      "products|C1|@|code={1}|version=9.4.0|service_level=SL|modified=20261101", "ffr"},
@@ -160,7 +132,8 @@ const Column columns[] = {
      "products|C1|ORX Server|code={1}|version=9.4.0|service_level=@|modified=20261101", "ffr"},
     {"modified", 4, 20, PrintProduct(&CORXProduct::LastModifiedDate),
      "products|C1|ORX Server|code={1}|version=9.4.0|service_level=SL|modified=@", "fff"},
-    {"parameter of an instance", 4, 36, PrintInstance, "instance_profile|C1/I1|@|value=5", "frr"},
+    {"parameter of an instance", 4, 36, PrintCopy(ChangeInstance),
+     "instance_profile|C1/I1|@|value=5", "frr"},
     {"parameter of a driver", 5, 30, PrintDriver, "driver_parameters|ZEK ORX|@|value=5", "frr"},
 };
 
@@ -173,39 +146,34 @@ std::string Printed(const Column& column, const std::string& value, Padding padd
 
 // The text as the line in which the value is, which the whole row is.
 std::string RowWith(const std::string& text, const std::string& value) {
-  const size_t place = text.rfind(value);
-  const size_t begin = text.rfind('\n', place) + 1;
-  return text.substr(begin, text.find('\n', place) - begin);
+  const size_t found = text.rfind(value);
+  const size_t begin = text.rfind('\n', found) + 1;
+  return text.substr(begin, text.find('\n', found) - begin);
 }
 
 void Check(const Column& column, const std::string& value, char kind, Padding padding) {
   const std::string text = Printed(column, value, padding);
   const auto items = ReadItems(text, column.Part, padding);
   ASSERT_TRUE(items) << column.Name << '\n' << text;
-  const std::vector<std::string> all = ItemTexts(*items);
   // The first three letters of some values are fixed by a filter.
-  const std::string rest =
-      column.Item.find("ZEK@") != std::string::npos || column.Item.find("ORX@") != std::string::npos
-          ? value.substr(3)
-          : value;
-  std::string expected = column.Item;
-  expected.replace(expected.find('@'), 1, rest);
-  const std::string row = RowWith(text, rest);
-  const std::string name = kind == 'f' ? expected : '|' + row;
-  EXPECT_TRUE(std::any_of(
-      all.begin(), all.end(),
-      [&](const std::string& item) { return kind == 'f' ? item == name : item.ends_with(name); }))
-      << column.Name << ' ' << value.size() << "\n expected: " << name
-      << "\n read: " << ::testing::PrintToString(all);
+  const bool isFiltered = column.Item.find("ZEK@") != std::string::npos ||
+                          column.Item.find("ORX@") != std::string::npos;
+  const std::string rest = value.substr(isFiltered ? 3 : 0);
+  const std::string expected =
+      kind == 'f' ? Replaced(column.Item, "@", rest) : '|' + RowWith(text, rest);
+  EXPECT_TRUE(std::any_of(items->begin(), items->end(),
+                          [&](const Item& item) {
+                            const std::string read = ItemText(item);
+                            return kind == 'f' ? read == expected : read.ends_with(expected);
+                          }))
+      << column.Name << ' ' << value.size() << "\n expected: " << expected << "\n in: " << text;
 }
 
 TEST(Items, ReadBackAtEveryWidth) {
   for (const Column& column : columns) {
     for (const Padding padding : {Padding::kRight, Padding::kLeft}) {
-      Machine() = FakeMachine();
       for (size_t i = 0; i < 3; ++i) {
-        const std::string value(column.Width + i - 1, 'x');
-        Check(column, value, column.Kinds[i], padding);
+        Check(column, std::string(column.Width + i - 1, 'x'), column.Kinds[i], padding);
       }
       Check(column, "xxxxxx", 'f', padding);
     }
@@ -217,13 +185,12 @@ TEST(Items, ReadBackAtEveryWidth) {
 TEST(Items, AreNotReadFromShiftedColumns) {
   for (const Column& column : columns) {
     const bool hasMoreColumns = column.Part == 1 || column.Item.starts_with("products");
-    if (!hasMoreColumns || column.Kinds[2] == 'f') {
-      continue;
-    }
     const std::string rest(column.Width - 1, 'x');
-    Check(column, rest + " xxxx", 'r', Padding::kRight);
-    Check(column, rest + " x", 'r', Padding::kRight);
-    Check(column, "x x" + rest, 'r', Padding::kLeft);
+    if (hasMoreColumns && column.Kinds[2] != 'f') {
+      Check(column, rest + " xxxx", 'r', Padding::kRight);
+      Check(column, rest + " x", 'r', Padding::kRight);
+      Check(column, "x x" + rest, 'r', Padding::kLeft);
+    }
   }
 }
 

@@ -1,7 +1,6 @@
 #pragma once
 
 #include <string>
-#include <vector>
 
 #include "reader/item.h"
 
@@ -18,12 +17,4 @@ inline std::string ItemText(const Item& item) {
                                               : std::string(item.Values[i]);
   }
   return text;
-}
-
-inline std::vector<std::string> ItemTexts(const std::vector<Item>& items) {
-  std::vector<std::string> texts;
-  for (const Item& item : items) {
-    texts.push_back(ItemText(item));
-  }
-  return texts;
 }
