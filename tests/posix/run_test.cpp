@@ -55,9 +55,6 @@ TEST_F(Run, ReturnsItsExitResults) {
     EXPECT_EQ(FileText(Root + "/output").substr(0, usage.size()), outputBegin);
     EXPECT_EQ(fs::exists(History), outputBegin.empty());
   }
-  WriteFileText(Root + "/ZEK", "a file in the way");
-  EXPECT_EQ(Call("-start 7"), 1);
-  EXPECT_EQ(FileText(Root + "/output"), "Initialiation Failed:\n");
 }
 
 TEST_F(Run, RecordsLocalTimes) {

@@ -22,31 +22,12 @@ class Run : public Platform {
     fs::remove_all(GetHistoryDir());
   }
 
-  // The program's result, after it has written its output to the file "output".
+  // The program's result; its output goes to the file "output". The command interpreter removes the
+  // outer quotation marks.
   int Call(const std::string& arguments, const std::string& program = ORX_PROGRAM) const {
-    SECURITY_ATTRIBUTES inherited = {sizeof inherited, /*lpSecurityDescriptor=*/nullptr,
-                                     /*bInheritHandle=*/TRUE};
-    const UniqueHandle output =
-        OwnIfValid(::CreateFileA(In("output").c_str(), GENERIC_WRITE, FILE_SHARE_READ, &inherited,
-                                 CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, /*hTemplateFile=*/nullptr));
-    STARTUPINFOA startup = {};
-    startup.cb = sizeof startup;
-    startup.dwFlags = STARTF_USESTDHANDLES;
-    startup.hStdOutput = output.get();
-    PROCESS_INFORMATION process = {};
-    std::string line = "program " + arguments;
-    if (::CreateProcessA(program.c_str(), line.data(), /*lpProcessAttributes=*/nullptr,
-                         /*lpThreadAttributes=*/nullptr, /*bInheritHandles=*/TRUE,
-                         /*dwCreationFlags=*/0, /*lpEnvironment=*/nullptr,
-                         /*lpCurrentDirectory=*/nullptr, &startup, &process) == FALSE) {
-      return -1;
-    }
-    const UniqueHandle thread(process.hThread);
-    const UniqueHandle handle(process.hProcess);
-    ::WaitForSingleObject(handle.get(), /*dwMilliseconds=*/60'000);
-    DWORD result = 0;
-    ::GetExitCodeProcess(handle.get(), &result);
-    return static_cast<int>(result);
+    const std::string native = fs::path(program).make_preferred().string();
+    return std::system(
+        ("\"\"" + native + "\" " + arguments + " >\"" + In("output") + "\"\"").c_str());
   }
 
   static std::string InHistory(const std::string& name) { return JoinPath(GetHistoryDir(), name); }
