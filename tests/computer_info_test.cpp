@@ -10,8 +10,8 @@
 
 namespace {
 
-// The machine that a line of the golden table has in its first columns. A registry text in the
-// place of the product type goes with a system that knows the short version alone.
+// The machine that a line of the golden table has in its first columns. A registry text in place of
+// the product type goes with a system that knows the short version alone.
 void SetMachine(const std::string& line) {
   Machine() = FakeMachine();
   SystemVersion version;
@@ -33,7 +33,7 @@ void SetMachine(const std::string& line) {
 TEST(ComputerInfo, IsThatOfTheGoldenTable) {
   std::istringstream lines(Golden("computers.txt"));
   std::string line;
-  ASSERT_TRUE(std::getline(lines, line));  // tells what the columns are
+  ASSERT_TRUE(std::getline(lines, line));  // names the columns
   while (std::getline(lines, line)) {
     SetMachine(line);
     CComputerInfo computer;

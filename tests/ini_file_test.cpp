@@ -34,7 +34,7 @@ TEST(IniFile, ListsSectionsAsFarAsTheyFit) {
   const ScratchHistory scratch;
   const CIniFile file(scratch.In("a.ini"));
   EXPECT_TRUE(file.GetSectionNames().empty());
-  // 10 names of 1000 bytes with their ends, and one that ends at, before or behind the limit.
+  // 10 names of 1000 bytes with their ends, and one that ends at, before or after the limit.
   for (const size_t last : {227, 228, 229, 900}) {
     std::vector<std::string> names;
     std::string text;
@@ -42,7 +42,7 @@ TEST(IniFile, ListsSectionsAsFarAsTheyFit) {
       names.emplace_back(c < 'k' ? 1000 : last, c);
       text += '[' + names.back() + "]\n";
     }
-    WriteFileText(file.Path, text + "[behind]\n");
+    scratch.Make("a.ini", text + "[after]\n");
     names.back().resize(std::min<size_t>(last, 228));
     EXPECT_EQ(file.GetSectionNames(), names);
   }

@@ -63,13 +63,13 @@ TEST(Lists, ShowControlCharactersAsQuestionMarks) {
       list->Print();
     }
   });
-  const std::string spaces(60 - shown.size(), ' ');
+  const auto padded = [&shown](size_t width) {
+    return shown + std::string(width - shown.size(), ' ');
+  };
   for (const std::string& line :
-       {"\nLogged on User:" + shown + '\n',
-        "\nGroup Name \n" + std::string(35, '-') + '\n' + shown + '\n',
-        '\n' + shown + std::string(40 - shown.size(), ' ') + shown + '\n',
-        "\n9" + std::string(18, ' ') + shown + '\n', '\n' + shown + spaces + "Stopped\n"}) {
-    EXPECT_NE(text.find(line), std::string::npos) << line << text;
+       {"Logged on User:" + shown, std::string(35, '-') + '\n' + shown, padded(40) + shown,
+        '9' + std::string(18, ' ') + shown, padded(60) + "Stopped"}) {
+    EXPECT_NE(text.find('\n' + line + '\n'), std::string::npos) << line << text;
   }
 }
 
@@ -77,8 +77,7 @@ TEST(Lists, AreEmptyWhenTheServicesAreRefused) {
   CServicesList list;
   list.Services.resize(1);
   Machine().Services = {5, {}};
-  EXPECT_EQ(list.Collect(), 5);
-  EXPECT_TRUE(list.Services.empty());
+  EXPECT_TRUE(list.Collect() == 5 && list.Services.empty());
 }
 
 TEST(Lists, TakeTheOldCopyInItsOwnCaseOnly) {

@@ -6,7 +6,7 @@
 
 namespace {
 
-// The result and, behind it, what was found.
+// The result and, after it, what was found.
 std::string Collected(CProcessList& list) {
   std::string text = std::to_string(list.Collect());
   for (const CProcessInfo& process : list.Processes) {
@@ -29,9 +29,7 @@ TEST(ProcessList, LeavesOutItselfAndProcessZeroOnNT) {
 
 TEST(ProcessList, WalksTheSnapshotOnWindows95) {
   Machine() = FakeMachine();
-  Machine().ExtendedVersion = SystemVersion();
-  Machine().ExtendedVersion->MajorVersion = 4;
-  Machine().ExtendedVersion->MinorVersion = 10;
+  Machine().ExtendedVersion = SystemVersion{4, 10, 0, 0, "", 0, 0, 0, 0};
   Machine().OwnProcess = 7;
   CProcessList list;
   EXPECT_EQ(Collected(list), "1");

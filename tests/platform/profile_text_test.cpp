@@ -57,20 +57,4 @@ TEST(ProfileText, ChangesNothingButTheKey) {
   }
 }
 
-TEST(ProfileText, KeepsItsOffsetsThroughManyChanges) {
-  ProfileText text("[History]\nCount=0\n");
-  for (size_t i = 0; i < 200; ++i) {
-    const std::string section = "event " + std::to_string(i % 50);
-    const std::string key = "Key" + std::to_string(i % 7);
-    const std::string value(i % 13, 'v');
-    text.Set(section, key, value);
-    text.Set("History", "Count", std::to_string(i * i));
-    const ProfileText again(text.Get());
-    EXPECT_EQ(again.SectionNames(), text.SectionNames());
-    EXPECT_EQ(again.Find(section, key), value);
-    EXPECT_EQ(text.Find(section, key), value);
-  }
-  EXPECT_EQ(text.Find("History", "Count"), "39601");
-}
-
 }  // namespace

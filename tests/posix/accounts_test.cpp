@@ -41,15 +41,14 @@ TEST(Accounts, CountOnceAndFitTheirBuffer) {
   const std::string fits(127 - host.size(), 'f');
   const std::string group127(127, 'g');
   const auto row = [&host](const std::string& group, const std::string& user) {
-    return group + std::string(group.size() < 30 ? 40 - group.size() : 10, ' ') + host + user +
-           '\n';
+    const size_t blanks = group.size() < 30 ? 40 - group.size() : 10;
+    return group + std::string(blanks, ' ') + host + user + '\n';
   };
   std::string manyMembers = "bo";
   std::string manyRows = row("many", "bo");
   for (int i = 0; i < 1000; ++i) {
-    const std::string member = 'm' + std::to_string(i);
-    manyMembers += ',' + member;
-    manyRows += row("many", member);
+    manyMembers += ",m" + std::to_string(i);
+    manyRows += row("many", 'm' + std::to_string(i));
   }
   const std::string shell = "::/:/bin/sh\n";
   const std::string report =

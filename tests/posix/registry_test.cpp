@@ -139,18 +139,16 @@ TEST(Registry, EnduresMonstrousExports) {
   constexpr size_t megabytes = 2 << 20;
   const std::string key = "[HKEY_LOCAL_MACHINE\\S]\n";
   const std::string levels = Repeated("\\k", megabytes / 2);
-  std::vector<std::string> monsters = {Repeated(" ", megabytes),
-                                       Repeated(key + "[-HKEY_LOCAL_MACHINE\\S]\n", many / 10),
-                                       "\"a\"=hex:00" + Repeated(",\\\n00", many) + ",",
-                                       "\"a\"=\"" + Repeated("x", megabytes),
-                                       "\"a\"=\"" + Repeated("no end\n", many),
-                                       "[HKEY_LOCAL_MACHINE\\" + Repeated("x", megabytes) + "]",
-                                       "[HKEY_LOCAL_MACHINE\\S" + levels + "]",
-                                       "[-HKEY_LOCAL_MACHINE" + levels + "]"};
-  for (const std::string& line : {"["s, "\\"s, "\""s, "\0"s, "\"a\"=\""s, "@=hex:\\"s}) {
-    monsters.push_back(Repeated(line, many));
-    monsters.push_back(Repeated(line + '\n', many));
-  }
+  const std::string monsters[] = {Repeated(" ", megabytes),
+                                  Repeated(key + "[-HKEY_LOCAL_MACHINE\\S]\n", many / 10),
+                                  "\"a\"=hex:00" + Repeated(",\\\n00", many) + ",",
+                                  "\"a\"=\"" + Repeated("x", megabytes),
+                                  "\"a\"=\"" + Repeated("no end\n", many),
+                                  "[HKEY_LOCAL_MACHINE\\S" + levels + "]",
+                                  "[-HKEY_LOCAL_MACHINE" + levels + "]",
+                                  Repeated("[", many) + Repeated("\\\n", many),
+                                  Repeated("\"", many) + Repeated("\"a\"=\"\n", many),
+                                  Repeated("\0"s, many) + Repeated("@=hex:\\", many)};
   for (const std::string& monster : monsters) {
     const std::string text = header + key + monster + '\n' + key + "\"after\"=\"2\"\n";
     for (const std::string& bytes : {text, AsUtf16(text)}) {

@@ -78,7 +78,6 @@ RegistryData ReadRegistryData(const std::string& keyPath, const std::string& val
 }
 
 std::vector<std::string> EnumRegistryValueNames(const std::string& keyPath) {
-  Machine().RegistryQuestions.push_back(keyPath + "|values");
   std::vector<std::string> names;
   for (const auto& [path, name, data] : Machine().Registry) {
     if (EqualsIgnoringCase(path, keyPath) && !name.empty()) {
@@ -89,7 +88,6 @@ std::vector<std::string> EnumRegistryValueNames(const std::string& keyPath) {
 }
 
 std::vector<std::string> EnumRegistrySubKeys(const std::string& keyPath) {
-  Machine().RegistryQuestions.push_back(keyPath + "|subkeys");
   std::vector<std::string> names;
   const std::string prefix = keyPath + '\\';
   for (const auto& [path, valueName, data] : Machine().Registry) {

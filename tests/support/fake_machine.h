@@ -45,7 +45,7 @@ struct FakeMachine {
   };
   std::vector<RegistryEntry> Registry;
 
-  // What was asked of it: key, value name, limit and access, or key and "values" or "subkeys".
+  // The values that were asked for: key, value name, limit and access.
   std::vector<std::string> RegistryQuestions;
 
   void SetText(const std::string& keyPath, const std::string& name, const std::string& text);
