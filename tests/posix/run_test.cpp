@@ -95,7 +95,8 @@ TEST_F(Run, LeavesWhatIsNoRegularFile) {
       {"mkfifo History.ini", "test -p History.ini"},
       {"mkdir 1; ln -s ../../../new 1/ORXInstallEvent.Log", "test ! -e ../../new"},
       {"ln -s ../../new Summary.txt", "test ! -e ../../new"},
-      {"mkfifo Summary.txt", "test -p Summary.txt"}};
+      {"mkfifo Summary.txt stray", "test -p Summary.txt -a -p stray"},
+      {"mkdir ../../out; touch ../../out/far; ln -s ../../out .", "! grep -q far ../../a.zip"}};
   for (const auto& [before, after] : cases) {
     EXPECT_EQ(Shell("cd ZEK/ORXHistory; rm -rf *; " + std::string(before)), 0);
     EXPECT_EQ(Call("-start 1") + Call("-report a.zip"), 0);
