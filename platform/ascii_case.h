@@ -1,12 +1,19 @@
 #pragma once
 
 #include <algorithm>
+#include <string>
 #include <string_view>
 
 // Comparison that ignores the case of the letters A to Z and of no others, whatever the locale.
 
 constexpr char ToLowerAscii(char c) {
   return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+}
+
+inline std::string LoweredAscii(std::string_view text) {
+  std::string lowered(text);
+  std::transform(lowered.begin(), lowered.end(), lowered.begin(), ToLowerAscii);
+  return lowered;
 }
 
 inline bool EqualsIgnoringCase(std::string_view a, std::string_view b) {

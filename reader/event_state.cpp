@@ -1,4 +1,3 @@
-#include <algorithm>
 #include <string>
 
 #include "platform/ascii_case.h"
@@ -32,8 +31,7 @@ EventState StateOfResult(std::string_view result) {
       return EventState::kOk;
     }
   }
-  std::string lowered(result);
-  std::transform(lowered.begin(), lowered.end(), lowered.begin(), ToLowerAscii);
+  const std::string lowered = LoweredAscii(result);
   for (const std::string_view word : {"fail", "error", "abort", "cancel", "rolled back"}) {
     if (lowered.find(word) != lowered.npos) {
       return EventState::kFailed;

@@ -20,12 +20,6 @@ const std::string reportName = "ORXInstallEvent.Log";
 // Of the changes and messages that are kept, over all events.
 constexpr size_t mostBytesKept = 96 << 20;
 
-std::string Lowered(std::string_view text) {
-  std::string lowered(text);
-  std::transform(lowered.begin(), lowered.end(), lowered.begin(), ToLowerAscii);
-  return lowered;
-}
-
 std::optional<std::string> IfNotEmpty(std::string_view text) {
   return text.empty() ? std::nullopt : std::optional(std::string(text));
 }
@@ -72,7 +66,7 @@ class HistoryReader {
       EventSection section;
       const bool hasKey = ReadSection(text, i, section);
       const bool isEvent = hasKey || !EqualsIgnoringCase(section.Name, "History");
-      if (!section.Name.empty() && isEvent && names.insert(Lowered(section.Name)).second) {
+      if (!section.Name.empty() && isEvent && names.insert(LoweredAscii(section.Name)).second) {
         AddSection(section);
       }
     }

@@ -4,17 +4,11 @@
 
 #include "platform/ascii_case.h"
 
-static std::string Lowered(std::string_view text) {
-  std::string lowered(text);
-  std::transform(lowered.begin(), lowered.end(), lowered.begin(), ToLowerAscii);
-  return lowered;
-}
-
 HistoryFiles::HistoryFiles(const Source& source, const TextDecoder& decoder)
     : From(source), Decoder(decoder) {
   for (size_t i = 0; i < source.Files.size(); ++i) {
     std::string path = PathOf(i);
-    ByLoweredPath.try_emplace(Lowered(path), i);
+    ByLoweredPath.try_emplace(LoweredAscii(path), i);
     ByPath.try_emplace(std::move(path), i);
   }
 }
@@ -33,7 +27,7 @@ std::optional<size_t> HistoryFiles::Find(std::string_view path) const {
 }
 
 std::optional<size_t> HistoryFiles::FindIgnoringCase(std::string_view path) const {
-  return Look(ByLoweredPath, Lowered(path));
+  return Look(ByLoweredPath, LoweredAscii(path));
 }
 
 std::optional<size_t> HistoryFiles::FindNamed(std::string_view fullPath) const {
@@ -43,7 +37,7 @@ std::optional<size_t> HistoryFiles::FindNamed(std::string_view fullPath) const {
   if (isOfWindows) {
     std::replace(path.begin(), path.end(), '\\', '/');
   }
-  const size_t history = Lowered(path).rfind(folder);
+  const size_t history = LoweredAscii(path).rfind(folder);
   if (history == path.npos) {
     return std::nullopt;
   }

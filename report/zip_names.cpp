@@ -35,7 +35,6 @@ std::string ReplaceExtension(const std::string& path, const std::string& extensi
 }
 
 std::optional<std::string> CutFolder(const std::string& path, const std::string& folder) {
-  const std::string_view head = std::string_view(path).substr(0, folder.size());
-  return EqualsIgnoringCase(head, folder) ? std::optional(path.substr(folder.size()))
-                                          : std::nullopt;
+  std::string_view rest = path;
+  return TakePrefixIgnoringCase(rest, folder) ? std::optional(std::string(rest)) : std::nullopt;
 }

@@ -9,8 +9,7 @@
 #include "platform/posix/file_calls.h"
 
 ExclusiveFile::ExclusiveFile(const std::string& path) {
-  Descriptor file(RetryOnInterrupt(
-      [&] { return ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC); }));
+  Descriptor file = OpenFile(path, O_RDONLY | O_NOFOLLOW | O_NONBLOCK);
   struct stat status = {};
   if (file.IsOpen() && StatusOf(file, status) && S_ISREG(status.st_mode)) {
     Handle = file.Release();

@@ -12,6 +12,13 @@
 // System calls that several files here need, repeated while a signal interrupts them. They return
 // false, with the reason in errno, if a call fails.
 
+// Opens a file that no other program inherits; not open (IsOpen), with the reason in errno, if that
+// fails. The mode is that of a new file.
+inline Descriptor OpenFile(const std::string& path, int flags, mode_t mode = 0) {
+  return Descriptor(
+      RetryOnInterrupt([&] { return ::open(path.c_str(), flags | O_CLOEXEC, mode); }));
+}
+
 enum class Links { kFollow, kNoFollow };
 
 // The status of the file at the path; with kNoFollow that of a symbolic link itself.

@@ -89,8 +89,7 @@ static bool CopyContents(const Descriptor& source, const struct stat& status,
 static Descriptor OpenSource(const std::string& source, const std::string& trusted) {
   const OwnerRights rights(trusted);
   // Without O_NONBLOCK the opening of a pipe would wait for its writer.
-  return Descriptor(
-      RetryOnInterrupt([&] { return ::open(source.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC); }));
+  return OpenFile(source, O_RDONLY | O_NONBLOCK);
 }
 
 bool CopyToNewFile(const std::string& source, const std::string& target,
@@ -101,7 +100,6 @@ bool CopyToNewFile(const std::string& source, const std::string& target,
     return false;
   }
   TemporaryFile copy(target);
-  const Descriptor to(RetryOnInterrupt(
-      [&] { return ::open(copy.Path().c_str(), O_WRONLY | O_NOFOLLOW | O_CLOEXEC); }));
+  const Descriptor to = OpenFile(copy.Path(), O_WRONLY | O_NOFOLLOW);
   return to.IsOpen() && CopyContents(from, status, to) && copy.MoveToNew();
 }

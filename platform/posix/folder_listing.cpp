@@ -1,14 +1,13 @@
 #include "platform/folder_listing.h"
 
-#include <dirent.h>
 #include <fcntl.h>
 #include <sys/stat.h>
 
 #include <algorithm>
 #include <ctime>
-#include <memory>
 
 #include "platform/posix/file_calls.h"
+#include "platform/posix/folder_reader.h"
 
 static uint32_t AttributesFromMode(mode_t mode) {
   constexpr uint32_t readOnly = 0x1;
@@ -20,29 +19,16 @@ static uint32_t AttributesFromMode(mode_t mode) {
   return (mode & anyWrite) == 0 ? readOnly : plain;
 }
 
-// Null after the last entry, and without a folder.
-static const dirent* NextEntry(DIR* folder) {
-  return folder == nullptr ? nullptr : RetryOnInterrupt([folder] {
-    errno = 0;  // at the end of the folder readdir returns null and leaves it as it is
-    return ::readdir(folder);
-  });
-}
-
 std::vector<FolderEntry> ListFolder(const std::string& path) {
-  struct Closer {
-    void operator()(DIR* folder) const { ::closedir(folder); }
-  };
-  const std::unique_ptr<DIR, Closer> folder(
-      RetryOnInterrupt([&] { return ::opendir(path.c_str()); }));
+  FolderReader folder(path);
   std::vector<FolderEntry> entries;
-  while (const dirent* entry = NextEntry(folder.get())) {
+  while (const char* name = folder.Next()) {
     struct stat status = {};
-    const int result = RetryOnInterrupt([&] {
-      return ::fstatat(::dirfd(folder.get()), entry->d_name, &status, AT_SYMLINK_NOFOLLOW);
-    });
+    const int result = RetryOnInterrupt(
+        [&] { return ::fstatat(folder.Get(), name, &status, AT_SYMLINK_NOFOLLOW); });
     if (result == 0 && (S_ISREG(status.st_mode) || S_ISDIR(status.st_mode))) {
-      entries.push_back({entry->d_name, static_cast<uint64_t>(status.st_size),
-                         AttributesFromMode(status.st_mode)});
+      entries.push_back(
+          {name, static_cast<uint64_t>(status.st_size), AttributesFromMode(status.st_mode)});
     }
   }
   std::sort(entries.begin(), entries.end(),

@@ -5,9 +5,10 @@
 
 #include <thread>
 
+#include "platform/posix/file_calls.h"
+
 FolderLock::FolderLock(const std::string& folder, std::chrono::nanoseconds& timeLeft)
-    : Folder(RetryOnInterrupt(
-          [&] { return ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC); })) {
+    : Folder(OpenFile(folder, O_RDONLY | O_DIRECTORY)) {
   if (!Folder.IsOpen()) {
     State = LockResult::kNoFolder;
     return;

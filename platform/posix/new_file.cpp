@@ -5,10 +5,8 @@
 
 #include "platform/posix/file_calls.h"
 
-NewFile::NewFile(const std::string& path) : Path(path) {
-  Handle = RetryOnInterrupt(
-      [&] { return ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600); });
-}
+NewFile::NewFile(const std::string& path)
+    : Path(path), Handle(OpenFile(path, O_WRONLY | O_CREAT | O_EXCL, 0600).Release()) {}
 
 NewFile::~NewFile() {
   if (IsOpen()) {

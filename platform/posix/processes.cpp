@@ -1,38 +1,28 @@
 #include "platform/processes.h"
 
-#include <dirent.h>
 #include <unistd.h>
 
 #include <charconv>
 #include <climits>
 #include <cstring>
-#include <memory>
 #include <string_view>
 
+#include "platform/posix/folder_reader.h"
 #include "platform/posix/process_folder.h"
-
-namespace {
-
-struct FolderCloser {
-  void operator()(DIR* folder) const { ::closedir(folder); }
-};
-
-}  // namespace
 
 uint32_t OwnProcessID() { return static_cast<uint32_t>(::getpid()); }
 
 std::optional<std::vector<uint32_t>> ListNumbers(const std::string& folder) {
   constexpr size_t most = 8192;
-  const std::unique_ptr<DIR, FolderCloser> entries(::opendir(folder.c_str()));
-  if (!entries) {
+  FolderReader entries(folder);
+  if (!entries.IsOpen()) {
     return std::nullopt;
   }
   std::vector<uint32_t> numbers;
-  while (const dirent* entry = ::readdir(entries.get())) {
-    const char* end = entry->d_name + std::strlen(entry->d_name);
+  while (const char* name = entries.Next()) {
     uint32_t number = 0;
-    const auto [stop, error] = std::from_chars(entry->d_name, end, number);
-    if (error == std::errc() && stop == end && numbers.size() < most) {
+    const auto [stop, error] = std::from_chars(name, name + std::strlen(name), number);
+    if (error == std::errc() && *stop == '\0' && numbers.size() < most) {
       numbers.push_back(number);
     }
   }

@@ -36,8 +36,7 @@ void ProfileStore::Read(const std::string& path, File& file) {
   file.Opened.Reset(-1);
   file.Status = {};
   // A link could lead anywhere, and opening a pipe would block the run.
-  Descriptor opened(RetryOnInterrupt(
-      [&] { return ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC); }));
+  Descriptor opened = OpenFile(path, O_RDONLY | O_NOFOLLOW | O_NONBLOCK);
   if (!opened.IsOpen()) {
     if (errno == ENOENT) {
       file.Text = std::make_unique<ProfileText>("");
@@ -109,9 +108,7 @@ bool ProfileStore::IsLocked(const std::string& path) const {
 }
 
 static Descriptor CreateFile(const std::string& path, mode_t mode) {
-  return Descriptor(RetryOnInterrupt([&] {
-    return ::open(path.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, mode);
-  }));
+  return OpenFile(path, O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW, mode);
 }
 
 // Writes the text to a temporary file and renames it over the profile file.

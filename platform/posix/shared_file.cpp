@@ -7,9 +7,8 @@
 
 SharedFile::SharedFile(const std::string& path, LinkPolicy links) {
   // Without O_NONBLOCK the opening of a pipe would wait for its writer.
-  const int flags =
-      O_RDONLY | O_NONBLOCK | O_CLOEXEC | (links == LinkPolicy::kRefuse ? O_NOFOLLOW : 0);
-  Descriptor file(RetryOnInterrupt([&] { return ::open(path.c_str(), flags); }));
+  const int linkFlag = links == LinkPolicy::kRefuse ? O_NOFOLLOW : 0;
+  Descriptor file = OpenFile(path, O_RDONLY | O_NONBLOCK | linkFlag);
   struct stat status = {};
   if (file.IsOpen() && StatusOf(file, status) && S_ISREG(status.st_mode)) {
     Handle = file.Release();

@@ -8,8 +8,7 @@
 TemporaryFile::TemporaryFile(const std::string& target) : Target(target) {
   for (int attempt = 0; attempt < 8; ++attempt) {
     const std::string path = RandomPathBeside(target);
-    const Descriptor file(RetryOnInterrupt(
-        [&] { return ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600); }));
+    const Descriptor file = OpenFile(path, O_WRONLY | O_CREAT | O_EXCL, 0600);
     if (file.IsOpen()) {
       Name = path;
       return;
@@ -32,8 +31,7 @@ static bool IsReplaceable(const std::string& path) {
 }
 
 bool TemporaryFile::Replace() {
-  const Descriptor file(
-      RetryOnInterrupt([this] { return ::open(Name.c_str(), O_RDONLY | O_NOFOLLOW | O_CLOEXEC); }));
+  const Descriptor file = OpenFile(Name, O_RDONLY | O_NOFOLLOW);
   if (!file.IsOpen() || !FlushToDisk(file) || !IsReplaceable(Target) || !RenameOver(Name, Target)) {
     return false;
   }

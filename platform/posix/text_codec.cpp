@@ -17,10 +17,9 @@ struct TextCodec::State {
 };
 
 std::optional<TextCodec> TextCodec::Open(const std::string& encoding) {
-  constexpr std::string_view prefix = "windows-";
-  const bool isWindowsName =
-      EqualsIgnoringCase(std::string_view(encoding).substr(0, prefix.size()), prefix);
-  const std::string name = isWindowsName ? "CP" + encoding.substr(prefix.size()) : encoding;
+  std::string_view number = encoding;
+  const std::string name =
+      TakePrefixIgnoringCase(number, "windows-") ? "CP" + std::string(number) : encoding;
   if (name.empty()) {
     return std::nullopt;  // for iconv it is the encoding of the locale
   }

@@ -27,8 +27,7 @@ std::optional<std::string> ReadAll(const Descriptor& file) {
 }
 
 std::optional<std::string> ReadTextFile(const std::string& path) {
-  const Descriptor file(
-      RetryOnInterrupt([&] { return ::open(path.c_str(), O_RDONLY | O_CLOEXEC); }));
+  const Descriptor file = OpenFile(path, O_RDONLY);
   return file.IsOpen() ? ReadAll(file) : std::nullopt;
 }
 

@@ -17,10 +17,10 @@ static UINT CodePageOf(std::string_view name) {
   };
   constexpr Prefix prefixes[] = {{"windows-", 0}, {"cp", 0}, {"iso-8859-", 28590}};
   for (const Prefix& prefix : prefixes) {
-    if (!EqualsIgnoringCase(name.substr(0, prefix.Text.size()), prefix.Text)) {
+    std::string_view digits = name;
+    if (!TakePrefixIgnoringCase(digits, prefix.Text)) {
       continue;
     }
-    const std::string_view digits = name.substr(prefix.Text.size());
     UINT number = 0;
     const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), number);
     const bool isWhole = error == std::errc() && end == digits.data() + digits.size();
