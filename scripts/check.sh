@@ -45,9 +45,7 @@ page() {
 }
 
 packages() {
-  if [ -e scripts/package.sh ]; then
-    step packages scripts/package.sh
-  fi
+  step packages scripts/package.sh
 }
 
 all() {
@@ -72,4 +70,4 @@ case ${1:-quick} in
   *) sed -n '2,/^$/s/^# \{0,1\}//p' "$0" >&2; exit 2 ;;
 esac
 echo
-sed -n '/tests passed/,$p' "build/check/$summary.log"
+tail -n 4 "build/check/$summary.log"
