@@ -80,8 +80,9 @@ TEST(Report, MakesNoArchiveUnderNamesThatAreTaken) {
   const ScratchHistory scratch;
   RunTool({"-start", "7"});
   const std::string before = FileText(GetHistoryFilePath());
-  for (const std::string& name : {std::string(), scratch.Root, scratch.In("none/a.zip"),
-                                  InHistory("7/../History.ini"), InHistory("Summary.txt")}) {
+  for (const std::string& name :
+       {std::string(), scratch.Root, scratch.In("none/a.zip"), InHistory("7/../History.ini"),
+        InHistory("Summary.txt"), InHistory("7/ORXInstallEvent.Log")}) {
     EXPECT_EQ(Report(name), "0 Failed to create file '" + name + "'\n");
   }
   EXPECT_EQ(FileText(GetHistoryFilePath()), before);

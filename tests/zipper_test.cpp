@@ -77,7 +77,7 @@ TEST_F(Zipper, NamesEntriesByTheirPaths) {
 
 TEST_F(Zipper, TrimsBlanksBeforeSeparatorsAtBothEnds) {
   // The text, without its tail, without its head.
-  const char* cases[][3] = {{"/a/b/ \t", "/a/b", "a/b/ \t"},
+  const char* cases[][3] = {{"\r\n/a/b/ \t\v\f\r\n", "\r\n/a/b", "a/b/ \t\v\f\r\n"},
                             {"a / //", "a / ", "a / //"},
                             {" //x", " //x", "x"},
                             {"// x", "// x", " x"},

@@ -96,10 +96,11 @@ TEST_F(Run, LeavesWhatIsNoRegularFile) {
       {"mkdir 1; ln -s ../../../new 1/ORXInstallEvent.Log", "test ! -e ../../new"},
       {"ln -s ../../new Summary.txt", "test ! -e ../../new"},
       {"mkfifo Summary.txt stray", "test -p Summary.txt -a -p stray"},
-      {"mkdir ../../out; touch ../../out/far; ln -s ../../out .", "! grep -q far ../../a.zip"}};
+      {"mkdir ../../out; touch ../../out/far; ln -s ../../out .", "! grep -q far ../../a.zip"},
+      {"mkdir -p C/l ../../out/7; ln -s ../../out l", "test -d ../../out/7"}};
   for (const auto& [before, after] : cases) {
     EXPECT_EQ(Shell("cd ZEK/ORXHistory; rm -rf *; " + std::string(before)), 0);
-    EXPECT_EQ(Call("-start 1") + Call("-report a.zip"), 0);
+    EXPECT_EQ(Call("-start 1") + Call("-end l/7 -CopyName C") + Call("-report a.zip"), 0);
     EXPECT_EQ(Shell("cd ZEK/ORXHistory; " + std::string(after)), 0) << after;
   }
 }
