@@ -1,8 +1,6 @@
 #include "eventlog/logger.h"
 
-#include <cerrno>
-
-#include "platform/held_file.h"
+#include "platform/output_stream.h"
 
 CLogger& CLogger::GetInstance() {
   static CLogger instance;
@@ -11,11 +9,7 @@ CLogger& CLogger::GetInstance() {
 
 void CLogger::Open(const std::string& fileName, std::ios_base::openmode mode) {
   Close();
-  WaitWhileHeld(fileName);
-  do {
-    errno = 0;  // a failure need not set it
-    open(fileName, mode | std::ios::out);
-  } while (!is_open() && errno == EINTR);
+  OpenStream(*this, fileName, mode);
 }
 
 void CLogger::Close() {

@@ -14,10 +14,7 @@ class CLogger : public std::ofstream {
  public:
   static CLogger& GetInstance();
 
-  // Closes the file that is open and opens the named one for output, as text and shared with other
-  // programs: std::ios::out empties an existing file, std::ios::app writes at its end. A missing
-  // file is created, a missing folder is not. Waits for another program that keeps the file open
-  // (WaitWhileHeld). If the file cannot be opened, the stream is in its failure state.
+  // Closes the file that is open and opens the named one, as OpenStream does.
   void Open(const std::string& fileName, std::ios_base::openmode mode);
 
   // Does nothing if no file is open.

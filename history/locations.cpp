@@ -20,7 +20,7 @@ std::string GetHistoryFilePath() { return JoinPath(GetHistoryDir(), "History.ini
 
 bool EnsureHistoryDir(std::string& failed) {
   for (const std::string& path : {GetMakerDir(), GetHistoryDir()}) {
-    if (!EnsureFolder(path, FolderAccess::kShared) || IsSymbolicLink(path)) {
+    if (!EnsureFolder(path) || IsSymbolicLink(path)) {
       failed = path;
       return false;
     }
@@ -81,6 +81,6 @@ bool FileExists(const std::string& path) { return KindOfUnquoted(path) == FileKi
 
 bool DirExists(const std::string& path) { return KindOfUnquoted(path) == FileKind::kFolder; }
 
-bool EnsureFolder(const std::string& path, FolderAccess access) {
-  return DirExists(path) || CreateFolder(path, access) || DirExists(path);
+bool EnsureFolder(const std::string& path) {
+  return DirExists(path) || CreateFolder(path) || DirExists(path);
 }

@@ -8,9 +8,10 @@
 // itself. The name of a group, of a member or of a user without a domain that needs more than 128
 // bytes with its terminator is returned as an empty text.
 //
-// POSIX: a child process queries the name service once in a run, for at most ten seconds, and all
-// functions below use its result. After the ten seconds there are no groups, and no user if it was
-// not known by then. The server is ignored.
+// All of them together take at most ten seconds in a run. After that the user is unknown if it was
+// not known by then, and nothing is listed. POSIX: a child process queries the name service once,
+// and all functions below use its result: a list that was not complete by then is empty. The server
+// is ignored.
 
 // The user that runs the tool, as domain, backslash, name; nothing if the system does not know.
 // Windows: GetUserNameExA, at most 1024 bytes. POSIX: getpwuid of the effective user, with the host

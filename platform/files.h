@@ -26,18 +26,10 @@ bool IsSymbolicLink(const std::string& path);
 // POSIX: stat (device and inode).
 bool IsSameFile(const std::string& first, const std::string& second);
 
-enum class FolderAccess {
-  kInherited,  // what the parent folder prescribes
-  // On Windows, whatever the parent prescribes: administrators and the system have full access,
-  // and so has a user to what he made; all users may read, and create files and folders. On POSIX
-  // as kInherited.
-  kShared,
-};
-
 // Makes one folder; its parent must exist. False if anything of that name exists.
-// Windows: CreateDirectoryA, for kInherited with default security. POSIX: mkdir with
-// mode 0777.
-bool CreateFolder(const std::string& path, FolderAccess access = FolderAccess::kInherited);
+// Windows: CreateDirectoryA with default security, which the parent folder prescribes. POSIX: mkdir
+// with mode 0777.
+bool CreateFolder(const std::string& path);
 
 // Moves a folder with its contents in one step. False, with nothing moved, if anything of the
 // target's name exists (an empty folder too), or the source is not a folder or is a link to one.
@@ -57,6 +49,6 @@ bool MoveFolder(const std::string& source, const std::string& target);
 // The source is opened with the rights of the owner of the file "trusted", where they are less than
 // those of this process: whoever can write a path into the trusted file cannot have a file copied
 // that he may not read. POSIX: setfsuid, setfsgid and setgroups, if the process is root's. Windows:
-// not possible; the access list of FolderAccess::kShared protects the trusted file instead.
+// not done; there the access list that the trusted file inherits must keep others from writing it.
 bool CopyToNewFile(const std::string& source, const std::string& target,
                    const std::string& trusted);

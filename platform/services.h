@@ -22,10 +22,10 @@ struct ServiceListing {
 
 // The services in the system's order.
 // Windows: OpenSCManagerA with access 0xF003F and EnumServicesStatusA for all Win32 services,
-// running or not. They answer from the machine itself, and the limit is not used.
+// running or not.
 // POSIX: ListUnits of systemd over the system bus, through libsystemd, looked up at run time. These
 // are the service units that systemd has in memory: all that run or have failed, and those stopped
 // ones that another unit refers to; a stopped unit that nothing refers to is missing. Units with
-// the load state "not-found" are left out. The whole takes at most the limit; after that, the error
-// is ETIMEDOUT.
+// the load state "not-found" are left out.
+// The whole takes at most the limit; after that, the error is ERROR_TIMEOUT (Windows) or ETIMEDOUT.
 ServiceListing ListServices(std::chrono::milliseconds limit);

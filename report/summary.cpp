@@ -6,6 +6,7 @@
 #include "app/install_history.h"
 #include "history/locations.h"
 #include "platform/files.h"
+#include "platform/output_stream.h"
 #include "platform/path.h"
 #include "report/collected_files.h"
 #include "report/copy_events.h"
@@ -17,7 +18,7 @@ void OpenBelowHistory(std::ofstream& stream, const std::string& name) {
   const std::string path = JoinPath(GetHistoryDir(), name);
   // Opening a pipe would wait for its reader.
   if (!LeadsElsewhere(name) && KindOf(path) != FileKind::kOther) {
-    stream.open(path, std::ios::out | std::ios::trunc);
+    OpenStream(stream, path, std::ios::out);
   }
 }
 

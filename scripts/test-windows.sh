@@ -35,7 +35,7 @@ trap 'wineserver --kill || true' EXIT  # it may have ended by itself
 
 # The unit tests once more, without the runs of the program, which ctest does.
 run_unit_tests() {
-  for tests in orx_tests orx_platform_tests; do
+  for tests in orx_tests orx_reader_tests orx_platform_tests; do
     scripts/wine.sh "build/windows/tests/$tests.exe" --gtest_brief=1 --gtest_filter=-Run.*
   done
 }

@@ -35,7 +35,7 @@ bool IsSameFile(const std::string& first, const std::string& second) {
          a.st_dev == b.st_dev && a.st_ino == b.st_ino;
 }
 
-bool CreateFolder(const std::string& path, FolderAccess /*access*/) {
+bool CreateFolder(const std::string& path) {
   return RetryOnInterrupt([&] { return ::mkdir(path.c_str(), 0777); }) == 0;
 }
 

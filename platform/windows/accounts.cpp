@@ -2,6 +2,7 @@
 
 #define SECURITY_WIN32
 #include "platform/windows/system_library.h"
+#include "platform/windows/time_limit.h"
 // These two need windows.h.
 #include <lm.h>
 #include <security.h>
@@ -9,7 +10,8 @@
 namespace {
 
 // Neither library is one that Windows takes from the system folder for every program, so both are
-// looked up at run time. Each is loaded once in a run.
+// looked up at run time. Each is loaded once in a run and never unloaded, as an abandoned call can
+// still run in it.
 struct NetworkLibrary {
   SystemLibrary File = SystemLibrary("netapi32.dll");
   decltype(&::NetApiBufferFree) FreeBuffer = File.Find<decltype(FreeBuffer)>("NetApiBufferFree");
@@ -29,8 +31,14 @@ struct NetworkLibrary {
 };
 
 const NetworkLibrary& NetCalls() {
-  static const NetworkLibrary library;
+  static const NetworkLibrary& library = *new NetworkLibrary;
   return library;
+}
+
+// The calls wait for other processes, some for a domain controller.
+TimeLimit& LimitOfRun() {
+  static TimeLimit limit(std::chrono::seconds(10));
+  return limit;
 }
 
 struct NetBufferFreer {
@@ -64,9 +72,8 @@ struct NetList {
   DWORD_PTR Resume = 0;
 };
 
-// The names in what the call lists; empty if it returns false.
 template <typename Entry, typename Call>
-std::vector<std::string> ListNames(LPWSTR Entry::*name, Call call) {
+std::vector<std::string> ReadNames(LPWSTR Entry::*name, const Call& call) {
   std::vector<std::string> names;
   if (!NetCalls().IsComplete()) {
     return names;
@@ -84,12 +91,19 @@ std::vector<std::string> ListNames(LPWSTR Entry::*name, Call call) {
   return names;
 }
 
-}  // namespace
+// The names in what the call lists; empty if it returns false or does not return in time. It must
+// own what it uses.
+template <typename Entry, typename Call>
+std::vector<std::string> ListNames(LPWSTR Entry::*name, const Call& call) {
+  return LimitOfRun()
+      .Call([name, call] { return ReadNames(name, call); })
+      .value_or(std::vector<std::string>());
+}
 
-std::optional<std::string> DomainUserName() {
+std::optional<std::string> ReadDomainUserName() {
   char name[1025] = {};
   ULONG size = sizeof name;
-  static const SystemLibrary library("secur32.dll");
+  static const SystemLibrary& library = *new SystemLibrary("secur32.dll");
   const auto getUserName = library.Find<decltype(&::GetUserNameExA)>("GetUserNameExA");
   if (getUserName == nullptr || getUserName(NameSamCompatible, name, &size) == FALSE) {
     return std::nullopt;
@@ -97,7 +111,7 @@ std::optional<std::string> DomainUserName() {
   return name;
 }
 
-std::optional<std::string> WorkstationUserName() {
+std::optional<std::string> ReadWorkstationUserName() {
   if (!NetCalls().IsComplete()) {
     return std::nullopt;
   }
@@ -110,8 +124,18 @@ std::optional<std::string> WorkstationUserName() {
   return WideToNarrow(reinterpret_cast<const WKSTA_USER_INFO_1*>(buffer)->wkui1_username);
 }
 
+}  // namespace
+
+std::optional<std::string> DomainUserName() {
+  return LimitOfRun().Call(&ReadDomainUserName).value_or(std::nullopt);
+}
+
+std::optional<std::string> WorkstationUserName() {
+  return LimitOfRun().Call(&ReadWorkstationUserName).value_or(std::nullopt);
+}
+
 std::vector<std::string> ListLocalGroups(const std::string& server) {
-  return ListNames(&LOCALGROUP_INFO_1::lgrpi1_name, [&server](NetList& list) {
+  return ListNames(&LOCALGROUP_INFO_1::lgrpi1_name, [server](NetList& list) {
     return NetCalls().ListLocal(NarrowToWide(server).c_str(), /*level=*/1, &list.Buffer,
                                 MAX_PREFERRED_LENGTH, &list.Count, &list.Total,
                                 &list.Resume) == NERR_Success;
@@ -120,16 +144,17 @@ std::vector<std::string> ListLocalGroups(const std::string& server) {
 
 std::vector<std::string> ListLocalGroupMembers(const std::string& server,
                                                const std::string& group) {
-  return ListNames(&LOCALGROUP_MEMBERS_INFO_2::lgrmi2_domainandname, [&](NetList& list) {
-    NetCalls().ListLocalMembers(NarrowToWide(server).c_str(), NarrowToWide(group).c_str(),
-                                /*level=*/2, &list.Buffer, MAX_PREFERRED_LENGTH, &list.Count,
-                                &list.Total, &list.Resume);
-    return true;  // what could be read counts, whatever the status says
-  });
+  return ListNames(
+      &LOCALGROUP_MEMBERS_INFO_2::lgrmi2_domainandname, [server, group](NetList& list) {
+        NetCalls().ListLocalMembers(NarrowToWide(server).c_str(), NarrowToWide(group).c_str(),
+                                    /*level=*/2, &list.Buffer, MAX_PREFERRED_LENGTH, &list.Count,
+                                    &list.Total, &list.Resume);
+        return true;  // what could be read counts, whatever the status says
+      });
 }
 
 std::vector<std::string> ListGlobalGroups(const std::string& server) {
-  return ListNames(&GROUP_INFO_2::grpi2_name, [&server](NetList& list) {
+  return ListNames(&GROUP_INFO_2::grpi2_name, [server](NetList& list) {
     return NetCalls().ListGlobal(NarrowToWide(server).c_str(), /*level=*/2, &list.Buffer,
                                  MAX_PREFERRED_LENGTH, &list.Count, &list.Total,
                                  &list.Resume) == NERR_Success;
@@ -138,7 +163,7 @@ std::vector<std::string> ListGlobalGroups(const std::string& server) {
 
 std::vector<std::string> ListGlobalGroupMembers(const std::string& server,
                                                 const std::string& group) {
-  return ListNames(&GROUP_USERS_INFO_0::grui0_name, [&](NetList& list) {
+  return ListNames(&GROUP_USERS_INFO_0::grui0_name, [server, group](NetList& list) {
     NetCalls().ListGlobalMembers(NarrowToWide(server).c_str(), NarrowToWide(group).c_str(),
                                  /*level=*/0, &list.Buffer, MAX_PREFERRED_LENGTH, &list.Count,
                                  &list.Total, &list.Resume);

@@ -5,8 +5,6 @@
 #include "platform/files.h"
 #include "platform/windows/patience.h"
 
-static HANDLE AsHandle(intptr_t number) { return reinterpret_cast<HANDLE>(number); }
-
 ExclusiveFile::ExclusiveFile(const std::string& path) {
   if (IsSymbolicLink(path)) {
     return;

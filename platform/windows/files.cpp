@@ -4,7 +4,6 @@
 #include <cstdint>
 
 #include "platform/temporary_file.h"
-#include "platform/windows/access_list.h"
 #include "platform/windows/file_entry.h"
 #include "platform/windows/file_replacement.h"
 #include "platform/windows/patience.h"
@@ -49,17 +48,8 @@ bool IsSameFile(const std::string& first, const std::string& second) {
          a->nFileIndexHigh == b->nFileIndexHigh && a->nFileIndexLow == b->nFileIndexLow;
 }
 
-bool CreateFolder(const std::string& path, FolderAccess access) {
-  if (access == FolderAccess::kInherited) {
-    return ::CreateDirectoryA(path.c_str(), /*lpSecurityAttributes=*/nullptr) != FALSE;
-  }
-  // Full access for the system (SY), administrators (BA) and the creator (CO); for users (BU)
-  // reading, and creating in every folder. The parent's list is not inherited: whoever made the
-  // parent may have opened it to everybody.
-  AccessList list(
-      "D:P(A;OICI;FA;;;SY)(A;OICI;FA;;;BA)(A;OICIIO;FA;;;CO)"
-      "(A;OICI;0x1200a9;;;BU)(A;CI;0x116;;;BU)");
-  return ::CreateDirectoryA(path.c_str(), list.Get()) != FALSE;
+bool CreateFolder(const std::string& path) {
+  return ::CreateDirectoryA(path.c_str(), /*lpSecurityAttributes=*/nullptr) != FALSE;
 }
 
 static bool IsNameTaken(const std::string& path) {

@@ -5,7 +5,8 @@
 #include <cstdio>
 
 #include "platform/path.h"
-#include "platform/windows/access_list.h"
+// It needs windows.h.
+#include <sddl.h>
 
 // A name of an object may have no backslash and at most 260 characters, so it has a hash (FNV-1a)
 // of the folder's path.
@@ -29,10 +30,18 @@ static std::string MutexName(const std::string& folder) {
 }
 
 UniqueHandle OpenFolderMutex(const std::string& folder) {
-  constexpr DWORD access = SYNCHRONIZE | MUTEX_MODIFY_STATE;
-  AccessList everyoneMayUse("D:(A;;0x100001;;;WD)");
-  return UniqueHandle(
-      ::CreateMutexExA(everyoneMayUse.Get(), MutexName(folder).c_str(), /*dwFlags=*/0, access));
+  constexpr DWORD access = SYNCHRONIZE | MUTEX_MODIFY_STATE;  // 0x100001
+  SECURITY_ATTRIBUTES security = {sizeof security, /*lpSecurityDescriptor=*/nullptr,
+                                  /*bInheritHandle=*/FALSE};
+  // Everybody (WD) may use it, whoever made it. If this fails, it has default security.
+  ::ConvertStringSecurityDescriptorToSecurityDescriptorA("D:(A;;0x100001;;;WD)", SDDL_REVISION_1,
+                                                         &security.lpSecurityDescriptor,
+                                                         /*SecurityDescriptorSize=*/nullptr);
+  UniqueHandle mutex(::CreateMutexExA(
+      security.lpSecurityDescriptor == nullptr ? nullptr : &security, MutexName(folder).c_str(),
+      /*dwFlags=*/0, access));
+  ::LocalFree(security.lpSecurityDescriptor);
+  return mutex;
 }
 
 FolderLock::FolderLock(const std::string& folder, std::chrono::nanoseconds& timeLeft)

@@ -5,8 +5,6 @@
 #include "platform/windows/file_entry.h"
 #include "platform/windows/system.h"
 
-static HANDLE HandleOf(intptr_t handle) { return reinterpret_cast<HANDLE>(handle); }
-
 NewFile::NewFile(const std::string& path) : Path(path) {
   UniqueHandle file = OwnIfValid(::CreateFileA(path.c_str(), GENERIC_WRITE, /*dwShareMode=*/0,
                                                /*lpSecurityAttributes=*/nullptr, CREATE_NEW,
@@ -18,18 +16,18 @@ NewFile::NewFile(const std::string& path) : Path(path) {
 
 NewFile::~NewFile() {
   if (IsOpen()) {
-    ::CloseHandle(HandleOf(Handle));
+    ::CloseHandle(AsHandle(Handle));
     RemoveFile(Path);
   }
 }
 
-bool NewFile::IsOpen() const { return HandleOf(Handle) != INVALID_HANDLE_VALUE; }
+bool NewFile::IsOpen() const { return AsHandle(Handle) != INVALID_HANDLE_VALUE; }
 
 bool NewFile::Write(std::string_view bytes) {
   while (IsOpen() && !bytes.empty()) {
     constexpr size_t most = 1 << 30;  // in one call
     DWORD count = 0;
-    if (::WriteFile(HandleOf(Handle), bytes.data(),
+    if (::WriteFile(AsHandle(Handle), bytes.data(),
                     static_cast<DWORD>(std::min(bytes.size(), most)), &count,
                     /*lpOverlapped=*/nullptr) == FALSE ||
         count == 0) {
@@ -44,7 +42,7 @@ bool NewFile::Finish() {
   if (!IsOpen()) {
     return false;
   }
-  const HANDLE file = HandleOf(Handle);
+  const HANDLE file = AsHandle(Handle);
   Handle = -1;
   return ::CloseHandle(file) != FALSE;
 }

@@ -1,6 +1,7 @@
 #include "platform/services.h"
 
 #include "platform/windows/system.h"
+#include "platform/windows/time_limit.h"
 
 namespace {
 
@@ -10,9 +11,7 @@ struct ServiceCloser {
 };
 using UniqueService = std::unique_ptr<SC_HANDLE, ServiceCloser>;
 
-}  // namespace
-
-ServiceListing ListServices(std::chrono::milliseconds /*limit*/) {
+ServiceListing ReadServices() {
   constexpr DWORD fullAccess = 0xF003F;
   const UniqueService manager(
       ::OpenSCManagerA(/*lpMachineName=*/nullptr, /*lpDatabaseName=*/nullptr, fullAccess));
@@ -36,4 +35,10 @@ ServiceListing ListServices(std::chrono::milliseconds /*limit*/) {
                                services[i].ServiceStatus.dwCurrentState});
   }
   return listing;
+}
+
+}  // namespace
+
+ServiceListing ListServices(std::chrono::milliseconds limit) {
+  return TimeLimit(limit).Call(&ReadServices).value_or(ServiceListing{ERROR_TIMEOUT, {}});
 }

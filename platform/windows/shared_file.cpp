@@ -5,8 +5,6 @@
 #include "platform/files.h"
 #include "platform/windows/system.h"
 
-static HANDLE HandleOf(intptr_t handle) { return reinterpret_cast<HANDLE>(handle); }
-
 SharedFile::SharedFile(const std::string& path, LinkPolicy links) {
   if (links == LinkPolicy::kRefuse && IsSymbolicLink(path)) {
     return;
@@ -25,11 +23,11 @@ SharedFile::SharedFile(const std::string& path, LinkPolicy links) {
 
 SharedFile::~SharedFile() {
   if (IsOpen()) {
-    ::CloseHandle(HandleOf(Handle));
+    ::CloseHandle(AsHandle(Handle));
   }
 }
 
-bool SharedFile::IsOpen() const { return HandleOf(Handle) != INVALID_HANDLE_VALUE; }
+bool SharedFile::IsOpen() const { return AsHandle(Handle) != INVALID_HANDLE_VALUE; }
 
 size_t SharedFile::ReadAt(uint64_t offset, char* buffer, size_t size) const {
   size_t done = 0;
@@ -39,7 +37,7 @@ size_t SharedFile::ReadAt(uint64_t offset, char* buffer, size_t size) const {
     position.Offset = static_cast<DWORD>(offset + done);
     position.OffsetHigh = static_cast<DWORD>((offset + done) >> 32);
     DWORD count = 0;
-    if (::ReadFile(HandleOf(Handle), buffer + done, static_cast<DWORD>(std::min(size - done, most)),
+    if (::ReadFile(AsHandle(Handle), buffer + done, static_cast<DWORD>(std::min(size - done, most)),
                    &count, &position) == FALSE ||
         count == 0) {
       break;

@@ -9,6 +9,7 @@
 #endif
 #include <windows.h>
 
+#include <cstdint>
 #include <memory>
 
 struct HandleCloser {
@@ -20,6 +21,9 @@ using UniqueHandle = std::unique_ptr<void, HandleCloser>;
 inline UniqueHandle OwnIfValid(HANDLE handle) {
   return UniqueHandle(handle == INVALID_HANDLE_VALUE ? nullptr : handle);
 }
+
+// A handle as the platform-neutral headers keep it.
+inline HANDLE AsHandle(intptr_t number) { return reinterpret_cast<HANDLE>(number); }
 
 struct SearchCloser {
   void operator()(HANDLE search) const { ::FindClose(search); }

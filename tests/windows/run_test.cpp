@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <thread>
 
+#include "app/install_history.h"
 #include "history/locations.h"
 #include "platform/profile_file.h"
 #include "tests/platform/contract.h"
@@ -77,6 +78,15 @@ TEST_F(Run, CountsWhileAProgramOpensTheHistoryFileAgainAndAgain) {
   viewer.request_stop();
   viewer.join();
   EXPECT_EQ(ReadProfileInt(GetHistoryFilePath(), "History", "Count", 0), starts);
+}
+
+TEST_F(Run, WaitsForASummaryThatIsHeld) {
+  EXPECT_EQ(Call("-start 1"), 0);
+  const std::string summary = InHistory("Summary.txt");
+  WriteFileText(summary, "old");
+  const Holder holder([&] { return OpenExisting(summary, GENERIC_READ, FILE_SHARE_READ); }, 100ms);
+  CInstallHistory().WriteSummary();
+  EXPECT_NE(FileText(summary), "old");
 }
 
 // Under Wine this needs WINEDLLOVERRIDES, as in CMakeLists.txt: else its own libraries come first.

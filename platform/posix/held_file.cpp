@@ -1,3 +1,0 @@
-#include "platform/held_file.h"
-
-void WaitWhileHeld(const std::string& /*path*/) {}
