@@ -18,9 +18,9 @@ std::string GetHistoryDir();
 // The history file, History.ini in the history folder.
 std::string GetHistoryFilePath();
 
-// Creates the maker's folder and the history folder unless they exist. False if one of them does not
-// exist afterwards, or is a link, which any user could have created before the first run; its path
-// is then stored in "failed".
+// Creates the maker's folder and the history folder unless they exist. False if one of them does
+// not exist afterwards, or is a link, which any user could have created before the first run; its
+// path is then stored in "failed".
 bool EnsureHistoryDir(std::string& failed);
 
 // True if the history folder exists and neither it nor the maker's folder is a link.
