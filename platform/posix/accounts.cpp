@@ -9,6 +9,7 @@
 #include <unordered_set>
 
 #include "platform/posix/child_output.h"
+#include "platform/posix/descriptor.h"
 #include "platform/posix/host_name.h"
 #include "platform/posix/text_file.h"
 
@@ -35,7 +36,7 @@ using UsersByNumber = std::unordered_map<gid_t, std::vector<std::string>>;
 UsersByNumber ReadUsersByPrimaryGroup() {
   UsersByNumber users;
   ::setpwent();
-  while (const passwd* user = ::getpwent()) {
+  while (const passwd* user = RetryOnInterrupt(::getpwent)) {
     users[user->pw_gid].emplace_back(user->pw_name);
   }
   ::endpwent();
@@ -46,14 +47,14 @@ UsersByNumber ReadUsersByPrimaryGroup() {
 // to groups times groups, and users times groups.
 void AskNameService(const Descriptor& output) {
   std::string records;
-  if (const passwd* user = ::getpwuid(::geteuid())) {
+  if (const passwd* user = RetryOnInterrupt([] { return ::getpwuid(::geteuid()); })) {
     AppendRecord(records, 'u', user->pw_name);
   }
   WriteAll(output, records);
   records.clear();
   const UsersByNumber users = ReadUsersByPrimaryGroup();
   ::setgrent();
-  while (const group* entry = ::getgrent()) {
+  while (const group* entry = RetryOnInterrupt(::getgrent)) {
     AppendRecord(records, 'g', entry->gr_name);
     for (char** member = entry->gr_mem; *member != nullptr; ++member) {
       AppendRecord(records, 'm', *member);

@@ -39,12 +39,15 @@ inline bool HasFailed(const void* result) { return result == nullptr; }
 inline bool HasFailed(ssize_t result) { return result == -1; }
 
 // Repeats a system call as long as a signal interrupts it: on a network or user-space file system
-// that can be any call with a path or descriptor.
+// that can be any call with a path or descriptor. Sets errno to zero before each call: a null
+// pointer can also mean the end of a list or an unknown name, and then leaves errno as it was.
 template <typename Call>
 auto RetryOnInterrupt(Call call) {
-  auto result = call();
-  while (HasFailed(result) && errno == EINTR) {
-    result = call();
+  for (;;) {
+    errno = 0;
+    const auto result = call();
+    if (!HasFailed(result) || errno != EINTR) {
+      return result;
+    }
   }
-  return result;
 }

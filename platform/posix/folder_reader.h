@@ -24,10 +24,7 @@ class FolderReader {
     if (!IsOpen()) {
       return nullptr;
     }
-    const dirent* entry = RetryOnInterrupt([this] {
-      errno = 0;  // at the end of the folder readdir returns null and does not change errno
-      return ::readdir(Folder.get());
-    });
+    const dirent* entry = RetryOnInterrupt([this] { return ::readdir(Folder.get()); });
     return entry == nullptr ? nullptr : entry->d_name;
   }
 

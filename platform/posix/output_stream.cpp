@@ -1,10 +1,10 @@
 #include "platform/output_stream.h"
 
-#include <cerrno>
+#include "platform/posix/descriptor.h"
 
 void OpenStream(std::ofstream& stream, const std::string& path, std::ios_base::openmode mode) {
-  do {
-    errno = 0;  // a failure need not set it
+  RetryOnInterrupt([&] {
     stream.open(path, mode);
-  } while (!stream.is_open() && errno == EINTR);
+    return stream.is_open() ? 0 : -1;
+  });
 }

@@ -15,7 +15,7 @@
 
 // Runs in a child process.
 static void WriteGroups(uid_t user, const Descriptor& output) {
-  const passwd* entry = ::getpwuid(user);
+  const passwd* entry = RetryOnInterrupt([user] { return ::getpwuid(user); });
   if (entry == nullptr) {
     return;
   }

@@ -5,6 +5,7 @@ import os
 import stat
 import time
 
+import history
 from harness import attack
 from history import check
 
@@ -36,6 +37,14 @@ def refused_by_the_file_system(machine, call, error, mode):
     machine.must("-start", "8", before=injecting(call, f"error={error}"))
     check(machine.sections()["History"]["Count"] == "2", "not recorded")
     check(stat.S_IMODE(machine.ini.stat().st_mode) == mode, "permissions")
+
+
+@attack(*((name, name) for name in ("Summary.txt", "C1/Summary.txt")))
+def interrupted_opening_of(machine, name):
+    machine.record("7")
+    machine.must("-report", str(machine.archive), before=(
+        *injecting("openat", "error=EINTR:when=1+2"), "-P", machine.history / name))
+    check(history.read_archive(machine.archive).get(name), "no summary")
 
 
 @attack()

@@ -2,13 +2,15 @@
 
 import contextlib
 import os
+import re
 import resource
 import shutil
 import subprocess
 import time
 from pathlib import Path
 
-from harness import Skipped, attack
+import history
+from harness import NOBODY, Skipped, as_nobody, attack
 from history import check
 
 HEADER = "Windows Registry Editor Version 5.00\n\n"
@@ -70,6 +72,55 @@ def process_name_with_control_characters(machine):
     check(b"\x1b" not in report and b"\n4) Services\x1b" not in report, "forged")
 
 
+def with_functions(machine, source):
+    """The variables of a run in which these functions replace those of the C library."""
+    library = machine.scratch / "functions.so"
+    subprocess.run(["gcc", "-shared", "-fPIC", "-xc", "-", "-o", library], check=True,
+                   input=source.encode())
+    return {"LD_PRELOAD": str(library)}
+
+
+# Every other call is interrupted, from the first one on; each list has one entry.
+INTERRUPTED_NAME_SERVICE = """
+#include <errno.h>
+#include <grp.h>
+#include <pwd.h>
+#include <stddef.h>
+static char* members[] = {"bo", NULL};
+static struct group staff = {.gr_name = "staff", .gr_gid = 100, .gr_mem = members};
+static struct passwd ana = {.pw_name = "ana", .pw_gid = 100};
+static void* answer(int call, void* entry) {
+  if (call % 2 == 0) errno = EINTR;
+  return call == 1 ? entry : NULL;
+}
+struct passwd* getpwuid(uid_t user) { static int call; return answer(call++, &ana); }
+struct passwd* getpwent(void) { static int call; return answer(call++, &ana); }
+struct group* getgrent(void) { static int call; return answer(call++, &staff); }
+"""
+
+
+@attack()
+def interrupted_name_service(machine):
+    report = report_of(machine, variables=with_functions(machine, INTERRUPTED_NAME_SERVICE))
+    check(re.search(rb"Logged on User:\S+\\ana\n", report), "the user is not named")
+    rows = re.findall(rb"(?m)^staff(?: +\S+\\(\w+))?$", report)
+    check(rows == [b"", b"bo", b"ana"], f"rows of the group: {rows}")
+
+
+@attack(needs_root=True)
+def interrupted_name_service_for_an_owners_groups(machine):
+    """Root collects for the owner of a history what one of his groups may read."""
+    os.chown(machine.history, NOBODY, NOBODY)
+    os.chown(machine.source, 0, 100)
+    machine.source.chmod(0o640)
+    machine.watch()
+    machine.must("-start", "7", "-l", str(machine.source), preexec_fn=as_nobody)
+    machine.must("-end", "7", preexec_fn=as_nobody)
+    machine.must("-report", str(machine.archive),
+                 variables=with_functions(machine, INTERRUPTED_NAME_SERVICE))
+    check("7/setup.log" in history.read_archive(machine.archive), "not collected")
+
+
 SILENT_NAME_SERVICE = """
 #include <unistd.h>
 struct passwd;
@@ -80,11 +131,9 @@ struct passwd* getpwent(void) { for (;;) pause(); }
 @attack()
 def silent_name_service(machine):
     """It costs its rows and at most ten seconds."""
-    library = machine.scratch / "silent.so"
-    subprocess.run(["gcc", "-shared", "-fPIC", "-xc", "-", "-o", library], check=True,
-                   input=SILENT_NAME_SERVICE.encode())
+    variables = with_functions(machine, SILENT_NAME_SERVICE)
     began = time.monotonic()
-    report = report_of(machine, variables={"LD_PRELOAD": str(library)})
+    report = report_of(machine, variables=variables)
     seconds = time.monotonic() - began
     check(seconds < 12, f"{seconds:.0f} s")
     check(b"6) ORX ODBC Driver Info:" in report, "the rest of the snapshot is missing")
