@@ -32,12 +32,12 @@ void PrintHelp() {
       PrintHelpLine(option.Word, option.Value, option.Help);
     }
   }
-  PrintHelpLine("-report", "ARCHIVE", "alone: packs the whole history into a zip archive");
-  PrintHelpLine("-help", "", "alone: this text");
-  PrintHelpLine("--version", "", "alone: name and version");
+  PrintHelpLine("-report", "ARCHIVE", "packs the history into a zip archive; no other argument");
+  PrintHelpLine("-help", "", "this text; no other argument");
+  PrintHelpLine("--version", "", "name and version; no other argument");
   std::cout
-      << "\nOptions, each with one value, and the operations that use it. Case does not count;\n"
-         "of two the last counts; unknown words are skipped:\n";
+      << "\nOptions, each with one value, and the operations that use them. Case does not count;\n"
+         "of a repeated option the last value counts; unknown words are skipped:\n";
   for (const Option& option : Options()) {
     if (option.Field != &CInstallEvent::EventID) {
       PrintHelpLine(option.Word, option.Value, option.Help);
