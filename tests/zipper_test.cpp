@@ -109,6 +109,13 @@ TEST_F(Zipper, AddsToAnArchiveReplacesItAndCloses) {
   const std::time_t now = std::time(nullptr);
   EXPECT_EQ(static_cast<int>(entry.Date >> 25) + 80, std::gmtime(&now)->tm_year);
 
+  const std::string link = Scratch.In("link.zip");
+  std::error_code error;
+  fs::create_symlink(Archive, link, error);  // not possible everywhere
+  for (const bool append : {false, true}) {
+    EXPECT_TRUE(error || !zipper.Open(link.c_str(), Root.c_str(), append));
+  }
+
   EXPECT_TRUE(zipper.Open(Archive.c_str()));  // its root is the archive's folder
   EXPECT_TRUE(zipper.AddFile(Scratch.Native("Tree/a.txt")) && zipper.Close());
   EXPECT_EQ(ArchiveTree(Archive), "Tree/a.txt\n");

@@ -81,6 +81,14 @@ class Machine(contextlib.ExitStack):
     def environment(self, **variables):
         return {**os.environ, "ORX_COMMON_APPDATA": str(self.root), **variables}
 
+    def with_functions(self, source):
+        """The variables of a run in which these functions, in C, replace those of the system's
+        library."""
+        library = self.scratch / "functions.so"
+        subprocess.run(["gcc", "-shared", "-fPIC", "-xc", "-", "-o", library], check=True,
+                       input=source.encode())
+        return {"LD_PRELOAD": str(library)}
+
     def start(self, *words, before=(), **options):
         """A run in the background, killed at the end of the attack."""
         process = subprocess.Popen(self.command(words, before), env=self.environment(), cwd="/",

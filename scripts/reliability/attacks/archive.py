@@ -174,6 +174,36 @@ def archive_on_a_full_disk(machine, room):
     check_older_stays(machine)
 
 
+# Before a temporary file is opened again to write to it or to flush it, somebody replaces it by a
+# link.
+SWAP = """
+#include <linux/fcntl.h>
+#include <stdlib.h>
+#include <string.h>
+#include <sys/syscall.h>
+#include <unistd.h>
+int open(const char* path, int flags, int mode) {
+  const char* beginning = getenv("TEMPORARY");
+  if (strncmp(path, beginning, strlen(beginning)) == 0 && !(flags & O_CREAT)) {
+    unlink(path);
+    symlink(getenv("OUTSIDE"), path);
+  }
+  return syscall(SYS_openat, AT_FDCWD, path, flags, mode);
+}
+"""
+
+
+@attack(("a collected copy", "root/ZEK/ORXHistory/C1/7/.", 0), ("the archive", "archives/.", 3))
+def link_in_place_of_the_temporary_file_of(machine, beginning, result):
+    machine.record("7")
+    machine.archive.write_bytes(OLDER)
+    machine.must("-report", str(machine.archive), result=result, variables={
+        **machine.with_functions(SWAP), "TEMPORARY": f"{machine.scratch}/{beginning}",
+        "OUTSIDE": str(machine.outside / "file")})
+    links = [path for path in machine.scratch.rglob("[!.]*") if path.is_symlink()]
+    check(not links, f"renamed: {links}")
+
+
 def slowed(call, microseconds):
     """Words before a run that make each such call of it take that time before it begins."""
     return ("strace", "-f", "-qq", "-o", "/dev/null", "-e", f"trace={call}",

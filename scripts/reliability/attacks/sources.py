@@ -72,14 +72,6 @@ def process_name_with_control_characters(machine):
     check(b"\x1b" not in report and b"\n4) Services\x1b" not in report, "forged")
 
 
-def with_functions(machine, source):
-    """The variables of a run in which these functions replace those of the C library."""
-    library = machine.scratch / "functions.so"
-    subprocess.run(["gcc", "-shared", "-fPIC", "-xc", "-", "-o", library], check=True,
-                   input=source.encode())
-    return {"LD_PRELOAD": str(library)}
-
-
 # Every other call is interrupted, from the first one on; each list has one entry.
 INTERRUPTED_NAME_SERVICE = """
 #include <errno.h>
@@ -101,7 +93,7 @@ struct group* getgrent(void) { static int call; return answer(call++, &staff); }
 
 @attack()
 def interrupted_name_service(machine):
-    report = report_of(machine, variables=with_functions(machine, INTERRUPTED_NAME_SERVICE))
+    report = report_of(machine, variables=machine.with_functions(INTERRUPTED_NAME_SERVICE))
     check(re.search(rb"Logged on User:\S+\\ana\n", report), "the user is not named")
     rows = re.findall(rb"(?m)^staff(?: +\S+\\(\w+))?$", report)
     check(rows == [b"", b"bo", b"ana"], f"rows of the group: {rows}")
@@ -117,7 +109,7 @@ def interrupted_name_service_for_an_owners_groups(machine):
     machine.must("-start", "7", "-l", str(machine.source), preexec_fn=as_nobody)
     machine.must("-end", "7", preexec_fn=as_nobody)
     machine.must("-report", str(machine.archive),
-                 variables=with_functions(machine, INTERRUPTED_NAME_SERVICE))
+                 variables=machine.with_functions(INTERRUPTED_NAME_SERVICE))
     check("7/setup.log" in history.read_archive(machine.archive), "not collected")
 
 
@@ -131,7 +123,7 @@ struct passwd* getpwent(void) { for (;;) pause(); }
 @attack()
 def silent_name_service(machine):
     """It costs its rows and at most ten seconds."""
-    variables = with_functions(machine, SILENT_NAME_SERVICE)
+    variables = machine.with_functions(SILENT_NAME_SERVICE)
     began = time.monotonic()
     report = report_of(machine, variables=variables)
     seconds = time.monotonic() - began
