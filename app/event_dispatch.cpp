@@ -56,7 +56,7 @@ void CInstallEvent::OpenEventLog() const {
 
 void CInstallEvent::RecordStart() {
   const ProfileGuard guard(Ini.Path);
-  const auto guardOfRun = std::move(StartGuard);  // ends here too: a snapshot can take seconds
+  const auto guardOfRun = std::move(StartGuard);  // released here too, before the snapshot
   SetStartTime(GetTimestamp());
   SetEndTime("");
   SetProduct(Product);
@@ -65,7 +65,7 @@ void CInstallEvent::RecordStart() {
   SetType(Type);
   SetPath(Path);
   SetAction(Action);
-  SetCopyName("(Unknown)");  // the copy counts from the end on
+  SetCopyName("(Unknown)");  // only "-end" names the copy
   SetCompleteFlag("FALSE");
   SetLogFileName(LogFile);
   SetTraceFile(TraceFile);

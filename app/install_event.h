@@ -29,8 +29,8 @@ class CInstallEvent {
   // nothing. (report/collected_files.cpp)
   void CollectFiles();
 
-  // The keys of the event's section, read from the file by each call: at most 255 bytes, empty if
-  // there is no such key. (history/event_keys.cpp)
+  // The values of the event's section, read from the file by each call: at most 255 bytes, empty if
+  // there is no such key or the file cannot be read. (history/event_keys.cpp)
   std::string GetLogFileName() const;
   std::string GetTraceFile() const;
   std::string GetResponseFile() const;
@@ -50,7 +50,7 @@ class CInstallEvent {
   std::string GetServiceLevel() const;
   std::string GetProduct() const;
 
-  // Write a key of any length. The fields below do not change.
+  // Write a value of any length, as CIniFile::WriteString does. The fields below do not change.
   void SetLogFileName(const std::string& value);
   void SetTraceFile(const std::string& value);
   void SetResponseFile(const std::string& value);

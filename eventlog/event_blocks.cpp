@@ -19,7 +19,7 @@ void CInstallEvent::WriteStartBlock() const {
 }
 
 void CInstallEvent::WriteMessageBlock() const {
-  // Runs of one event may overlap: the line and its end go out together, one run after another.
+  // Runs of one event may overlap: under the lock, and written in one piece, no line is split.
   const ProfileGuard guard(Ini.Path);
   CLogger::GetInstance() << Message + '\n' << std::flush;
 }

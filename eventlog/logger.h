@@ -14,7 +14,8 @@ class CLogger : public std::ofstream {
  public:
   static CLogger& GetInstance();
 
-  // Closes the file that is open and opens the named one, as OpenStream does.
+  // Closes the file that is open and opens the named one through OpenStream
+  // (platform/output_stream.h): std::ios::out empties it, std::ios::app writes at its end.
   void Open(const std::string& fileName, std::ios_base::openmode mode);
 
   // Does nothing if no file is open.

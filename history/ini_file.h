@@ -23,7 +23,8 @@ class CIniFile {
   // Creates the file, section and key if they do not exist. Always returns 0, even on failure.
   int WriteString(const std::string& section, const std::string& key, const std::string& value);
 
-  // The number that the value begins with; 0 if it begins with none, the fallback if it is empty.
+  // The number that the value begins with, in one of the forms that ReadProfileInt lists; 0 if it
+  // begins with none, the fallback if it is empty.
   int32_t ReadInt(const std::string& section, const std::string& key, int32_t fallback) const;
 
   // The same as WriteString with the number in decimal, but returns false on failure.

@@ -33,7 +33,7 @@ bool HistoryDirExists() {
          !IsSymbolicLink(GetHistoryDir());
 }
 
-// Windows drops blanks and points from the end of a part: ".. " leads up too.
+// Windows drops blanks and dots from the end of a part: ".. " leads up too.
 static bool LeadsUp(std::string_view part) {
   return std::count(part.begin(), part.end(), '.') >= 2 &&
          part.find_first_not_of(". ") == std::string_view::npos;

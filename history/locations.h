@@ -6,7 +6,8 @@
 
 // The paths of the history. None is cached: each call computes it again.
 
-// The common application data folder of the machine, as GetFolderPath returns it.
+// The common application data folder of the machine, as GetFolderPath (platform/known_folders.h)
+// returns it; "C:\Documents and Settings\All Users\Application Data" if the system knows none.
 std::string GetCommonAppDataPath();
 
 // The maker's folder, ZEK in the common application data folder.

@@ -2,5 +2,6 @@
 
 #include <string>
 
-// The current local time in the form "20261124 21:05:07": always 17 characters, no zone.
+// The current local time in the form "20261124 21:05:07": 17 characters, without a time
+// zone. By time and localtime.
 std::string GetTimestamp();

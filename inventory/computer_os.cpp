@@ -128,7 +128,7 @@ void CComputerInfo::AddServerEdition(const SystemVersion& version) {
   const bool isDatacenter = (version.SuiteMask & suiteDatacenter) != 0;
   const bool isEnterprise = (version.SuiteMask & suiteEnterprise) != 0;
   if (version.MajorVersion == 5 && version.MinorVersion == 2) {
-    // For the web edition the whole mask counts, not its bit.
+    // For the web edition the mask must have this bit and no other.
     OSName += isDatacenter                      ? " Datacenter Edition "
               : isEnterprise                    ? " Enterprise Edition "
               : version.SuiteMask == suiteBlade ? " Web Edition "

@@ -16,7 +16,7 @@ struct CProcessInfo {
   uint32_t ProcessID = 0;  // the system's number of the process
 };
 
-// False on Windows 95, 98 and Me, true on any other system.
+// False if the version is that of Windows 95, 98 or Me; true if it is another or not known.
 bool IsWindowsNTFamily();
 
 // The running processes that the user may look at, without this one and process 0, in the system's

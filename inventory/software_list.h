@@ -20,7 +20,7 @@ struct CProductInfo {
   std::string InstallDate;  // usually year, month and day: "20200131"
   std::string InstallLocation;
   std::string Publisher;
-  int32_t Language = 0;  // the number of a locale; 0 if it is missing or no number
+  int32_t Language = 0;  // the number of a locale, limited to 32 bits; 0 if there is none
 };
 
 // The software installed for all users of the machine, in the registry's order.

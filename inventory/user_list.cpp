@@ -59,7 +59,7 @@ void CUsersList::CollectGlobalMembers() {
   }
 }
 
-// Without the last rule: its length differs.
+// The caller writes the last rule, as its length differs.
 static void PrintGroups(const char* title, const std::vector<std::string>& groups) {
   CLogger& log = CLogger::GetInstance();
   const std::string rule(35, '-');

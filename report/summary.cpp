@@ -70,8 +70,8 @@ void WriteCopy(std::ostream& overall, const CCopyEvents& copy) {
   OpenCopySummary(own, copy.Name);
   WriteCopyHead(overall, copy, "Count of Events      :");
   WriteCopyHead(own, copy, "Count of Events:");
-  // A run that is killed after it copied files and before it set their keys leaves keys that no
-  // later run corrects: those of at most so many events.
+  // A run that is killed between the copying of files and the writing of their keys leaves keys
+  // that no later run corrects. This limits them to those of so many events.
   constexpr size_t most = 64;
   std::vector<CInstallEvent> events = copy.Events;
   for (size_t begin = 0; begin < events.size(); begin += most) {

@@ -12,7 +12,7 @@ std::string TrimTail(const std::string& text);
 // The text without the white space at its start and then without the separators there.
 std::string TrimHead(const std::string& text);
 
-// The path with the extension of its last part replaced; both include the point.
+// The path with the extension of its last part replaced; both include the dot.
 std::string ReplaceExtension(const std::string& path, const std::string& extension);
 
 // The path without the folder that it begins with; nothing if it begins otherwise. The case of

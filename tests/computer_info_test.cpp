@@ -10,8 +10,8 @@
 
 namespace {
 
-// The machine that a line of the golden table has in its first columns. A registry text in place of
-// the product type goes with a system that knows the short version alone.
+// The machine that the first columns of a line of the golden table describe. A registry text
+// instead of the product type is for a system that knows only the short version.
 void SetMachine(const std::string& line) {
   Machine() = FakeMachine();
   SystemVersion version;

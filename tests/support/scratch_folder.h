@@ -4,7 +4,7 @@
 
 #include "tests/support/file_text.h"
 
-// An empty folder, removed with the object. Paths are given with slashes, whatever the platform's
+// An empty folder, removed with the object. Paths are written with slashes, whatever the platform's
 // separator.
 class ScratchFolder {
  public:
@@ -16,7 +16,7 @@ class ScratchFolder {
   std::string In(const std::string& path) const;
 
   // Makes a file with this text, or a folder if the path ends in a slash, and the parent folders.
-  // Returns the whole path.
+  // Returns the full path.
   std::string Make(const std::string& path, const std::string& text) const;
 
   // The same, with the path as the text.

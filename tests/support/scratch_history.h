@@ -13,5 +13,5 @@ class ScratchHistory : public ScratchFolder {
   ScratchHistory& operator=(const ScratchHistory&) = delete;
 };
 
-// A path, given with slashes, below the history folder.
+// The full path of one below the history folder, which is written with slashes.
 std::string InHistory(const std::string& path);
