@@ -2,7 +2,7 @@
 
 #include "reader/archive_names.h"
 #include "reader/archive_stream.h"
-#include "reader/source.h"
+#include "reader/limits.h"
 
 namespace {
 

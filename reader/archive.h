@@ -36,7 +36,7 @@ class Archive {
   Archive(const Archive&) = delete;
   Archive& operator=(const Archive&) = delete;
 
-  // In the order of the directory, at most kMostFiles with kMostBytesOfNames (reader/source.h).
+  // In the order of the directory, at most kMostFiles with kMostBytesOfNames (reader/limits.h).
   const std::vector<ArchiveEntry>& Entries() const { return AllEntries; }
 
   // What was left out of the entries and why, a sentence each.

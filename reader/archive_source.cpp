@@ -21,7 +21,7 @@ class ArchiveSource : public Source {
 
 ArchiveSource::ArchiveSource(std::unique_ptr<Archive> archive) : Zip(std::move(archive)) {
   for (const std::string& complaint : Zip->Complaints()) {
-    Findings.push_back({FindingLevel::kError, "damaged", "", complaint});
+    Findings.Add({FindingLevel::kError, "damaged", "", complaint});
   }
   std::unordered_set<std::string_view> seen;
   size_t refused = 0;
@@ -38,10 +38,10 @@ ArchiveSource::ArchiveSource(std::unique_ptr<Archive> archive) : Zip(std::move(a
     }
   }
   if (refused > 0) {
-    Findings.push_back({FindingLevel::kWarning, "damaged", "",
-                        "Entries left out, as their names lead out of the archive's folder, are no "
-                        "names, or are there twice: " +
-                            std::to_string(refused) + "."});
+    Findings.Add({FindingLevel::kWarning, "damaged", "",
+                  "Entries left out, as their names lead out of the archive's folder, are no "
+                  "names, or are there twice: " +
+                      std::to_string(refused) + "."});
   }
 }
 

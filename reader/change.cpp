@@ -6,6 +6,8 @@
 #include <tuple>
 #include <unordered_map>
 
+#include "reader/limits.h"
+
 namespace {
 
 using Items = std::vector<Item>;
@@ -131,13 +133,17 @@ class Comparison {
 
 class ChangeWriter {
  public:
-  ChangeWriter(const TextDecoder& decoder, std::vector<Change>& list)
-      : Decoder(decoder), List(list) {}
+  ChangeWriter(const TextDecoder& decoder, ChangeDetail detail, Changes& changes)
+      : Decoder(decoder), Detail(detail), Result(changes) {}
 
   // One of the two items may be null.
   void Write(ChangeKind kind, const Item* before, const Item* after) {
     const Item& item = before != nullptr ? *before : *after;
-    Change& change = List.emplace_back();
+    Result.Differs[static_cast<size_t>(item.Where)] = true;
+    if (Detail == ChangeDetail::kCounts || Result.Bytes >= kMostBytesOfEvent) {
+      return;
+    }
+    Change& change = Result.List.emplace_back();
     change.Kind = kind;
     change.Where = item.Where;
     for (size_t i = 0; i < item.PathSize; ++i) {
@@ -151,9 +157,22 @@ class ChangeWriter {
         change.Fields.push_back({FieldNames(item.Where)[i], old, now});
       }
     }
+    Result.Bytes += BytesOf(change);
   }
 
  private:
+  static size_t BytesOf(const Change& change) {
+    size_t bytes = sizeof change + change.Name.capacity();
+    for (const std::string& part : change.Path) {
+      bytes += sizeof part + part.capacity();
+    }
+    for (const FieldChange& field : change.Fields) {
+      bytes += sizeof field + (field.Before ? field.Before->size() : 0) +
+               (field.After ? field.After->size() : 0);
+    }
+    return bytes;
+  }
+
   std::optional<std::string> Value(const Item* item, size_t field) const {
     if (item == nullptr) {
       return std::nullopt;
@@ -163,7 +182,8 @@ class ChangeWriter {
   }
 
   const TextDecoder& Decoder;
-  std::vector<Change>& List;
+  ChangeDetail Detail;
+  Changes& Result;
 };
 
 void ComparePart(const Items& before, const Items& after, const TextDecoder& decoder,
@@ -172,10 +192,7 @@ void ComparePart(const Items& before, const Items& after, const TextDecoder& dec
   changes.Counts.Added += comparison.Added.size();
   changes.Counts.Removed += comparison.Removed.size();
   changes.Counts.Changed += comparison.Changed.size();
-  if (detail == ChangeDetail::kCounts) {
-    return;
-  }
-  ChangeWriter writer(decoder, changes.List);
+  ChangeWriter writer(decoder, detail, changes);
   for (const auto& [old, now] : comparison.Changed) {
     writer.Write(ChangeKind::kChanged, &before[old], &after[now]);
   }

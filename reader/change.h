@@ -39,14 +39,17 @@ struct ChangeCounts {
 // What differs between two snapshots.
 struct Changes {
   std::vector<Change> List;  // by section, then in the order of the report: before, then after
-  ChangeCounts Counts;
+  size_t Bytes = 0;          // of memory that the list takes
+  ChangeCounts Counts;       // of all changes, also of those that are not in the list
   std::array<bool, kSectionCount> Compared = {};  // false where a snapshot is not whole
+  std::array<bool, kSectionCount> Differs = {};   // true for a section with a change
 };
 
 enum class ChangeDetail { kCounts, kList };
 
 // Compares the parts that are whole in both snapshots. Processes are compared by the number of each
 // name. If several items have one identity, those that are equal in all fields belong together
-// first, and the others in the order of the report. With kCounts the list stays empty.
+// first, and the others in the order of the report. The list stays empty with kCounts, and ends
+// after kMostBytesOfEvent (reader/limits.h).
 Changes CompareSnapshots(const Snapshot& before, const Snapshot& after, const TextDecoder& decoder,
                          ChangeDetail detail);

@@ -87,13 +87,10 @@ std::string MessagesText(const Event& event) {
 std::string FilesText(const Event& event) {
   std::string text;
   for (const EventFile& file : event.Files) {
-    const bool isShown = !file.Name.empty();
-    if (isShown) {
-      text += "  " + Printable(file.Name) +
-              (file.IsPresent ? "  " + std::to_string(file.Size) + " bytes"
-                              : "  not in the history: " + Printable(file.Path)) +
-              "\n";
-    }
+    text += "  " + Printable(file.Name) +
+            (file.IsPresent ? "  " + std::to_string(file.Size) + " bytes"
+                            : "  not in the history: " + Printable(file.Path)) +
+            "\n";
   }
   return text.empty() ? "" : "files\n" + text;
 }

@@ -1,5 +1,6 @@
 #include "reader/check.h"
 
+#include <algorithm>
 #include <string>
 #include <unordered_set>
 #include <utility>
@@ -13,7 +14,7 @@ class Checker {
  public:
   explicit Checker(const History& history) : Checked(history) {}
 
-  std::vector<Finding> Check() {
+  FindingList Check() {
     CheckHistoryFile();
     for (const Event& event : Checked.Events) {
       if (event.Origin == EventOrigin::kSection) {
@@ -29,7 +30,7 @@ class Checker {
 
  private:
   void Add(FindingLevel level, const char* code, const std::string& event, std::string text) {
-    Findings.push_back({level, code, event, std::move(text)});
+    Findings.Add({level, code, event, std::move(text)});
   }
 
   void CheckHistoryFile() {
@@ -89,7 +90,15 @@ class Checker {
     } else if (event.Report && !event.IsReportWhole) {
       Add(FindingLevel::kWarning, "damaged", event.Identity,
           "the report " + *event.Report + " breaks off or cannot be read");
+    } else if (event.HasBefore && event.HasAfter && !IsCompared(event)) {
+      Add(FindingLevel::kWarning, "damaged", event.Identity,
+          "the report " + *event.Report + " has a list that cannot be compared");
     }
+  }
+
+  static bool IsCompared(const Event& event) {
+    const auto& compared = event.Differences.Compared;
+    return std::find(compared.begin(), compared.end(), false) == compared.end();
   }
 
   // Before the first report of a history no file has been collected.
@@ -118,13 +127,13 @@ class Checker {
   }
 
   const History& Checked;
-  std::unordered_set<std::string> Sections;  // identities
-  std::vector<Finding> Findings;
+  std::unordered_set<std::string_view> Sections;  // identities
+  FindingList Findings;
 };
 
 }  // namespace
 
-std::vector<Finding> CheckHistory(const History& history) { return Checker(history).Check(); }
+FindingList CheckHistory(const History& history) { return Checker(history).Check(); }
 
 std::string_view LevelName(FindingLevel level) {
   switch (level) {

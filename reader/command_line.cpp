@@ -84,7 +84,7 @@ void PrintError(const std::string& text) {
 // What is wrong with the call as a whole; empty for one that is right.
 std::string WhatIsWrong(const CLI::App& app, const CommandLine& line) {
   if (app.get_subcommands().empty()) {
-    return "There is no command, such as list";
+    return "Name a command, such as list";
   }
   const bool takesOne = line.What == Command::kPage || line.What == Command::kUnpack;
   if (takesOne && line.From.size() > 1) {

@@ -31,9 +31,11 @@ int Fail(const std::string& text) {
 }
 
 // What the source found when it was read comes first.
-std::vector<Finding> FindingsOf(const History& history, const Source& source) {
-  std::vector<Finding> findings = CheckHistory(history);
-  findings.insert(findings.begin(), source.Findings.begin(), source.Findings.end());
+FindingList FindingsOf(const History& history, const Source& source) {
+  FindingList findings = source.Findings;
+  for (const Finding& finding : CheckHistory(history)) {
+    findings.Add(finding);
+  }
   return findings;
 }
 
@@ -65,6 +67,8 @@ class Session {
   bool IsListed(const Event& event) const;
   void PrintJson(const std::string& object) const { std::cout << object << '\n'; }
   void PrintSourceTitle(const History& history) const;
+  void PrintHit(const History& history, const Event& event, const Hit& hit) const;
+  bool WritePageFile(const History& history, const FindingList& findings) const;
 
   const CommandLine& Line;
   const TextDecoder& Decoder;
@@ -93,7 +97,7 @@ int Session::ForEachHistory(Detail detail, const std::optional<std::string>& ide
     if (Line.What != Command::kCheck && HasError(*source)) {
       const std::string text = "Not all of " + source->Name + " can be read: ";
       if (history.Events.empty()) {
-        result = Fail(text + source->Findings.front().Text);
+        result = Fail(text + source->Findings.begin()->Text);
         continue;
       }
       Fail(text + "orxhistory check says what is missing.");
@@ -163,35 +167,34 @@ int Session::ShowEvent() {
 
 int Session::Find() {
   bool isFound = false;
-  const auto print = [&](const History& history, const Event& event) {
-    for (const Hit& hit : FindInEvent(event, Argument)) {
-      isFound = true;
-      if (Line.IsJson) {
-        PrintJson(HitJson(history.Source, event, hit.Kind, hit.Name, hit.Text));
-        continue;
-      }
-      const auto time = event.Started ? event.Started : event.Ended;
-      const std::string source = Line.From.size() > 1 ? history.Source + "  " : "";
-      std::cout << Printable(source + event.Identity + "  " + (time ? TextOfTime(*time) : "-") +
-                             "  " + (hit.Kind == "fact" ? hit.Name : std::string(hit.Kind)) + ": " +
-                             hit.Text)
-                << '\n';
-    }
-  };
   const int result =
       ForEachHistory(Detail::kAll, std::nullopt, [&](const History& history, const Source&) {
         for (const Event& event : history.Events) {
-          print(history, event);
+          ForEachHit(event, Argument, [&](const Hit& hit) {
+            isFound = true;
+            PrintHit(history, event, hit);
+          });
         }
       });
   return result != kDone ? result : isFound ? kDone : kFound;
 }
 
+void Session::PrintHit(const History& history, const Event& event, const Hit& hit) const {
+  if (Line.IsJson) {
+    PrintJson(HitJson(history.Source, event, hit.Kind, hit.Name, hit.Text));
+    return;
+  }
+  const auto time = event.Started ? event.Started : event.Ended;
+  std::cout << Printable(Line.From.size() > 1 ? history.Source + "  " : "")
+            << Printable(event.Identity) << "  " << (time ? TextOfTime(*time) : "-") << "  "
+            << (hit.Kind == "fact" ? hit.Name : hit.Kind) << ": " << Printable(hit.Text) << '\n';
+}
+
 int Session::Check() {
   bool isClean = true;
-  const int result = ForEachHistory(
-      Detail::kCounts, std::nullopt, [&](const History& history, const Source& source) {
-        const std::vector<Finding> findings = FindingsOf(history, source);
+  const int result =
+      ForEachHistory(Detail::kAll, std::nullopt, [&](const History& history, const Source& source) {
+        const FindingList findings = FindingsOf(history, source);
         for (const Finding& finding : findings) {
           isClean = isClean && finding.Level == FindingLevel::kNote;
           if (Line.IsJson) {
@@ -206,27 +209,30 @@ int Session::Check() {
   return result != kDone ? result : isClean ? kDone : kFound;
 }
 
-// An older page of that name is replaced, but nothing that a history is read from.
 int Session::Page() {
-  std::string page;
+  bool isWritten = true;
   const int result =
       ForEachHistory(Detail::kAll, std::nullopt, [&](const History& history, const Source& source) {
-        page = RenderPage(history, FindingsOf(history, source));
+        isWritten = WritePageFile(history, FindingsOf(history, source));
       });
-  if (result != kDone) {
-    return result;
-  }
+  return result == kDone && !isWritten ? kFailed : result;
+}
+
+// An older page of that name is replaced, but nothing that a history is read from.
+bool Session::WritePageFile(const History& history, const FindingList& findings) const {
   if (!Line.From.empty() && IsSameFile(Line.Argument, Line.From.front())) {
-    return Fail("The page would replace the history; name another file.");
+    Fail("The page would replace the history; name another file.");
+    return false;
   }
   TemporaryFile file(Line.Argument);
   std::ofstream stream(file.Path(), std::ios::binary);
-  stream << page;
+  WritePage(history, findings, stream);
   stream.close();
   if (!file.Exists() || !stream || !file.Replace()) {
-    return Fail(Argument + " cannot be written; name a file in a folder that you may write to.");
+    Fail(Argument + " cannot be written; name a file in a folder that you may write to.");
+    return false;
   }
-  return kDone;
+  return true;
 }
 
 int Unpack(const CommandLine& line) {

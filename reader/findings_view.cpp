@@ -9,7 +9,7 @@ static Colour ColourOf(FindingLevel level) {
                                            : Colour::kPlain;
 }
 
-std::string FindingsText(const std::vector<Finding>& findings, const ViewOptions& options) {
+std::string FindingsText(const FindingList& findings, const ViewOptions& options) {
   size_t codeWidth = 0;
   size_t eventWidth = 0;
   for (const Finding& finding : findings) {

@@ -210,9 +210,7 @@ std::vector<Category> CategoriesOf(const Changes& changes) {
   for (size_t i = 0; i < kSectionCount; ++i) {
     Category& category = all[static_cast<size_t>(CategoryOf(static_cast<Section>(i)))];
     category.IsCompared = category.IsCompared && changes.Compared[i];
-  }
-  for (const Change& change : changes.List) {
-    all[static_cast<size_t>(CategoryOf(change.Where))].HasChanges = true;
+    category.HasChanges = category.HasChanges || changes.Differs[i];
   }
   std::vector<Category> categories;
   for (size_t i = 0; i < kSectionCount; ++i) {

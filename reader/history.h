@@ -76,13 +76,12 @@ struct History {
 };
 
 enum class Detail {
-  kFacts,   // no report is read
-  kCounts,  // with the computer and the number of changes
+  kCounts,  // the facts and the number of changes
   kAll,     // with messages and changes
 };
 
 // Reads the events of a history; with an identity (UTF-8) those of this one only, which reads no
-// report of another event. What cannot be read is left out and in the source's findings. Reports
-// are read one after another; no event keeps the text of one.
+// report of another event. What cannot be read or is beyond a limit (reader/limits.h) is left out
+// and in the source's findings. Reports are read one after another; no event keeps the text of one.
 History ReadHistory(Source& source, const TextDecoder& decoder, Detail detail,
                     const std::optional<std::string>& identity = std::nullopt);

@@ -1,9 +1,10 @@
 #pragma once
 
+#include <cstddef>
 #include <optional>
 #include <string>
 #include <string_view>
-#include <unordered_map>
+#include <vector>
 
 #include "reader/source.h"
 #include "reader/text_encoding.h"
@@ -23,16 +24,13 @@ class HistoryFiles {
   std::optional<size_t> FindNamed(std::string_view fullPath) const;
 
   // The path of Source::Files[file] as UTF-8.
-  std::string PathOf(size_t file) const;
+  const std::string& PathOf(size_t file) const { return Paths[file]; }
 
  private:
-  using Index = std::unordered_map<std::string, size_t>;
-  static std::optional<size_t> Look(const Index& index, const std::string& path);
-
-  const Source& From;
-  const TextDecoder& Decoder;
-  Index ByPath;
-  Index ByLoweredPath;  // of those that differ in case alone the first
+  std::vector<std::string> Paths;  // of the files of the source
+  std::vector<size_t> ByPath;      // files, sorted
+  std::vector<size_t>
+      ByLoweredPath;  // sorted without case; those that differ in it alone by number
 };
 
 // The part of a path of any system after its last separator.

@@ -1,7 +1,6 @@
 #include "reader/history_folder.h"
 
 #include <algorithm>
-#include <optional>
 #include <string_view>
 #include <tuple>
 
@@ -63,13 +62,13 @@ bool HasHiddenPart(std::string_view path) {
 
 }  // namespace
 
-bool KeepHistory(std::vector<SourceFile>& files, std::vector<Finding>& findings) {
+std::optional<std::string> KeepHistory(std::vector<SourceFile>& files, FindingList& findings) {
   std::optional<std::string_view> best = FolderWithHistoryFile(files);
   if (!best) {
     best = FolderWithReports(files);
   }
   if (!best) {
-    return false;
+    return std::nullopt;
   }
   const std::string folder(*best);
   const auto isBelow = [&](const SourceFile& file) { return file.Path.starts_with(folder); };
@@ -77,15 +76,15 @@ bool KeepHistory(std::vector<SourceFile>& files, std::vector<Finding>& findings)
     return !isBelow(file) && IsNamed(file.Path, "History.ini");
   });
   if (others > 0) {
-    findings.push_back({FindingLevel::kWarning, "damaged", "",
-                        "More than one history is here; the one in " +
-                            (folder.empty() ? "the top folder" : TextDecoder().ToUtf8(folder)) +
-                            " is read."});
+    findings.Add({FindingLevel::kWarning, "damaged", "",
+                  "More than one history is here; the one in " +
+                      (folder.empty() ? "the top folder" : TextDecoder().ToUtf8(folder)) +
+                      " is read."});
   }
   std::erase_if(files, [&](const SourceFile& file) { return !isBelow(file); });
   for (SourceFile& file : files) {
     file.Path.erase(0, folder.size());
   }
   std::erase_if(files, [](const SourceFile& file) { return HasHiddenPart(file.Path); });
-  return true;
+  return folder;
 }

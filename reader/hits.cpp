@@ -12,11 +12,11 @@ static bool Contains(std::string_view text, std::string_view wanted) {
          }) != text.end();
 }
 
-std::vector<Hit> FindInEvent(const Event& event, std::string_view text) {
-  std::vector<Hit> hits;
+void ForEachHit(const Event& event, std::string_view text,
+                const std::function<void(const Hit&)>& use) {
   const auto add = [&](std::string_view kind, std::string_view name, std::string_view content) {
     if (Contains(content, text)) {
-      hits.push_back({kind, std::string(name), std::string(content)});
+      use({kind, name, content});
     }
   };
   for (const Fact& fact : FactsOf(event)) {
@@ -29,5 +29,4 @@ std::vector<Hit> FindInEvent(const Event& event, std::string_view text) {
   for (const Change& change : event.Differences.List) {
     add("change", SectionName(change.Where), TextOfChange(change));
   }
-  return hits;
 }

@@ -10,7 +10,10 @@ namespace {
 using Json = nlohmann::ordered_json;
 
 // JSON may have the characters U+007F to U+009F as they are, but a terminal could obey them.
-std::string WithoutControls(const std::string& json) {
+std::string WithoutControls(std::string json) {
+  if (json.find_first_of("\x7F\xC2") == std::string::npos) {
+    return json;
+  }
   constexpr char digits[] = "0123456789abcdef";
   std::string result;
   result.reserve(json.size());
@@ -88,18 +91,24 @@ Json FilesOf(const Event& event) {
   return files;
 }
 
-Json MessagesOf(const Event& event) {
-  Json messages = Json::array();
-  ForEachMessage(event, [&messages](std::string_view message) { messages.push_back(message); });
-  return messages;
+// The elements of an array, each made into text at once: a JSON value takes several times the
+// memory of a short message.
+std::string MessageElements(const Event& event) {
+  std::string elements;
+  ForEachMessage(event, [&elements](std::string_view message) {
+    elements += (elements.empty() ? "" : ",") + Line(message);
+  });
+  return elements;
 }
 
-Json ChangesOf(const Event& event) {
-  Json changes = Json::array();
+std::string ChangeElements(const Event& event) {
+  std::string elements;
   for (const Change& change : event.Differences.List) {
-    AddChange(changes.emplace_back(Json::object()), change);
+    Json object = Json::object();
+    AddChange(object, change);
+    elements += (elements.empty() ? "" : ",") + Line(object);
   }
-  return changes;
+  return elements;
 }
 
 // The sections of which nothing can be said.
@@ -126,11 +135,12 @@ std::string EventDetailsJson(std::string_view source, const Event& event) {
   object["command_line"] = event.CommandLine;
   object["report"] = OrNull(event.Report);
   object["files"] = FilesOf(event);
-  object["messages"] = MessagesOf(event);
-  object["changes"] = ChangesOf(event);
-  object["not_compared"] = NotCompared(event);
-  object["source"] = source;
-  return Line(object);
+  const Json end = {{"not_compared", NotCompared(event)}, {"source", source}};
+  std::string line = Line(object);
+  line.pop_back();
+  line += ",\"messages\":[" + MessageElements(event) + "],\"changes\":[" + ChangeElements(event) +
+          "]," + Line(end).substr(1);
+  return line;
 }
 
 std::string ChangeJson(std::string_view source, const Event& event, const Change& change) {

@@ -3,6 +3,7 @@
 #include <string_view>
 
 #include "reader/event_text.h"
+#include "reader/limits.h"
 #include "reader/views.h"
 
 namespace {
@@ -43,7 +44,7 @@ Row RowOf(const Event& event) {
              std::string(StateName(event.State)),
              event.Action,
              event.Product,
-             event.Copy,
+             event.Copy.empty() || event.Copy == "(Unknown)" ? "-" : event.Copy,
              TextOfCounts(event),
              event.Identity};
   for (std::string& cell : row) {
@@ -132,7 +133,7 @@ std::string ListText(const std::vector<const Event*>& events, const ViewOptions&
   Widths widths = {};
   const auto widen = [&widths](const Row& row) {
     for (size_t i = 0; i < kColumns; ++i) {
-      widths[i] = std::max(widths[i], ColumnsOf(row[i]));
+      widths[i] = std::max(widths[i], std::min(ColumnsOf(row[i]), kWidestColumn));
     }
   };
   widen(kTitles);

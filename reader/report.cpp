@@ -2,13 +2,14 @@
 
 #include <algorithm>
 
+#include "reader/limits.h"
 #include "reader/report_blocks.h"
 #include "reader/report_run.h"
 
 // The start of each run, at most up to the one of the facts: a start at which the history file had
 // the time of that start already is a message.
-static std::vector<size_t> FindStarts(std::string_view text, Marks marks,
-                                      const ReportFacts& facts) {
+static std::vector<size_t> FindStarts(std::string_view text, Marks marks, const ReportFacts& facts,
+                                      bool& isCut) {
   std::vector<size_t> starts;
   std::optional<std::string_view> identity;
   for (size_t i = 0; i < marks.size(); ++i) {
@@ -24,12 +25,16 @@ static std::vector<size_t> FindStarts(std::string_view text, Marks marks,
       continue;
     }
     starts.push_back(i);
+    if (starts.size() > kMostStarts) {
+      break;
+    }
     if (!block || !facts.StartTime || block->Time >= *facts.StartTime) {
       return starts;
     }
     identity = block->Identity;
   }
   // No start matches the facts, so the further ones cannot be distinguished from messages.
+  isCut = starts.size() > kMostStarts;
   starts.erase(starts.begin() + std::min<ptrdiff_t>(1, std::ssize(starts)), starts.end());
   return starts;
 }
@@ -53,7 +58,8 @@ std::vector<ReportRun> ParseReport(std::string_view text, const ReportFacts& fac
   if (!known.StartTime) {
     known.StartTime = StartTimeOfEnd(text, marks);
   }
-  const std::vector<size_t> starts = FindStarts(text, marks, known);
+  bool isCut = false;
+  const std::vector<size_t> starts = FindStarts(text, marks, known, isCut);
   ReportFacts unknown;
   unknown.Identity = facts.Identity;
   std::vector<ReportRun> runs;
@@ -67,6 +73,9 @@ std::vector<ReportRun> ParseReport(std::string_view text, const ReportFacts& fac
     runs.push_back(ReadRun(text.substr(0, end), begin,
                            Marks(marks).subspan(firstMark, endMark - firstMark),
                            isLast ? known : unknown));
+  }
+  if (isCut || marks.size() >= kMostMarks) {
+    runs.back().IsWhole = false;
   }
   return runs;
 }

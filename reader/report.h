@@ -43,7 +43,7 @@ struct ReportRun {
   std::optional<Snapshot> After;
   std::optional<ResultBlock> Result;
   std::vector<std::string_view> Messages;  // pieces of the text, each of whole lines
-  bool IsWhole = true;                     // false if a block breaks off
+  bool IsWhole = true;                     // false if a block breaks off or is beyond a limit
 };
 
 // What is known of the event from elsewhere. Raw bytes.
@@ -56,7 +56,9 @@ struct ReportFacts {
 };
 
 // The runs in the order of the report, at least one; the last one is that of the facts. A report
-// without a start block has one run, without Start.
+// without a start block has one run, without Start. Of one with more than kMostStarts starts
+// (reader/limits.h) only the first counts, and after kMostMarks lines that look like blocks all is
+// message; the last run is not whole then.
 std::vector<ReportRun> ParseReport(std::string_view text, const ReportFacts& facts);
 
 // Replaces every CR LF, as reports of Windows have them, by LF.

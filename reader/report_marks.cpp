@@ -5,6 +5,7 @@
 #include <optional>
 #include <string>
 
+#include "reader/limits.h"
 #include "reader/snapshot.h"
 
 namespace {
@@ -75,7 +76,7 @@ std::optional<Mark> MarkAt(std::string_view text, size_t offset) {
 
 std::vector<Mark> FindMarks(std::string_view text) {
   std::vector<Mark> marks;
-  for (size_t offset = 0; offset < text.size();) {
+  for (size_t offset = 0; offset < text.size() && marks.size() < kMostMarks;) {
     const std::optional<Mark> mark = MarkAt(text, offset);
     if (mark) {
       marks.push_back(*mark);

@@ -30,7 +30,8 @@ struct Mark {
   std::string_view Text;  // of a box: the text from the identity on
 };
 
-// In the order of the text. Takes time in proportion to its length.
+// In the order of the text, at most kMostMarks (reader/limits.h). Takes time in proportion to the
+// length of the text.
 std::vector<Mark> FindMarks(std::string_view text);
 
 // What a box of the second snapshot begins with, up to the identity.

@@ -4,13 +4,11 @@
 #include <functional>
 #include <string>
 
+#include "reader/limits.h"
 #include "reader/lines.h"
 #include "reader/row.h"
 
 namespace {
-
-// More rows than any machine has. They bound the memory that a hostile report costs.
-constexpr size_t mostItems = 50'000;
 
 constexpr std::string_view priorToV9 = "prior to V9";
 
@@ -61,7 +59,7 @@ class PartReader {
       } else if (Foreign == ForeignRow::kEnds) {
         return false;
       }
-      if (Items.size() > mostItems) {
+      if (Items.size() > kMostRows) {
         return false;
       }
     }

@@ -29,7 +29,7 @@ Padding PaddingOfPart(const Snapshot& snapshot, size_t part);
 size_t PartOf(Section section);
 
 // The items of a part in the order of the report, each process on its own. Nothing if the text is
-// not built as the recorder writes it.
+// not built as the recorder writes it or has more than kMostRows (reader/limits.h).
 std::optional<std::vector<Item>> ReadItems(std::string_view text, size_t part, Padding padding);
 
 // How many bytes at the start of the text are the lines of a part that breaks off there: up to the

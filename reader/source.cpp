@@ -5,22 +5,22 @@
 #include "platform/text_codec.h"
 #include "reader/text_encoding.h"
 
-static std::string MegabytesOf(uint64_t bytes) { return std::to_string(bytes >> 20) + " MB"; }
+static std::string MebibytesOf(uint64_t bytes) { return std::to_string(bytes >> 20) + " MiB"; }
 
 // Why the file exceeds a limit; empty if it does not.
-std::string Source::WhyNotRead(size_t file) const {
+std::string Source::WhyNotRead(size_t file, uint64_t most) const {
   const uint64_t size = Files[file].Size;
-  if (size > kMostBytesOfFile) {
-    return "has more than " + MegabytesOf(kMostBytesOfFile);
+  if (size > most) {
+    return "has more than " + MebibytesOf(most);
   }
   if (size > kMostBytesRead - BytesRead) {
-    return "is beyond the first " + MegabytesOf(kMostBytesRead) + " of what is read";
+    return "is beyond the first " + MebibytesOf(kMostBytesRead) + " of what is read";
   }
   return "";
 }
 
-std::optional<std::string> Source::Read(size_t file) {
-  std::string reason = WhyNotRead(file);
+std::optional<std::string> Source::Read(size_t file, uint64_t most) {
+  std::string reason = WhyNotRead(file, most);
   std::optional<std::string> bytes;
   if (reason.empty()) {
     bytes = ReadBytes(file, reason);
@@ -28,7 +28,7 @@ std::optional<std::string> Source::Read(size_t file) {
   }
   if (!bytes) {
     const std::string name = TextDecoder().ToUtf8(Files[file].Path);
-    Findings.push_back({FindingLevel::kError, "damaged", "", name + " " + reason + "."});
+    Findings.Add({FindingLevel::kError, "damaged", "", name + " " + reason + "."});
   }
   if (OnRead) {
     OnRead();

@@ -10,41 +10,37 @@
 
 #include "reader/archive.h"
 #include "reader/finding.h"
+#include "reader/limits.h"
 
 // The folder or archive that a history is read from. Nothing is written there and no lock is taken.
-// What exceeds these limits is left out, with a finding.
-
-inline constexpr uint64_t kMostBytesOfFile = 32 << 20;  // of one file that is read
-inline constexpr uint64_t kMostBytesRead = 1 << 30;     // of all files that are read
-inline constexpr size_t kMostFiles = 200'000;           // in a folder or an archive
-inline constexpr size_t kMostBytesOfName = 4096;        // of a path
-inline constexpr size_t kMostBytesOfNames = 32 << 20;   // of all paths
+// What exceeds the limits of reader/limits.h is left out, with a finding.
 
 struct SourceFile {
   std::string Path;   // below the folder of the history: raw bytes, parts joined by '/'
   uint64_t Size = 0;  // in bytes, as the folder or the archive says
-  size_t Entry = 0;   // for the source itself
+  size_t Entry = 0;   // its index in the archive
 };
 
 class Source {
  public:
   virtual ~Source() = default;
 
-  // The raw bytes of Files[file]; nothing, and a finding, if they cannot be read whole or are
-  // beyond a limit.
-  std::optional<std::string> Read(size_t file);
+  // The raw bytes of Files[file]; nothing, and a finding, if they cannot be read to their end, are
+  // more than the limit, or exceed kMostBytesRead with those that were read before.
+  std::optional<std::string> Read(size_t file, uint64_t most = kMostBytesOfFile);
 
   std::string Name;                   // as the user gave it, UTF-8
   std::vector<SourceFile> Files;      // regular files; no links, no names that begin with a dot
-  std::vector<Finding> Findings;      // what was left out or is damaged
+  FindingList Findings;               // what was left out or is damaged
   std::function<void()> OnRead = {};  // called after each read
 
  protected:
-  // A failure leaves its reason as the end of a sentence that begins with the name of the file.
+  // At most Files[file].Size bytes. A failure leaves its reason as the end of a sentence that
+  // begins with the name of the file.
   virtual std::optional<std::string> ReadBytes(size_t file, std::string& reason) = 0;
 
  private:
-  std::string WhyNotRead(size_t file) const;
+  std::string WhyNotRead(size_t file, uint64_t most) const;
 
   uint64_t BytesRead = 0;
 };

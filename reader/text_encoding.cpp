@@ -50,6 +50,23 @@ bool IsUtf8(std::string_view text) {
   return true;
 }
 
+std::string_view FirstBytes(std::string_view text, size_t most) {
+  if (text.size() <= most) {
+    return text;
+  }
+  constexpr size_t longest = 4;  // of a character
+  size_t end = most;
+  while (end > 0 && most - end < longest && (text[end] & 0xC0) == 0x80) {
+    --end;
+  }
+  return text.substr(0, end);
+}
+
+std::string Shortened(std::string_view text, size_t most) {
+  const std::string_view kept = FirstBytes(text, most);
+  return std::string(kept) + (kept.size() < text.size() ? "\u2026" : "");
+}
+
 static void AppendUtf8(std::string& text, char16_t character) {
   if (character < 0x80) {
     text += static_cast<char>(character);

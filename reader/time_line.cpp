@@ -1,6 +1,8 @@
 #include "reader/time_line.h"
 
 #include <algorithm>
+#include <string_view>
+#include <unordered_map>
 
 #include "reader/html.h"
 #include "reader/time_axis.h"
@@ -30,7 +32,7 @@ struct PlacedBar {
 };
 
 struct Lane {
-  std::string Name;
+  std::string_view Name;
   std::vector<PlacedBar> Bars;
   std::vector<int> RowEnds;  // where each row is free again
 
@@ -49,15 +51,15 @@ struct TimeScale {
 };
 
 // The first characters of UTF-8 text, with a sign that some are missing.
-std::string Shortened(const std::string& text, size_t most) {
+std::string ShortenedLabel(std::string_view text, size_t most) {
   size_t characters = 0;
   for (size_t i = 0; i < text.size(); ++i) {
     const bool isFirstByte = (static_cast<unsigned char>(text[i]) & 0xC0U) != 0x80;
     if (isFirstByte && ++characters > most) {
-      return text.substr(0, i) + "\xE2\x80\xA6";
+      return std::string(text.substr(0, i)) + "\xE2\x80\xA6";
     }
   }
-  return text;
+  return std::string(text);
 }
 
 int LabelWidth(const TimeLineBar& bar) {
@@ -89,19 +91,17 @@ void AddToLane(Lane& lane, const TimeLineBar& bar, const TimeScale& scale, bool 
 std::vector<Lane> LanesOf(const std::vector<TimeLineBar>& bars, const TimeScale& scale) {
   std::vector<const TimeLineBar*> order;
   std::vector<Lane> lanes;
+  std::unordered_map<std::string_view, size_t> numbers;  // of the lanes, by their names
   for (const TimeLineBar& bar : bars) {
     order.push_back(&bar);
-    const auto hasName = [&bar](const Lane& lane) { return lane.Name == bar.Lane; };
-    if (std::none_of(lanes.begin(), lanes.end(), hasName)) {
+    if (numbers.try_emplace(bar.Lane, lanes.size()).second) {
       lanes.push_back({bar.Lane, {}, {}});
     }
   }
   std::stable_sort(order.begin(), order.end(),
                    [](const TimeLineBar* a, const TimeLineBar* b) { return a->Begin < b->Begin; });
   for (const TimeLineBar* bar : order) {
-    const auto hasName = [bar](const Lane& lane) { return lane.Name == bar->Lane; };
-    AddToLane(*std::find_if(lanes.begin(), lanes.end(), hasName), *bar, scale,
-              bars.size() <= mostLabels);
+    AddToLane(lanes[numbers[bar->Lane]], *bar, scale, bars.size() <= mostLabels);
   }
   return lanes;
 }
@@ -132,50 +132,50 @@ std::string DrawAxis(const TimeScale& scale, int height) {
   return svg;
 }
 
-std::string DrawBar(const PlacedBar& placed, int laneTop, bool hasLabels) {
+void DrawBar(const PlacedBar& placed, int laneTop, bool hasLabels, std::ostream& out) {
   const TimeLineBar& bar = *placed.Bar;
   const int top = laneTop + lanePadding + placed.Row * rowHeight;
   const std::string title = EscapeHtml(bar.Title);
-  std::string svg = "<a class=\"bar " + bar.StateClass + "\" href=\"" + bar.Link +
-                    "\" aria-label=\"" + title + "\"><title>" + title + "</title><rect rx=\"3\"" +
-                    Attribute("x", placed.Left) + Attribute("y", top) +
-                    Attribute("width", placed.Width) + Attribute("height", barHeight) + "/>";
-  svg += Text(placed.Left + 5, top + barHeight - 5, "mark", bar.Mark);
+  out << "<a class=\"bar " << bar.StateClass << "\" href=\"" << bar.Link << "\" aria-label=\""
+      << title << "\"><title>" << title << "</title><rect rx=\"3\"" << Attribute("x", placed.Left)
+      << Attribute("y", top) << Attribute("width", placed.Width) << Attribute("height", barHeight)
+      << "/>" << Text(placed.Left + 5, top + barHeight - 5, "mark", bar.Mark);
   if (hasLabels) {
-    svg += Text(placed.Left + placed.Width + 4, top + barHeight - 5, "bar-label",
-                Shortened(bar.Label, longestLabel));
+    out << Text(placed.Left + placed.Width + 4, top + barHeight - 5, "bar-label",
+                ShortenedLabel(bar.Label, longestLabel));
   }
-  return svg + "</a>\n";
+  out << "</a>\n";
 }
 
-std::string DrawLane(const Lane& lane, int top, bool hasLabels) {
-  std::string svg =
-      "<rect class=\"lane\" x=\"0\"" + Attribute("y", top) + Attribute("width", width) +
-      Attribute("height", lane.Height() - 2) + "/>\n" +
-      Text(8, top + lanePadding + barHeight - 5, "lane-name", Shortened(lane.Name, longestLane)) +
-      '\n';
+void DrawLane(const Lane& lane, int top, bool hasLabels, std::ostream& out) {
+  out << "<rect class=\"lane\" x=\"0\"" << Attribute("y", top) << Attribute("width", width)
+      << Attribute("height", lane.Height() - 2) << "/>\n"
+      << Text(8, top + lanePadding + barHeight - 5, "lane-name",
+              ShortenedLabel(lane.Name, longestLane))
+      << '\n';
   for (const PlacedBar& bar : lane.Bars) {
-    svg += DrawBar(bar, top, hasLabels);
+    DrawBar(bar, top, hasLabels, out);
   }
-  return svg;
 }
 
 }  // namespace
 
-std::string DrawTimeLine(const std::vector<TimeLineBar>& bars) {
+void DrawTimeLine(const std::vector<TimeLineBar>& bars, std::ostream& out) {
   if (bars.empty()) {
-    return "";
+    return;
   }
   const TimeScale scale = ScaleOf(bars);
   const std::vector<Lane> lanes = LanesOf(bars, scale);
-  std::string content;
+  int height = axisHeight;
+  for (const Lane& lane : lanes) {
+    height += lane.Height();
+  }
+  out << "<svg viewBox=\"0 0 " << width << ' ' << height << '"' << Attribute("width", width)
+      << Attribute("height", height) << " role=\"group\" aria-label=\"Time line of the events\">\n";
   int top = axisHeight;
   for (const Lane& lane : lanes) {
-    content += DrawLane(lane, top, bars.size() <= mostLabels);
+    DrawLane(lane, top, bars.size() <= mostLabels, out);
     top += lane.Height();
   }
-  const std::string size = std::to_string(width) + ' ' + std::to_string(top);
-  return "<svg viewBox=\"0 0 " + size + "\"" + Attribute("width", width) +
-         Attribute("height", top) + " role=\"group\" aria-label=\"Time line of the events\">\n" +
-         content + DrawAxis(scale, top) + "</svg>\n";
+  out << DrawAxis(scale, height) << "</svg>\n";
 }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -17,7 +18,7 @@ struct TimeLineBar {
   LocalTime End = 0;  // not before Begin
 };
 
-// The bars over a common time axis, as an inline SVG element of 960 units width: a lane for each
-// Lane text in the order of first use, bars that would overlap one below the other. A short event
-// is drawn wide enough to be seen and hit. Empty for no bars.
-std::string DrawTimeLine(const std::vector<TimeLineBar>& bars);
+// Writes the bars over a common time axis, as an inline SVG element of 960 units width: a lane for
+// each Lane text in the order of first use, bars that would overlap one below the other. A short
+// event is drawn wide enough to be seen and hit. Nothing for no bars.
+void DrawTimeLine(const std::vector<TimeLineBar>& bars, std::ostream& out);

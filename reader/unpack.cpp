@@ -8,12 +8,11 @@
 #include "platform/path.h"
 #include "reader/archive.h"
 #include "reader/archive_names.h"
+#include "reader/limits.h"
 #include "reader/source.h"
 #include "reader/text_encoding.h"
 
 namespace {
-
-constexpr uint64_t kMostBytesUnpacked = uint64_t{16} << 30;
 
 // The path with this system's separators; empty if a part of it would be something else here.
 std::string NativePath(std::string_view path) {

@@ -10,8 +10,8 @@
 // The texts that the commands print, in UTF-8. They contain no character of the history that a
 // terminal could obey (Printable).
 
-// A line for each of the events, in columns as wide as their contents, or cut to the terminal's
-// width; then a line that counts them.
+// A line for each of the events, in columns as wide as their contents up to kWidestColumn
+// (reader/limits.h), or cut to the terminal's width; then a line that counts them.
 std::string ListText(const std::vector<const Event*>& events, const ViewOptions& options);
 
 // The facts, messages, files and changes of an event.
@@ -29,4 +29,4 @@ std::string MessagesText(const Event& event);
 std::string FilesText(const Event& event);
 
 // A line for each finding, and one that counts them.
-std::string FindingsText(const std::vector<Finding>& findings, const ViewOptions& options);
+std::string FindingsText(const FindingList& findings, const ViewOptions& options);

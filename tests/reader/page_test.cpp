@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <sstream>
+
 #include "reader/html.h"
 #include "reader/time_axis.h"
 #include "reader/time_line.h"
@@ -54,13 +56,14 @@ TEST(Page, BarsThatWouldOverlapShareALaneInRows) {
   later.Begin = later.End = 100000;
   TimeLineBar other = bar;
   other.Lane = "Test <2>";
-  const std::string svg = DrawTimeLine({bar, bar, later, other});
+  std::ostringstream drawn;
+  DrawTimeLine({bar, bar, later, other}, drawn);
+  const std::string svg = drawn.str();
   EXPECT_EQ(Count(svg, "class=\"lane\""), 2U);
   EXPECT_EQ(Count(svg, "class=\"bar ok\""), 4U);
   EXPECT_EQ(Count(svg, "y=\"32\" width=\"18\""), 2U) << svg;  // the first and the later one
   EXPECT_EQ(Count(svg, "y=\"54\" width=\"18\""), 1U) << svg;  // the second, below the first
   EXPECT_NE(svg.find("Test &lt;2&gt;"), svg.npos);
-  EXPECT_EQ(DrawTimeLine({}), "");
 }
 
 TEST(Page, KeepsEventsOfOneNameApartAndUnchangedFromNotKnown) {
@@ -69,13 +72,20 @@ TEST(Page, KeepsEventsOfOneNameApartAndUnchangedFromNotKnown) {
   for (Event& event : history.Events) {
     event.Identity = "<7>";
   }
+  history.Events[0].Messages = std::string(5000, 'm') + '\n';
   history.Events[0].HasBefore = history.Events[0].HasAfter = true;
   history.Events[0].Differences.Compared.fill(true);
-  const std::string page = RenderPage(history, {{FindingLevel::kNote, "damaged", "<7>", "cut"}});
+  FindingList findings;
+  findings.Add({FindingLevel::kNote, "damaged", "<7>", "cut"});
+  std::ostringstream written;
+  WritePage(history, findings, written);
+  const std::string page = written.str();
   EXPECT_EQ(Count(page, "<div id=\"event-1\">"), 1U);
   EXPECT_EQ(Count(page, "href=\"#event-2\""), 1U);
   EXPECT_EQ(Count(page, "Unchanged: user"), 1U);
   EXPECT_EQ(Count(page, "Not known, as a snapshot is missing or not whole: user"), 1U);
   EXPECT_EQ(Count(page, "event <bdi>&lt;7&gt;</bdi>: <bdi>cut</bdi>"), 1U);
   EXPECT_EQ(page.find("<7>"), page.npos);
+  EXPECT_EQ(Count(page, std::string(4000, 'm') + "\u2026"), 1U);
+  EXPECT_EQ(Count(page, std::string(4001, 'm')), 0U);
 }

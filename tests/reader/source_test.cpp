@@ -105,7 +105,7 @@ TEST(Source, LeavesOutWhatIsHostile) {
       {"too long", {{ini, "text", 0, 0, 8, -2}}, "History.ini=? ! History.ini is damaged."},
       {"too large",
        {{ini, "i", 0, 0, 0, 1 << 30}},
-       "History.ini=? ! History.ini has more than 32 MB."},
+       "History.ini=? ! History.ini has more than 16 MiB."},
       {"no history", {{"a", "x"}}, "error: holds no history; name an archive that the report made"},
       {"nothing", {}, "error: is an empty archive; name one that holds a history"},
   };
@@ -137,13 +137,14 @@ TEST(Source, ChecksTheBytesOfAFile) {
 }
 
 TEST(Source, ReadsNoMoreThanTheLimit) {
-  std::vector<BuiltEntry> entries(40, {"", "x", 0, 0, 0, 31 << 20});
+  std::vector<BuiltEntry> entries(80, {"", "x", 0, 0, 0, 15 << 20});
   for (size_t i = 0; i < entries.size(); ++i) {
     entries[i].Name = i == 0 ? ini : std::to_string(i);
   }
   const std::string content = ContentOf(BuildArchive(entries));
-  EXPECT_NE(content.find("! 32 is damaged. ! 33 is beyond the first 1024 MB of what is read. ! 34"),
-            std::string::npos)
+  EXPECT_NE(
+      content.find("! 67 is damaged. ! 68 is beyond the first 1024 MiB of what is read. ! 69"),
+      std::string::npos)
       << content;
 }
 
