@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <fstream>
 #include <iostream>
 #include <iterator>
 #include <regex>
@@ -12,7 +13,9 @@
 #include "app/install_history.h"
 #include "app/options.h"
 #include "app/usage.h"
+#include "eventlog/logger.h"
 #include "history/locations.h"
+#include "tests/support/fake_machine.h"
 #include "tests/support/run_tool.h"
 #include "tests/support/scratch_history.h"
 
@@ -55,8 +58,9 @@ TEST(InstallEvent, HelpsWithItsUsageAndTheOptionsThatItTakes) {
   const std::string text = testing::internal::GetCapturedStdout();
   EXPECT_TRUE(text.starts_with(Golden("usage.txt") + '|' + Golden("usage.txt") + "\n")) << text;
   for (const auto& [word, field, value, help] : Options()) {
-    EXPECT_NE(text.find("\n  " + std::string(word) + ' ' + std::string(value) + ' '), text.npos)
-        << word;
+    std::string call = std::string(word) + ' ' + std::string(value);
+    call.resize(24, ' ');
+    EXPECT_NE(text.find("\n  " + call + std::string(help) + '\n'), text.npos) << word;
   }
 }
 
@@ -125,6 +129,42 @@ TEST(InstallEvent, KeepsTheGoldenHistory) {
   EXPECT_EQ(HistoryText(scratch), "[History]\nCount=0\n");
 }
 
+// A snapshot can take seconds: until then other runs must neither wait nor lose their messages.
+TEST(InstallEvent, HasRecordedItsStartBeforeTheSnapshot) {
+  const ScratchHistory scratch;
+  std::string during;
+  Machine().OnServices = [&](std::chrono::milliseconds limit) {
+    EXPECT_EQ(limit, std::chrono::seconds(2));
+    during = HistoryText(scratch);
+    std::ofstream(InHistory("1/ORXInstallEvent.Log"), std::ios::app) << "of another run\n";
+  };
+  EXPECT_EQ(RunTool({"-start", "1"}), 0);
+  EXPECT_EQ(during, HistoryText(scratch));
+  EXPECT_NE(FileText(InHistory("1/ORXInstallEvent.Log")).find("\nof another run\n"), during.npos);
+}
+
+// Notes whether a guard of the history file exists when a text is flushed: what is written under a
+// guard is not in the file yet.
+struct GuardProbe : std::stringbuf {
+  int sync() override {
+    CIniFile(GetHistoryFilePath()).WriteString("Probe", "Key", "");
+    IsGuarded = FileText(GetHistoryFilePath()).find("[Probe]") == std::string::npos;
+    return 0;
+  }
+  bool IsGuarded = false;
+};
+
+TEST(InstallEvent, AddsAMessageUnderTheGuard) {
+  const ScratchHistory scratch;
+  scratch.Make("ZEK/ORXHistory/1/");
+  GuardProbe probe;
+  std::ios& log = CLogger::GetInstance();
+  std::streambuf* file = log.rdbuf(&probe);
+  EXPECT_EQ(RunTool({"-logmessage", "1", "-message", "m"}), 0);
+  log.rdbuf(file);
+  EXPECT_TRUE(probe.str() == "m\n" && probe.IsGuarded);
+}
+
 TEST(InstallEvent, LeavesTheCountOfAnExistingFile) {
   const ScratchHistory scratch;
   RunTool({});
@@ -138,15 +178,27 @@ TEST(InstallEvent, HasNamesThatLeadElsewhere) {
   for (const char* name : {"..", "...", ". . .", "a/.. /b", "a/..", ".... "}) {
     EXPECT_TRUE(LeadsElsewhere(scratch.Native(name))) << name;
   }
+  for (const char* name : {".", "a/.b", "a.b.c/d"}) {
+    EXPECT_FALSE(LeadsElsewhere(scratch.Native(name))) << name;
+  }
 }
 
 TEST(InstallEvent, FailsWithoutTheHistoryFolder) {
-  const ScratchHistory scratch;
-  scratch.Make("ZEK/ORXHistory");  // a file in the way
-  testing::internal::CaptureStdout();
-  EXPECT_EQ(RunTool({"-start", "1"}), 1);
-  EXPECT_EQ(scratch.Neutral(testing::internal::GetCapturedStdout()),
-            " Failed to create path:@/ZEK/ORXHistoryInitialiation Failed:\n");
+  for (const bool isLink : {false, true}) {
+    const ScratchHistory scratch;
+    std::error_code noLinks;                                  // they are not possible everywhere
+    const std::string path = scratch.Make("ZEK/ORXHistory");  // a file in the way
+    if (isLink) {
+      std::filesystem::remove(path);
+      std::filesystem::create_directory_symlink(scratch.Make("outside/"), path, noLinks);
+    }
+    testing::internal::CaptureStdout();
+    const int result = RunTool({"-start", "1"});
+    const std::string output = scratch.Neutral(testing::internal::GetCapturedStdout());
+    EXPECT_TRUE(noLinks || result == 1);
+    EXPECT_TRUE(noLinks ||
+                output == " Failed to create path:@/ZEK/ORXHistoryInitialiation Failed:\n");
+  }
 }
 
 }  // namespace

@@ -18,6 +18,8 @@ namespace {
 
 using namespace std::string_literals;
 
+const int32_t firstGeneration = GetCopyGeneration();
+
 TEST(Lists, ReadTextsAndNumbersAndNothingElse) {
   const std::vector<std::pair<RegistryData, std::string>> cases = {
       {{kRegistryText, "no zero"}, "no zero"},
@@ -30,6 +32,7 @@ TEST(Lists, ReadTextsAndNumbersAndNothingElse) {
       {{kRegistryNumber, "\xFF\xFF\xFF\xFF"}, "-1"},
       {{kRegistryNumber, "\0\0\0\x80"s}, "-2147483648"},
       {{kRegistryNumber, "\x01\x02"}, ""},
+      {{kRegistryNumber, "\x01\0\0\0\0\0\0\0"s}, ""},
       {{2, "%PATH%\0"s}, ""},
       {{3, "\x01\x02\x03\x04"}, ""}};
   for (const auto& [data, text] : cases) {
@@ -73,11 +76,16 @@ TEST(Lists, ShowControlCharactersAsQuestionMarks) {
   }
 }
 
-TEST(Lists, AreEmptyWhenTheServicesAreRefused) {
+TEST(Lists, AreEmptyWhenNothingIsListed) {
+  Machine() = FakeMachine();
+  Machine().Services = {5, {}};
   CServicesList list;
   list.Services.resize(1);
-  Machine().Services = {5, {}};
   EXPECT_TRUE(list.Collect() == 5 && list.Services.empty());
+  CUsersList users;
+  users.LocalMembers.resize(1);
+  users.GlobalMembers.resize(1);
+  EXPECT_TRUE(users.Collect() == 0 && users.LocalMembers.empty() && users.GlobalMembers.empty());
 }
 
 TEST(Lists, TakeTheOldCopyInItsOwnCaseOnly) {
@@ -93,6 +101,7 @@ TEST(Lists, TakeTheOldCopyInItsOwnCaseOnly) {
 }
 
 TEST(Lists, AppendTheCopiesOfTheLayoutInForce) {
+  EXPECT_EQ(firstGeneration, 1);
   Machine() = FakeMachine();
   Machine().Load(Golden("registry_added.txt"));
   CORXProductsList list;

@@ -76,6 +76,21 @@ TEST(Report, NeedsAHistoryFolderForItsArchiveAndAHistoryFileForItsSummary) {
   EXPECT_EQ(scratch.Neutral(FileText(InHistory("Summary.txt"))), Golden("summary_empty.txt"));
 }
 
+TEST(Report, SumsUpEveryEventOfACopy) {
+  const ScratchHistory scratch;
+  std::string sections;
+  for (int i = 0; i < 130; ++i) {
+    sections +=
+        '[' + std::to_string(i) + "]\nCopy_Name=C1\nEvent_ID=\nResult=" + std::to_string(i) + '\n';
+  }
+  scratch.Make("ZEK/ORXHistory/History.ini", sections);
+  EXPECT_EQ(CInstallHistory().WriteSummary(), 1);
+  const std::string summary = FileText(InHistory("Summary.txt"));
+  for (int i = 0; i < 130; ++i) {
+    EXPECT_NE(summary.find("\nResult          :" + std::to_string(i)), summary.npos) << i;
+  }
+}
+
 TEST(Report, MakesNoArchiveUnderNamesThatAreTaken) {
   const ScratchHistory scratch;
   RunTool({"-start", "7"});

@@ -163,6 +163,7 @@ TEST_F(Zipper, EndsWhatExceedsALimit) {
     EXPECT_EQ(ReadArchive(Archive).at(2).Contents,
               std::string("Tree/sub/b.txt").substr(0, limits.EntrySize));
     EXPECT_TRUE(zipper.Open(Archive.c_str()) && zipper.IsWithinLimits());
+    EXPECT_TRUE(zipper.AddBuffer("mm", 2, "m"));
   }
 }
 

@@ -62,6 +62,7 @@ TEST_F(Files, CopiesToANewFileOnly) {
   EXPECT_TRUE(CopyToNewFile(source, In("copy"), /*trusted=*/Root));
   EXPECT_EQ(FileText(In("copy")), text);
   EXPECT_EQ(fs::last_write_time(In("copy")), fs::last_write_time(source));
+  EXPECT_EQ(fs::status(In("copy")).permissions(), fs::status(source).permissions());
   for (const std::string& target : {taken, source, In("folder"), In("none/copy")}) {
     EXPECT_FALSE(CopyToNewFile(source, target, /*trusted=*/Root)) << target;
   }

@@ -12,7 +12,9 @@ TEST(Computer, HasAVersionAndProcessors) {
   const SystemVersion version = QuerySystemVersion(VersionForm::kExtended).value();
   EXPECT_GT(version.MajorVersion, 0U);
   EXPECT_EQ(version.PlatformID <= 2, isWindows);
-  EXPECT_GT(QuerySystemInfo().NumberOfProcessors, 0U);
+  const SystemInfo info = QuerySystemInfo();
+  EXPECT_GT(info.NumberOfProcessors, 0U);
+  EXPECT_TRUE(info.ProcessorLevel > 0 || info.ProcessorArchitecture == 0xFFFF);
 }
 
 TEST(Accounts, HaveDomainsAndFitTheirBuffer) {

@@ -8,7 +8,7 @@ namespace {
 
 TEST(ProfileText, ReadsFilesEditedByHand) {
   const ProfileText text(
-      "\xEF\xBB\xBF[first]\r\nstray line\r\nKey = a b \t\r\nEmpty=\nkey=second of its name\n"
+      "\xEF\xBB\xBF[first]\r\nstray line\r\nKey = a b \t\v\f\r\nEmpty=\nkey=second of its name\n"
       "; Comment=1\n\n[broken\na[b]=c\n  [ x]y ] after\nSigns==a=b\n[]\n[FIRST]\nLate=1\n"
       "[last]\nQuoted = \" q\"\" \nOpen=end");
   const std::tuple<const char*, const char*, std::optional<std::string_view>> cases[] = {

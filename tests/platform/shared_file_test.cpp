@@ -55,6 +55,8 @@ TEST_F(Platform, NewFileStaysOnlyWhenItIsFinished) {
   EXPECT_TRUE(file.Finish());
   EXPECT_FALSE(file.Finish() || file.Write("more"));
   EXPECT_EQ(FileText(In("a")), std::string("one\0\n", 5));
+  const fs::perms owners = fs::perms::owner_read | fs::perms::owner_write;
+  EXPECT_TRUE(isWindows || fs::status(In("a")).permissions() == owners);
 }
 
 TEST_F(Platform, NewFileReplacesNothing) {

@@ -58,8 +58,8 @@ TEST_F(Run, ReturnsItsExitResults) {
 }
 
 TEST_F(Run, RecordsLocalTimes) {
-  EXPECT_EQ(Shell("export TZ=Far-13; before=$(date '+%Y%m%d %H'); $ORX -start 7;"
-                  "grep -e \"Start_Time=$before\" -e \"Start_Time=$(date '+%Y%m%d %H')\""
+  EXPECT_EQ(Shell("export TZ=Far-13; before=$(date '+%Y%m%d %H:%M'); $ORX -start 7;"
+                  "grep -e \"Start_Time=$before\" -e \"Start_Time=$(date '+%Y%m%d %H:%M')\""
                   " ZEK/ORXHistory/History.ini"),
             0);
 }
@@ -103,6 +103,36 @@ TEST_F(Run, LeavesWhatIsNoRegularFile) {
     EXPECT_EQ(Call("-start 1") + Call("-end l/7 -CopyName C") + Call("-report a.zip"), 0);
     EXPECT_EQ(Shell("cd ZEK/ORXHistory; " + std::string(after)), 0) << after;
   }
+}
+
+// More entries than other programs can read are left out: then the archive is not complete.
+TEST_F(Run, FailsWhenTheArchiveIsFull) {
+  char memory[] = "/dev/shm/orx-test-XXXXXX";  // as so many files take long on a disk
+  ASSERT_NE(::mkdtemp(memory), nullptr);
+  const std::string folder = memory + "/ZEK/ORXHistory/folder/"s;
+  fs::create_directories(folder);
+  for (int i = 0; i < 65535; ++i) {
+    WriteFileText(folder + std::to_string(i), "");
+  }
+  EXPECT_EQ(Shell("ORX_COMMON_APPDATA="s + memory + " $ORX -report a.zip >output"), 3);
+  fs::remove_all(memory);
+}
+
+// Through a temporary file that a report does not pack, if the run is killed.
+TEST_F(Run, ReplacesTheHistoryFileOnceForAStart) {
+  const int watch = ::inotify_init1(IN_NONBLOCK);
+  ASSERT_GE(::inotify_add_watch(watch, History.c_str(), IN_CREATE | IN_MOVED_TO), 0);
+  EXPECT_EQ(Call("-start 7"), 0);
+  std::string names;
+  alignas(inotify_event) char buffer[4096];
+  const ssize_t size = ::read(watch, buffer, sizeof buffer);
+  for (ssize_t offset = 0; offset < size;) {
+    const auto* event = reinterpret_cast<const inotify_event*>(buffer + offset);
+    names += std::string(event->name) + ' ';
+    offset += static_cast<ssize_t>(sizeof *event + event->len);
+  }
+  ::close(watch);
+  EXPECT_EQ(names, "7 .History.tmp History.ini ");
 }
 
 // Windows moves no folder in which a file is open.

@@ -204,7 +204,7 @@ TEST(History, IsReadFromFilesEditedByHand) {
                "[History]\r\nCount=2\r\n"
                "[B\xFChne \"1\"]\r\nEVENT_ID=x\r\nstart_time = 20261114 22:00:03\r\n"
                "Start_Time=20250101 00:00:00\r\nEnd_Time=never\r\nComplete_Flag=TRUE\r\n"
-               "Product=\"ORX\tServer\"\r\nResult=\x01\xE2\x82\xAC\r\nCopy_Name=C1\r\n"
+               "Product=\"ORX\tServer\"\r\nResult=\x01\x7F\xE2\x82\xAC\r\nCopy_Name=C1\r\n"
                "[b\xFChne \"1\"]\r\nEvent_ID=second\r\n"
                "[late]\r\nEvent_ID=late\r\nStart_Time=\r\n"
                "[early]\r\nStart_Time=20261114 22:00:02\r\n");

@@ -16,6 +16,7 @@ TEST(Page, ShowsMarkupAndHiddenCharactersAsText) {
       {"\xE2\x80\xAE"
        "exe\xE2\x81\xA6\xE2\x82\xAC",
        "[U+202E]exe[U+2066]\xE2\x82\xAC"},
+      {"\xE2\x80\x8B\xE2\x80\x8F\xE2\x80\x90", "[U+200B][U+200F]\xE2\x80\x90"},
       {"\xF3\xA0\x80\x81\xF0\x9F\x98\x80", "[U+E0001]\xF0\x9F\x98\x80"},
   };
   for (const auto& [text, html] : cases) {

@@ -148,6 +148,18 @@ TEST(Source, ReadsNoMoreThanTheLimit) {
       << content;
 }
 
+TEST(Source, ReadsNoMoreNamesThanTheLimit) {
+  std::vector<BuiltEntry> entries(2100, {"", ""});
+  for (size_t i = 0; i < entries.size(); ++i) {
+    const std::string number = std::to_string(i);
+    entries[i].Name = i == 0 ? ini : number + std::string(4096 - number.size(), 'n');
+  }
+  // The last one of these exceeds 8 MiB.
+  EXPECT_TRUE(
+      ContentOf(BuildArchive(entries))
+          .ends_with("! The archive holds more than 2049 entries; the others are left out."));
+}
+
 class FolderSource : public testing::Test, protected ScratchFolder {};
 
 TEST_F(FolderSource, FindsTheHistoryBelow) {

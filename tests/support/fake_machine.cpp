@@ -63,7 +63,12 @@ std::optional<ProcessModule> FirstModuleOf(uint32_t processID) {
 
 std::optional<std::vector<ProcessEntry>> SnapshotProcesses() { return Machine().ProcessEntries; }
 
-ServiceListing ListServices(std::chrono::milliseconds) { return Machine().Services; }
+ServiceListing ListServices(std::chrono::milliseconds limit) {
+  if (Machine().OnServices) {
+    Machine().OnServices(limit);
+  }
+  return Machine().Services;
+}
 
 RegistryData ReadRegistryData(const std::string& keyPath, const std::string& valueName,
                               size_t limit, RegistryAccess access) {

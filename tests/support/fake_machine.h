@@ -1,6 +1,8 @@
 #pragma once
 
+#include <chrono>
 #include <cstdint>
+#include <functional>
 #include <map>
 #include <optional>
 #include <string>
@@ -29,6 +31,7 @@ struct FakeMachine {
   std::optional<std::vector<ProcessEntry>> ProcessEntries;
 
   ServiceListing Services;
+  std::function<void(std::chrono::milliseconds limit)> OnServices;  // when they are listed
 
   // The groups are listed for a server name that is this machine's, if it has one.
   using Groups = std::vector<std::pair<std::string, std::vector<std::string>>>;

@@ -1,0 +1,99 @@
+// The texts that the commands print.
+
+#include "reader/views.h"
+
+#include <gtest/gtest.h>
+
+#include <tuple>
+
+#include "reader/event_text.h"
+#include "reader/hits.h"
+
+namespace {
+
+TEST(Views, RoundDurations) {
+  const std::pair<LocalTime, const char*> cases[] = {{0, "0 s"},
+                                                     {59, "59 s"},
+                                                     {60, "1 min"},
+                                                     {89, "1 min"},
+                                                     {90, "2 min"},
+                                                     {3569, "59 min"},
+                                                     {3570, "1 h 00 min"},
+                                                     {7500, "2 h 05 min"},
+                                                     {86369, "23 h 59 min"},
+                                                     {86370, "1 d 00 h"},
+                                                     {4 * 86400 - 1, "4 d 00 h"},
+                                                     {-1, ""}};
+  for (const auto& [seconds, text] : cases) {
+    Event event;
+    event.Started = 1'000'000;
+    event.Ended = *event.Started + seconds;
+    EXPECT_EQ(DurationOf(event), text) << seconds;
+  }
+}
+
+TEST(Views, CutTextToColumns) {
+  const std::tuple<const char*, size_t, const char*> cases[] = {
+      {"abcd", 4, "abcd"},    {"abcde", 4, "abc…"}, {"表示表", 6, "表示表"},
+      {"表示表", 5, "表示…"}, {"表示表", 4, "表…"}, {"e\u0301e\u0301e", 2, "e\u0301…"},
+      {"ab", 0, "…"},
+  };
+  for (const auto& [text, columns, cut] : cases) {
+    EXPECT_EQ(CutTo(text, columns), cut) << text << columns;
+  }
+}
+
+// The widest columns with free text are cut, but none to fewer than eight columns.
+TEST(Views, FitAListIntoTheTerminal) {
+  Event event;
+  event.Identity = "1007 of the first machine";
+  event.Action = "Upgrade";
+  event.Product = "ORX Server Build 1960";
+  event.Copy = "Production";
+  const std::string begin = "\n-                  open   Upgrade  ";
+  for (const auto& [width, rest] :
+       {std::pair(80, "ORX Server…  Production  -        1007 of th…\n"),
+        std::pair(20, "ORX Ser…  Product…  -        1007 of…\n")}) {
+    const std::string text = ListText({&event}, {static_cast<size_t>(width)});
+    EXPECT_NE(text.find(begin + rest), text.npos) << text;
+  }
+}
+
+TEST(Views, ShowChangesInOrderAndValuesInOneColumn) {
+  Event event;
+  event.HasBefore = event.HasAfter = true;
+  event.Differences.Compared.fill(true);
+  const auto change = [&event](Section section, const std::string& name) {
+    event.Differences.List.push_back(
+        {ChangeKind::kChanged, section, {}, name, {{"value", "1", "2"}}});
+  };
+  change(Section::kProcesses, "orxserver");
+  change(Section::kProcesses, "svchost.exe");
+  change(Section::kServices, std::string(30, 's'));
+  change(Section::kServices, std::string(41, 's'));
+  change(Section::kDrivers, "d");
+  const std::string column(29, ' ');
+  const std::string text = DifferencesText(event, {});
+  EXPECT_TRUE(text.starts_with("services\n  " + std::string(30, 's') + "  1 -> 2\n  " +
+                               std::string(41, 's') + "  1 -> 2\ndrivers\n  d" + column +
+                               "  1 -> 2\nprocesses\n  orxserver" + column.substr(8) +
+                               "  1 -> 2\n  1 other name (--all shows it)\n"))
+      << text;
+}
+
+TEST(Views, FindAPartOfAnEvent) {
+  Event event;
+  event.Action = "Install";
+  event.Files = {{"Log_File_Name", "C:\\Temp\\Setup.log", "Setup.log"}};
+  event.Messages = "setup runs\nother\n";
+  event.Differences.List = {{ChangeKind::kAdded, Section::kGroups, {}, "SETUP users", {}}};
+  std::string found;
+  ForEachHit(event, "setup", [&found](const Hit& hit) {
+    found.append(hit.Kind).append(" ").append(hit.Name).append(": ").append(hit.Text).append("\n");
+  });
+  EXPECT_EQ(found,
+            "fact Log_File_Name: C:\\Temp\\Setup.log\nmessage : setup runs\n"
+            "change groups: groups: SETUP users added\n");
+}
+
+}  // namespace
