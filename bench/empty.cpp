@@ -1,2 +1,2 @@
-// The least that a program costs: it is loaded and ends.
+// Does nothing: the cost of loading and ending a program.
 int main() { return 0; }

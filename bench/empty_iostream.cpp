@@ -1,4 +1,4 @@
-// The least that a program with streams costs, the C++ library being loaded as usual.
+// Does nothing: the cost of loading and ending a program with streams and the shared C++ library.
 #include <iostream>
 
 int main() { return 0; }

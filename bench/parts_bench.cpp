@@ -12,7 +12,7 @@
 #include "platform/profile_text.h"
 #include "report/zipper.h"
 
-// The parts whose cost grows with what a machine or a history holds.
+// The parts whose cost depends on the size of a machine or a history.
 
 namespace {
 
@@ -64,7 +64,7 @@ void ParseHistory(benchmark::State& state) {
   state.SetBytesProcessed(state.iterations() * static_cast<int64_t>(text.size()));
 }
 
-// The last key of a section that was not asked for before.
+// The last key of a section, another section each time.
 void FindKey(benchmark::State& state) {
   const int64_t events = state.range(0);
   const ProfileText history(HistoryText(events));
@@ -75,7 +75,7 @@ void FindKey(benchmark::State& state) {
   }
 }
 
-// A value in the middle that grows and shrinks, so that all behind it moves.
+// A value in the middle changes its length, so that all text after it moves.
 void SetKey(benchmark::State& state) {
   ProfileText history(HistoryText(state.range(0)));
   const std::string name = EventName(state.range(0) / 2);
@@ -86,7 +86,7 @@ void SetKey(benchmark::State& state) {
   }
 }
 
-// As a report reads: every access looks whether the file is still the one that was parsed.
+// As a report reads: every access checks that the file is still the one that was parsed.
 void ReadKeyOfFile(benchmark::State& state) {
   const ScratchFolder folder;
   const std::string file = folder.Make("History.ini", HistoryText(state.range(0)));
@@ -107,7 +107,7 @@ std::string ExportText(int64_t keys) {
   return text + "[HKEY_LOCAL_MACHINE\\SOFTWARE\\ZEK\\ORX]\r\n\"Version\"=\"9.5\"\r\n";
 }
 
-// The first question, which sends the whole export by, and the reading of one branch.
+// A first question: it reads the entire export once and keeps one branch.
 void AskExport(benchmark::State& state) {
   const std::string text = ExportText(state.range(0));
   const auto read = [&text](uint64_t offset, char* buffer, size_t size) {

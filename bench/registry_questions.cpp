@@ -4,8 +4,8 @@
 
 #include "platform/registry.h"
 
-// Asks the machine's registry what a snapshot asks, and prints how many questions that were. Timed
-// as a whole process by scripts/bench.sh.
+// Reads from the machine's registry what a snapshot reads, and prints the number of calls.
+// scripts/bench.sh measures the time of the process.
 
 namespace {
 

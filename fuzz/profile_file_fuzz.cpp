@@ -1,19 +1,13 @@
-#include <cstdint>
-#include <iterator>
-#include <string>
-#include <string_view>
-#include <vector>
-
 #include "fuzz/profile_model.h"
-#include "fuzz/support.h"
 #include "platform/profile_text.h"
 
 // The first line of the input is a program, the rest is a profile file. Three characters of the
 // program are a change: a section, a key and a value, as indices of the tables below; the file's
-// own sections are added to the table of sections. Before and after each change ProfileText equals
-// the model byte for byte and reads as the model does.
+// own sections are added to the table of sections.
 
 namespace {
+
+using Words = std::vector<std::string>;
 
 struct Change {
   std::string Section;
@@ -21,23 +15,22 @@ struct Change {
   std::string Value;
 };
 
-size_t NumberOf(char character, size_t count) {
-  return static_cast<uint8_t>(character - '0') % count;
+const std::string& Choose(const Words& words, char index) {
+  return words[static_cast<uint8_t>(index - '0') % words.size()];
 }
 
 std::vector<Change> ReadProgram(std::string_view program, const ProfileModel& file) {
-  constexpr const char* keys[] = {"Count", "RESULT", " count\t", "a[b]", "", "]"};
-  constexpr const char* values[] = {"1", "", " blanks around ", "\"quoted\"", "a=b", "[History]"};
+  const Words keys = {"Count", "RESULT", " count\t", "a[b]", "", "]"};
+  const Words values = {"1", "", " blanks around ", "\"quoted\"", "a=b", "[History]"};
+  Words sections = {"History", " 42", "history", "", "]", "[", "\xEF\xBB\xBF[x"};
   constexpr size_t mostChanges = 8;
-  std::vector<std::string> sections = {"History", " 42", "history", "", "]", "[", "\xEF\xBB\xBF[x"};
   for (const std::string_view name : file.SectionNames()) {
     sections.emplace_back(name);
   }
   std::vector<Change> changes;
   for (size_t i = 0; i + 2 < program.size() && changes.size() < mostChanges; i += 3) {
-    changes.push_back({sections[NumberOf(program[i], sections.size())],
-                       keys[NumberOf(program[i + 1], std::size(keys))],
-                       values[NumberOf(program[i + 2], std::size(values))]});
+    changes.push_back({Choose(sections, program[i]), Choose(keys, program[i + 1]),
+                       Choose(values, program[i + 2])});
   }
   return changes;
 }
@@ -52,13 +45,12 @@ void CompareAnswers(const ProfileText& text, const ProfileModel& model,
 
 }  // namespace
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  const std::string input(data, data + size);
-  const size_t programEnd = std::min(input.find('\n'), size);
-  const std::string file = input.substr(std::min(programEnd + 1, size));
+void CheckInput(const std::string& input) {
+  const std::string program = input.substr(0, input.find('\n'));
+  const std::string file = input.substr(std::min(program.size() + 1, input.size()));
   ProfileModel model(file);
   ProfileText text(file);
-  const std::vector<Change> changes = ReadProgram(input.substr(0, programEnd), model);
+  const std::vector<Change> changes = ReadProgram(program, model);
   CompareAnswers(text, model, changes);
   for (const Change& change : changes) {
     text.Set(change.Section, change.Key, change.Value);
@@ -69,5 +61,4 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   CompareAnswers(text, model, changes);
   // The offsets that were kept through the changes are those of a new ProfileText.
   CompareAnswers(ProfileText(text.Get()), model, changes);
-  return 0;
 }

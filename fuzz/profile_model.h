@@ -1,78 +1,67 @@
 #pragma once
 
-#include <algorithm>
-#include <cstddef>
 #include <optional>
-#include <string>
-#include <string_view>
-#include <vector>
+#include <set>
 
+#include "fuzz/support.h"
 #include "platform/ascii_case.h"
 
-// A profile file as a list of lines, each parsed again for each question. Slow and plain, to
+// A profile file as a list of lines, all of them parsed again after each change. Slow and plain, to
 // compare ProfileText with; the operations are those of ProfileText.
 class ProfileModel {
  public:
-  explicit ProfileModel(std::string_view text) {
-    while (!text.empty()) {
-      const size_t length = std::min(text.find('\n'), text.size() - 1) + 1;
-      Lines.emplace_back(text.substr(0, length));
-      text.remove_prefix(length);
+  explicit ProfileModel(std::string_view file) {
+    std::set<std::string> known;
+    std::string section = "\n";  // no section: none has such a name
+    for (const std::string& text : Split(file, '\n')) {
+      Line& line = Lines.emplace_back(Line{text, section, SectionName(text), {}});
+      const size_t sign = text.find('=');
+      if (line.Name) {
+        const bool isFirst = known.insert(LoweredAscii(*line.Name)).second;
+        line.Section = section = isFirst ? LoweredAscii(*line.Name) : "\n";
+      } else if (sign != std::string::npos) {
+        line.Key = LoweredAscii(Trim(text.substr(0, sign)));
+      }
     }
   }
 
   std::string Text() const {
     std::string text;
-    for (const std::string& line : Lines) {
-      text += line;
+    for (const Line& line : Lines) {
+      text += line.Text + '\n';
     }
+    text.pop_back();  // the last line is what follows the last line end
     return text;
   }
 
   std::vector<std::string_view> SectionNames() const {
     std::vector<std::string_view> names;
-    for (size_t line = 0; line < Lines.size(); ++line) {
-      const std::string_view name = SectionAt(line).value_or("");
-      if (!name.empty() && name.front() != '\0') {
-        names.push_back(name.substr(0, name.find('\0')));
-      }
+    for (const Line& line : Lines) {
+      const std::string_view name = line.Name ? std::string_view(*line.Name) : "";
+      names.push_back(name.substr(0, name.find('\0')));
     }
+    std::erase(names, "");
     return names;
   }
 
   std::optional<std::string_view> Find(std::string_view section, std::string_view key) const {
-    const size_t line = LineOf(section, key);
-    if (line == Lines.size()) {
+    const size_t index = IndexOf(section, key);
+    if (index == Lines.size()) {
       return std::nullopt;
     }
-    return ValueOf(std::string_view(Lines[line]).substr(Lines[line].find('=') + 1));
+    const std::string_view text = Lines[index].Text;
+    return ValueOf(text.substr(text.find('=') + 1));
   }
 
-  void Set(const std::string& section, const std::string& key, const std::string& value) {
-    const size_t line = LineOf(section, key);
-    if (line != Lines.size()) {
-      Replace(Lines[line], value);
-      return;
+  void Set(std::string_view section, const std::string& key, const std::string& value) {
+    const size_t index = IndexOf(section, key);
+    if (index == Lines.size()) {
+      Add(std::string(Trim(section)), key + "=" + value);
+    } else {
+      std::string& text = Lines[index].Text;
+      text = text.substr(0, text.find('=') + 1) + value + (text.ends_with('\r') ? "\r" : "");
     }
-    if (HeaderOf(section) == Lines.size()) {
-      AddAt(Lines.size(), "[" + std::string(Trim(section)) + "]\n");
-    }
-    size_t place = EndOf(HeaderOf(section));
-    while (Trim(Lines[place - 1]).empty()) {
-      --place;
-    }
-    AddAt(place, key + "=" + value + "\n");
-  }
-
-  static std::string_view Trim(std::string_view text) {
-    const auto isBlank = [](char c) { return c == ' ' || (c >= '\t' && c <= '\r'); };
-    while (!text.empty() && isBlank(text.front())) {
-      text.remove_prefix(1);
-    }
-    while (!text.empty() && isBlank(text.back())) {
-      text.remove_suffix(1);
-    }
-    return text;
+    *this = ProfileModel(Text());
   }
 
   // What is read of a text after a "=".
@@ -84,64 +73,47 @@ class ProfileModel {
   }
 
  private:
-  // The name of the section that the line begins, if it begins one.
-  std::optional<std::string_view> SectionAt(size_t line) const {
-    std::string_view text = Lines[line];
-    text.remove_prefix(line == 0 && text.starts_with("\xEF\xBB\xBF") ? 3 : 0);
-    text = Trim(text);
-    const size_t close = text.rfind(']');
-    const bool isHeader = text.starts_with('[') && close != std::string_view::npos;
-    return isHeader ? std::optional(Trim(text.substr(1, close - 1))) : std::nullopt;
+  // Section and Key are in lower case.
+  struct Line {
+    std::string Text;
+    std::string Section;
+    std::optional<std::string> Name;  // of the section that the line begins
+    std::optional<std::string> Key;
+  };
+
+  static std::string_view Trim(std::string_view text) {
+    constexpr std::string_view blanks = " \t\n\v\f\r";
+    text.remove_prefix(std::min(text.find_first_not_of(blanks), text.size()));
+    return text.substr(0, text.find_last_not_of(blanks) + 1);
   }
 
-  // The next three return a line's index, or the number of lines if there is no such line.
-  size_t HeaderOf(std::string_view section) const {
-    size_t line = 0;
-    while (line < Lines.size()) {
-      const std::optional<std::string_view> name = SectionAt(line);
-      if (name && EqualsIgnoringCase(*name, Trim(section))) {
-        break;
-      }
-      ++line;
+  std::optional<std::string> SectionName(std::string_view line) const {
+    line.remove_prefix(Lines.empty() && line.starts_with("\xEF\xBB\xBF") ? 3 : 0);
+    line = Trim(line);
+    const size_t close = line.rfind(']');
+    const bool isHeader = line.starts_with('[') && close != std::string_view::npos;
+    return isHeader ? std::optional(std::string(Trim(line.substr(1, close - 1)))) : std::nullopt;
+  }
+
+  // The number of lines if there is no such key.
+  size_t IndexOf(std::string_view section, std::string_view key) const {
+    const auto found = std::find_if(Lines.begin(), Lines.end(), [&](const Line& line) {
+      return line.Section == LoweredAscii(Trim(section)) && line.Key == LoweredAscii(Trim(key));
+    });
+    return static_cast<size_t>(found - Lines.begin());
+  }
+
+  void Add(const std::string& section, std::string text) {
+    const auto last = std::find_if(Lines.rbegin(), Lines.rend(), [&](const Line& line) {
+      return line.Section == LoweredAscii(section) && !Trim(line.Text).empty();
+    });
+    auto next = last.base();
+    if (last == Lines.rend()) {
+      next = Lines.end() - (Lines.back().Text.empty() ? 1 : 0);
+      text.insert(0, "[" + section + "]\n");
     }
-    return line;
+    Lines.insert(next, {text + (next == Lines.end() ? "\n" : ""), {}, {}, {}});
   }
 
-  size_t EndOf(size_t header) const {
-    size_t line = std::min(header + 1, Lines.size());
-    while (line < Lines.size() && !SectionAt(line)) {
-      ++line;
-    }
-    return line;
-  }
-
-  size_t LineOf(std::string_view section, std::string_view key) const {
-    const size_t header = HeaderOf(section);
-    const size_t end = EndOf(header);
-    for (size_t line = header + 1; line < end; ++line) {
-      const std::string_view text = Lines[line];
-      const size_t sign = text.find('=');
-      if (sign != std::string_view::npos &&
-          EqualsIgnoringCase(Trim(text.substr(0, sign)), Trim(key))) {
-        return line;
-      }
-    }
-    return Lines.size();
-  }
-
-  static void Replace(std::string& line, const std::string& value) {
-    const size_t begin = line.find('=') + 1;
-    size_t end = line.size() - (line.ends_with('\n') ? 1 : 0);
-    end -= end > begin && line[end - 1] == '\r' ? 1 : 0;
-    line.replace(begin, end - begin, value);
-  }
-
-  void AddAt(size_t place, const std::string& line) {
-    if (place > 0 && !Lines[place - 1].ends_with('\n')) {
-      Lines[place - 1] += '\n';
-    }
-    Lines.insert(Lines.begin() + static_cast<ptrdiff_t>(place), line);
-  }
-
-  std::vector<std::string> Lines;
+  std::vector<Line> Lines;
 };

@@ -1,12 +1,17 @@
 #pragma once
 
+#include <algorithm>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <string>
 #include <string_view>
 #include <vector>
 
-// What a fuzz target checks; a failure ends the process, which the fuzzer reports as a finding.
+// What the fuzzer calls with each input; every target defines it.
+void CheckInput(const std::string& input);
+
+// A condition that must hold; its failure ends the process, which the fuzzer reports as a finding.
 inline void Require(bool condition, int line = __builtin_LINE()) {
   if (!condition) {
     std::fprintf(stderr, "line %d: the requirement does not hold\n", line);
@@ -16,13 +21,19 @@ inline void Require(bool condition, int line = __builtin_LINE()) {
 
 // The parts of the text between the separators; a text without one is one part.
 inline std::vector<std::string> Split(std::string_view text, char separator) {
-  std::vector<std::string> parts(1);
-  for (const char c : text) {
-    if (c == separator) {
-      parts.emplace_back();
-    } else {
-      parts.back() += c;
-    }
+  std::vector<std::string> parts;
+  for (size_t end; (end = text.find(separator)) != std::string_view::npos;) {
+    parts.emplace_back(text.substr(0, end));
+    text.remove_prefix(end + 1);
   }
+  parts.emplace_back(text);
   return parts;
+}
+
+// Reads the bytes as a file is read: fills at most size bytes of the buffer from the offset on and
+// returns how many. The bytes must outlive it.
+inline auto ReaderOf(const std::string& bytes) {
+  return [&bytes](uint64_t offset, char* buffer, size_t size) {
+    return offset < bytes.size() ? bytes.copy(buffer, size, offset) : size_t{0};
+  };
 }

@@ -1,18 +1,11 @@
-#include <cstdint>
 #include <filesystem>
 #include <iostream>
-#include <sstream>
-#include <string>
-#include <string_view>
-#include <vector>
+#include <set>
 
-#include "app/install_event.h"
 #include "app/install_history.h"
 #include "fuzz/history_model.h"
-#include "fuzz/support.h"
 #include "history/locations.h"
 #include "platform/path.h"
-#include "platform/profile_text.h"
 #include "tests/support/archive_reader.h"
 #include "tests/support/run_tool.h"
 #include "tests/support/scratch_history.h"
@@ -25,30 +18,32 @@
 namespace {
 
 namespace fs = std::filesystem;
-using Words = std::vector<std::string>;
 
-std::string StoredNow(const std::string& section, const std::string& key) {
-  const ProfileText file(FileText(GetHistoryFilePath()));
-  return std::string(file.Find(HistoryModel::OnOneLine(section), key).value_or(""));
-}
+HistoryModel HistoryNow() { return HistoryModel(FileText(GetHistoryFilePath())); }
 
-std::string TimeNow(const std::string& section, const std::string& key) {
-  const std::string time = StoredNow(section, key);
-  Require(time.size() == 17 && time[8] == ' ' && time[11] == ':' && time[14] == ':');
-  return time;
-}
-
-void CheckGetters(const HistoryModel& model, const std::string& identity) {
-  const CInstallEvent event(identity);
-  for (const KeyRoute& route : kKeyRoutes) {
-    Require((event.*route.Get)() == model.Read(identity, route.Key));
+// The log of an event whose folder is one, with no link on the way: it cannot fail to be written.
+void CheckLog(const CommandLineModel& line, const std::string& before, const std::string& after) {
+  if (line.Mode == "-logmessage") {
+    Require(after == before + line.Value("Message") + '\n');
+  } else if (line.Mode == "-start") {
+    Require(after.starts_with("---------- ORX Installation History Logger ( Start )"));
+    Require(after.find("\nCommandLine   :" + line.Value("Command_Line") + '\n') !=
+            std::string::npos);
   }
 }
 
-// Whether a folder was moved shows in its key; which names can be moved depends on the system.
-void FollowMove(HistoryModel& model, const CommandLineModel& line) {
-  const std::string& identity = line.Identity;
-  if (StoredNow(identity, "Event_Log_File") != model.Stored(identity, "Event_Log_File")) {
+void UpdateModel(HistoryModel& model, const CommandLineModel& line, const std::string& logPath) {
+  const std::string identity = line.Value("Event_ID");
+  const HistoryModel now = HistoryNow();
+  const std::string time = now.Stored(identity, line.Mode == "-start" ? "Start_Time" : "End_Time");
+  Require(WithoutTimes(time) == "<time>");
+  if (line.Mode == "-start") {
+    model.Start(line, time, logPath);
+    return;
+  }
+  model.End(line, time);
+  // Whether the folder was moved shows in its key; which names can be moved depends on the system.
+  if (now.Stored(identity, "Event_Log_File") != model.Stored(identity, "Event_Log_File")) {
     const std::string folder =
         JoinPath(JoinPath(GetHistoryDir(), line.Value("Copy_Name")), identity);
     Require(fs::is_directory(folder));
@@ -56,44 +51,25 @@ void FollowMove(HistoryModel& model, const CommandLineModel& line) {
   }
 }
 
-// What the logs of events with ordinary names hold; none of them can fail to be written.
-void CheckLog(const CommandLineModel& line, const std::string& before, bool isWritable) {
-  const std::string path =
-      JoinPath(JoinPath(GetHistoryDir(), line.Identity), "ORXInstallEvent.Log");
-  const std::string after = FileText(path);
-  if (line.Mode == "-logmessage") {
-    Require(after == (isWritable ? before + line.Message + '\n' : before));
-  } else if (line.Mode == "-start" && isWritable) {
-    Require(after.starts_with("---------- ORX Installation History Logger ( Start )"));
-    Require(after.find("\nCommandLine   :" + line.Value("Command_Line") + '\n') !=
-            std::string::npos);
-  }
-}
-
-bool IsOrdinary(const std::string& name) {
-  return name.size() < 100 && std::all_of(name.begin(), name.end(),
-                                          [](unsigned char c) { return std::isalnum(c) != 0; });
-}
-
-void RunEvent(HistoryModel& model, const Words& words) {
+void RunEvent(HistoryModel& model, const std::vector<std::string>& words) {
   const CommandLineModel line(words);
-  const std::string folder = JoinPath(GetHistoryDir(), line.Identity);
+  const std::string identity = line.Value("Event_ID");
+  const std::string folder = JoinPath(GetHistoryDir(), identity);
   const std::string logPath = JoinPath(folder, "ORXInstallEvent.Log");
-  const bool isOrdinary = line.NamesEvent() && IsOrdinary(line.Identity);
-  const std::string before = isOrdinary ? FileText(logPath) : "";
+  const std::string before = FileText(logPath);
   Require(RunTool(words) == (line.NamesEvent() ? 0 : 2));
-  if (line.NamesEvent() && line.Mode == "-start") {
-    model.Start(line, TimeNow(line.Identity, "Start_Time"), logPath);
-  } else if (line.NamesEvent() && line.Mode == "-end") {
-    model.End(line, TimeNow(line.Identity, "End_Time"));
-    FollowMove(model, line);
+  if (line.NamesEvent() && line.Mode != "-logmessage") {
+    UpdateModel(model, line, logPath);
   }
-  if (isOrdinary) {
-    const bool isWritable = fs::is_directory(fs::symlink_status(folder)) &&
-                            !fs::is_directory(fs::symlink_status(logPath));
-    CheckLog(line, before, isWritable);
+  std::error_code ignored;
+  const bool isFolder = fs::canonical(folder, ignored) == folder && fs::is_directory(folder);
+  if (line.NamesEvent() && isFolder && !fs::is_directory(logPath)) {
+    CheckLog(line, before, FileText(logPath));
   }
-  CheckGetters(model, line.Identity);
+  const CInstallEvent event(identity);
+  CheckGetters(event, model);
+  Require(event.GetCompleteFlag() == model.Read(identity, "Complete_Flag"));
+  Require(event.GetEventLogFile() == model.Read(identity, "Event_Log_File"));
 }
 
 // Which of the installer's files were collected shows in their keys too.
@@ -104,7 +80,7 @@ void RunReport(HistoryModel& model, const std::string& archive) {
   }
   for (const std::string& section : model.EventSections()) {
     for (const char* key : {"Log_File_Name", "Trace_File", "Response_File"}) {
-      const std::string now = StoredNow(section, key);
+      const std::string now = HistoryNow().Stored(section, key);
       if (now != model.Stored(section, key)) {
         Require(now.starts_with(GetHistoryDir() + "/") && FileExists(now));
         model.Set(section, key, now);
@@ -113,52 +89,40 @@ void RunReport(HistoryModel& model, const std::string& archive) {
   }
 }
 
-Words NamesIn(const std::string& folder) {
-  Words names;
-  for (const fs::directory_entry& entry : fs::directory_iterator(folder)) {
-    names.push_back(entry.path().filename().string());
-  }
-  std::sort(names.begin(), names.end());
-  return names;
-}
-
 void CheckFiles(const std::string& root) {
-  Require(NamesIn(root) == Words({"ZEK", "archive", "outside"}));
-  Require(NamesIn(root + "/ZEK") == Words({"ORXHistory"}));
-  Require(NamesIn(root + "/outside").empty());
+  std::set<std::string> outside;
+  for (const fs::directory_entry& entry : fs::recursive_directory_iterator(root)) {
+    if (!entry.path().string().starts_with(GetHistoryDir() + '/')) {
+      outside.insert(entry.path().string().substr(root.size()));
+    }
+  }
+  outside.erase("/archive/a.zip");
+  Require(outside == std::set<std::string>({"/ZEK", "/ZEK/ORXHistory", "/archive", "/outside"}));
   Require(!fs::is_regular_file(JoinPath(GetHistoryDir(), ".History.tmp")));
-}
-
-void Silence() {
-  static std::stringbuf nothing;
-  nothing.str("");
-  std::cout.rdbuf(&nothing);
 }
 
 }  // namespace
 
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+void CheckInput(const std::string& input) {
   constexpr size_t mostRuns = 4;
-  Silence();
-  Words runs = Split(std::string(data, data + size), '\x1E');
+  std::cout.setstate(std::ios::failbit);  // nothing is printed
+  std::vector<std::string> runs = Split(input, '\x1E');
   runs.resize(std::min(runs.size(), mostRuns));
   const ScratchHistory scratch;
-  fs::create_directory(scratch.Root + "/archive");
-  fs::create_directory(scratch.Root + "/outside");
+  scratch.Make("archive/");
+  scratch.Make("outside/");
   HistoryModel model;
   for (const std::string& run : runs) {
-    const Words words = Split(run, '\0');
-    if (words == Words({"-report"}) && fs::exists(GetHistoryDir())) {
+    if (run == "-report" && fs::exists(GetHistoryDir())) {
       RunReport(model, scratch.Root + "/archive/a.zip");
     } else {
-      RunEvent(model, words);
+      RunEvent(model, Split(run, '\0'));
     }
     Require(FileText(GetHistoryFilePath()) == model.Text());
-    Require(CInstallHistory().EventCount == model.Starts());
+    Require(CInstallHistory().EventCount == model.Starts);
     Require(CInstallHistory().GetEventSections() == model.EventSections());
     std::error_code ignored;
     fs::create_symlink("../../outside", JoinPath(GetHistoryDir(), "link"), ignored);
   }
   CheckFiles(scratch.Root);
-  return 0;
 }
