@@ -67,7 +67,7 @@ struct Event {
 void ForEachMessage(const Event& event, const std::function<void(std::string_view)>& use);
 
 struct History {
-  std::string Source;         // its name, as given
+  std::string Source;         // its name, as on the command line
   std::vector<Event> Events;  // oldest start first; then those without a start
   bool HasHistoryFile = false;
   bool WasReported = false;     // a report has been made: installer files have been collected

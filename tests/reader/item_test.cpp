@@ -14,11 +14,25 @@
 #include "products/odbc_drivers.h"
 #include "products/products_list.h"
 #include "reader/snapshot.h"
-#include "tests/reader/item_text.h"
 #include "tests/support/file_text.h"
 #include "tests/support/run_tool.h"
 
 namespace {
+
+// "section path/path name field=value ...", the parts separated by '|'.
+std::string ItemText(const Item& item) {
+  std::string text(SectionName(item.Where));
+  for (size_t i = 0; i < item.PathSize; ++i) {
+    text += (i == 0 ? '|' : '/') + std::string(item.Path[i]);
+  }
+  text += '|' + std::string(item.Name);
+  for (size_t i = 0; i < item.FieldCount; ++i) {
+    text += '|' + std::string(FieldNames(item.Where)[i]) + '=';
+    text += item.Where == Section::kProcesses ? std::to_string(item.Count)
+                                              : std::string(item.Values[i]);
+  }
+  return text;
+}
 
 using Printer = std::function<void(const std::string& value)>;
 

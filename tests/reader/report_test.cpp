@@ -104,7 +104,7 @@ TEST(Report, ReadsTheLineEndsOfBothSystems) {
   EXPECT_EQ(text, Report());
 }
 
-// Text in place of the message. Whatever it holds, all of it is message, and the event is the same.
+// Text instead of the message. Whatever it holds, all of it is message, and the event is the same.
 TEST(Report, TakesNoMessageForABlock) {
   const std::string text = Report();
   const size_t offset = text.find(message);
@@ -132,7 +132,7 @@ TEST(Report, TakesNoMessageForABlock) {
     const size_t forgedEndOffset = offset + forged.size();
     ExpectPartOf(whole.substr(0, forgedEndOffset), Facts(), changes, forged);
     for (size_t size = offset; size < whole.size(); size += 7) {
-      // A forged snapshot that the cut leaves without its times cannot be told apart.
+      // A forged snapshot that the cut leaves without its times cannot be distinguished.
       if (size > forgedEndOffset) {
         ExpectPartOf(whole.substr(0, size), Facts(), changes, forged + endOfReport);
       }

@@ -115,11 +115,16 @@ TEST(Source, LeavesOutWhatIsHostile) {
 }
 
 TEST(Source, SaysWhatIsNoArchive) {
-  EXPECT_EQ(ContentOf(""), "error: is empty; copy the archive again");
-  EXPECT_EQ(ContentOf("text"),
-            "error: is neither a zip archive nor a folder; name one that holds a history");
-  EXPECT_EQ(ContentOf(BuildArchive({{ini, "i"}}, 3)),
-            "History.ini=i ! The archive's directory is damaged after 1 of 4 entries.");
+  const std::pair<std::string, const char*> cases[] = {
+      {"", "error: is empty; copy the archive again"},
+      {"text", "error: is neither a zip archive nor a folder; name one that holds a history"},
+      {BuildArchive({{ini, "i"}}, 3),
+       "History.ini=i ! The archive's directory is damaged after 1 of 4 entries."},
+      {Replaced(BuildArchive({{ini, "text"}}), "text", "next"),
+       "History.ini=? ! History.ini is damaged."}};
+  for (const auto& [bytes, content] : cases) {
+    EXPECT_EQ(ContentOf(bytes), content);
+  }
 }
 
 TEST(Source, ReadsNoArchiveThatIsCut) {
@@ -129,11 +134,6 @@ TEST(Source, ReadsNoArchiveThatIsCut) {
     const std::string content = ContentOf(whole.substr(0, size));
     EXPECT_TRUE(content.starts_with("error: is cut off")) << size << content;
   }
-}
-
-TEST(Source, ChecksTheBytesOfAFile) {
-  EXPECT_EQ(ContentOf(Replaced(BuildArchive({{ini, "text"}}), "text", "next")),
-            "History.ini=? ! History.ini is damaged.");
 }
 
 TEST(Source, ReadsNoMoreThanTheLimit) {
