@@ -17,46 +17,45 @@ import subprocess
 import sys
 import time
 import zipfile
+from pathlib import Path
 
-HERE = os.path.dirname(os.path.abspath(__file__))
-WINE = os.path.join(HERE, "wine.sh")
+from history import HISTORY, REPOSITORY, check, parse_history
+
+WINE = REPOSITORY / "scripts/wine.sh"
 SOFTWARE = "HKEY_LOCAL_MACHINE\\SOFTWARE\\"
 PRODUCTS = "Microsoft\\Windows\\CurrentVersion\\Installer\\UserData\\S-1-5-18\\Products"
 TOOL_KEYS = [SOFTWARE + "ZEK", SOFTWARE + "ODBC\\ODBCINST.INI", SOFTWARE + PRODUCTS]
-SECTION_NAMES_SIZE = 10240
 
 
 class Side:
     """A program with its common application data folder, and a folder for an installer's files."""
 
-    def __init__(self, command, environment, separator, encoding, root, root_name, files,
-                 files_name):
+    def __init__(self, command, separator, encoding, root, root_name, files, files_name):
         self.command = command
         self.encoding = encoding
-        self.environment = dict(os.environ, **environment)
+        self.environment = dict(os.environ)
         self.separator = separator
-        self.root, self.root_name = root, root_name
-        self.files, self.files_name = files, files_name
-        self.maker = os.path.join(root, "ZEK")
-        self.history = os.path.join(self.maker, "ORXHistory")
+        self.root_name, self.files_name = root_name, files_name
+        self.files = files
+        self.maker = root / "ZEK"
+        self.history = root / HISTORY
 
     def reset(self):
         for folder in (self.history, self.files):
             shutil.rmtree(folder, ignore_errors=True)
-        os.makedirs(self.files)
+        self.files.mkdir(parents=True)
 
     def start(self, arguments):
-        arguments = [
-            a.replace("{files}/", self.files_name + self.separator) for a in arguments
-        ]
+        beginning = self.files_name + self.separator
         return subprocess.Popen(
-            self.command + arguments, env=self.environment, cwd=self.files,
-            stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
+            self.command + [word.replace("{files}/", beginning) for word in arguments],
+            env=self.environment, cwd=self.files, stdin=subprocess.DEVNULL,
+            stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
 
     def run(self, arguments):
         process = self.start(arguments)
         output = process.communicate()[0]
-        return "%s\nresult %d: %s" % (arguments, process.returncode, self.plain(output))
+        return f"{arguments}\nresult {process.returncode}: {self.plain(output)}"
 
     def plain(self, data):
         """Text without what differs: the code page, the two folders, line ends, and times."""
@@ -73,18 +72,15 @@ class Side:
         return self.plain(data)
 
     def tree(self):
-        for folder, _, names in sorted(os.walk(self.history)):
-            yield "folder " + os.path.relpath(folder, self.history)
-            for name in sorted(names):
-                path = os.path.join(folder, name)
-                with open(path, "rb") as file:
-                    yield "%s:\n%s" % (os.path.relpath(path, self.history),
-                                       self.contents(name, file.read()))
+        for path in sorted(self.history.rglob("*")):
+            name = path.relative_to(self.history)
+            yield (f"folder {name}" if path.is_dir() else
+                   f"{name}:\n{self.contents(path.name, path.read_bytes())}")
 
     def archive(self):
-        """Every entry; beside others the order is the system's, but each is behind its folder."""
-        path = os.path.join(self.files, "out.zip")
-        if not os.path.exists(path):
+        """Every entry, sorted: their order is the system's, but each comes after its folder."""
+        path = self.files / "out.zip"
+        if not path.exists():
             return
         with zipfile.ZipFile(path) as archive:
             entries = {}
@@ -95,20 +91,16 @@ class Side:
                 name = name.replace("\\", "/")
                 assert "/" not in name or name.rsplit("/", 1)[0] in entries, name
                 kind = "folder" if info.external_attr & 0x10 else "file"
-                entries[name] = "%s, read-only %d:\n%s" % (
-                    kind, info.external_attr & 1, self.contents(name, archive.read(info)))
-        for name in sorted(entries):
-            yield "archive: %s, %s" % (name, entries[name])
+                entries[name] = (f"{kind}, read-only {info.external_attr & 1}:\n"
+                                 + self.contents(name, archive.read(info)))
+        yield from (f"archive: {name}, {entries[name]}" for name in sorted(entries))
 
 
 def history_lines(text):
-    """A blank line may stand between sections, and blanks around a value do not belong to it: Wine
-    leaves out those in front, as Windows is documented to do only when it reads."""
-    lines = []
-    for line in filter(None, text.split("\n")):
-        key, equals, value = line.partition("=")
-        lines.append(key + equals + value.strip(" \t"))
-    return "\n".join(lines)
+    """Without blank lines between sections and blanks around a value: Wine leaves out those before
+    it when it writes, Windows, by its documentation, only when it reads."""
+    lines = re.sub(r"\n+", "\n", text).strip("\n")
+    return re.sub(r"(?m)^([^=\n]*=)[ \t]*(.*?)[ \t]*$", r"\1\2", lines)
 
 
 MACHINE_LABELS = re.compile(
@@ -149,7 +141,7 @@ def limits_export():
         ("k two texts", "hex(1):61,00,00,00,62,00,00,00"),
         ("l 99 bytes", '"%s"' % ("x" * 99)), ("m 100 bytes", '"%s"' % ("x" * 100)),
         ("n" * 29, '"fills its field"'), ("o" * 255, '"longest name"'),
-        ("p" * 256, '"ends the list"'), ("q", '"behind the end"'),
+        ("p" * 256, '"ends the list"'), ("q", '"after the end"'),
     ]
     copies = SOFTWARE + "ZEK\\ORX\\InstalledCopies\\"
     version = [("Last Modified Date", '"20260102"'), ("Modification", "dword:00000003"),
@@ -191,23 +183,21 @@ def regedit(side, option, name, *arguments):
 
 def load_registry(side, export):
     """Replaces the tool's keys by those of the export."""
-    with open(os.path.join(side.files, "remove.reg"), "w", encoding="ascii") as file:
-        file.write("REGEDIT4\n" + "".join("\n[-%s]\n" % key for key in TOOL_KEYS))
-    regedit(side, "/S", "remove.reg")
-    shutil.copy(export, os.path.join(side.files, "add.reg"))
-    regedit(side, "/S", "add.reg")
+    (side.files / "remove.reg").write_text(
+        "REGEDIT4\n" + "".join(f"\n[-{key}]\n" for key in TOOL_KEYS), encoding="ascii")
+    shutil.copy(export, side.files / "add.reg")
+    for name in ("remove.reg", "add.reg"):
+        regedit(side, "/S", name)
 
 
 def export_registry(side, path):
     """Writes the tool's keys as the registry orders them."""
-    texts = []
+    text = ""
     for key in TOOL_KEYS:
         regedit(side, "/E", "part.reg", key)
-        with open(os.path.join(side.files, "part.reg"), encoding="utf-16", newline="") as file:
-            texts.append(file.read())
-    header = texts[0].split("\r\n")[0]
-    with open(path, "w", encoding="utf-16", newline="") as file:
-        file.write("\r\n".join([texts[0]] + [text.replace(header, "", 1) for text in texts[1:]]))
+        header, keys = (side.files / "part.reg").read_bytes().decode("utf-16").split("\r\n", 1)
+        text = (text or header + "\r\n") + keys + "\r\n"
+    path.write_bytes(text.encode("utf-16"))
 
 
 # --- The histories ---
@@ -268,17 +258,15 @@ JAPANESE = [
 
 
 def outcome(side, outputs):
-    return "\n".join(outputs + list(side.tree()) + list(side.archive()))
+    return "\n".join([*outputs, *side.tree(), *side.archive()])
 
 
 def run_steps(side, steps):
     side.reset()
-    for name in ("sub", "表"):
-        os.makedirs(os.path.join(side.files, name))
     for name in ("setup.log", "sub/setup.log", "setup.rsp", "setup.trc", "ORXInstallEvent.Log",
                  "予定表.log", "表/予定表.log"):
-        with open(os.path.join(side.files, name), "w", encoding="utf-8") as file:
-            file.write("the installer's file of %d letters" % len(name))
+        (side.files / name).parent.mkdir(exist_ok=True)
+        (side.files / name).write_text(f"the installer's file of {len(name)} letters")
     return outcome(side, [side.run(step) for step in steps])
 
 
@@ -287,11 +275,10 @@ def run_section_names(side):
     texts = []
     for last in (227, 228, 229, 900):
         side.reset()
-        os.makedirs(side.history)
-        names = ["History"] + [letter * 999 for letter in "abcdefghij"]
-        names += ["z" * (last + 2), "behind"]
-        with open(os.path.join(side.history, "History.ini"), "w", encoding="ascii") as file:
-            file.writelines("[%s]\nAction=%d\n" % (name, len(name)) for name in names)
+        side.history.mkdir(parents=True)
+        names = ["History", *(letter * 999 for letter in "abcdefghij"), "z" * (last + 2), "after"]
+        (side.history / "History.ini").write_text(
+            "".join(f"[{name}]\nAction={len(name)}\n" for name in names))
         texts.append(outcome(side, [side.run(REPORT[0])]))
     return "\n".join(texts)
 
@@ -300,8 +287,8 @@ def run_overlapping(side):
     """Starts at once, then messages for one event at once, in the order that the system likes."""
     side.reset()
     results = []
-    for call in (lambda i: ["-start", str(i), "-Product", "P%d" % i],
-                 lambda i: ["-logmessage", "0", "-message", ("message %d " % i) * 1000]):
+    for call in (lambda i: ["-start", str(i), "-Product", f"P{i}"],
+                 lambda i: ["-logmessage", "0", "-message", f"message {i} " * 1000]):
         processes = [side.start(call(i)) for i in range(12)]
         results += [str((process.communicate()[0], process.returncode)) for process in processes]
     separators = {"History.ini": "\n[", "0/ORXInstallEvent.Log": "\n"}
@@ -312,25 +299,24 @@ def run_overlapping(side):
 
 
 def run_links(side):
-    """A link in place of the history folder, then of the maker's: nothing is written through it."""
+    """A link instead of the history folder, then of the maker's: nothing is written through it."""
     texts = []
-    target = os.path.join(side.files, "elsewhere")
+    target = side.files / "elsewhere"
     for linked in (side.history, side.maker):
         side.reset()
-        os.makedirs(os.path.join(target, "ORXHistory"))
-        kept = linked + ".kept"
-        if os.path.exists(linked):
-            os.rename(linked, kept)
-        os.symlink(target, linked)
+        (target / "ORXHistory").mkdir(parents=True)
+        kept = linked.with_suffix(".kept")
+        if linked.exists():
+            linked.rename(kept)
+        linked.symlink_to(target)
         try:
             texts += [side.run(step) for step in WHOLE_EVENT[:1] + REPORT]
         finally:
-            os.unlink(linked)
-            if os.path.exists(kept):
-                os.rename(kept, linked)
-        names = sorted(name for _, folders, files in os.walk(target) for name in folders + files)
-        texts.append("elsewhere: %s" % names)
-        assert names == ["ORXHistory"], names
+            linked.unlink()
+            if kept.exists():
+                kept.rename(linked)
+        names = sorted(path.name for path in target.rglob("*"))
+        check(names == ["ORXHistory"], f"made through the link: {names}")
     return "\n".join(texts)
 
 
@@ -347,94 +333,103 @@ def run_killed(side):
         process.kill()
         process.communicate()
     side.start(["-start", "last"]).communicate(timeout=60)
-    with open(os.path.join(side.history, "History.ini"), "rb") as file:
-        sections = history_lines(side.plain(file.read()))[1:].split("\n[")
-    assert sections[0] == "History]\nCount=%d" % (len(sections) - 1), sections
-    assert {section.count("\n") for section in sections[1:]} == {17}, sections
-    assert not [name for name in os.listdir(side.history) if name.startswith(".")]
+    text = side.plain((side.history / "History.ini").read_bytes())
+    sections = parse_history((history_lines(text) + "\n").encode(), has_whole_events=True)
+    check(sections["History"]["Count"] == str(len(sections) - 1), f"count of {list(sections)}")
+    check(not list(side.history.glob(".*")), "litter")
     return "whole"
 
 
 def read_archive(side, readers):
     """What both builds of the reader say of the side's archive, each in a text."""
-    folder = side.files
-
     def read(reader, *arguments):
         process = subprocess.run(
-            reader + ["--from", "out.zip", *arguments], cwd=folder, stdin=subprocess.DEVNULL,
+            reader + ["--from", "out.zip", *arguments], cwd=side.files, stdin=subprocess.DEVNULL,
             stdout=subprocess.PIPE, stderr=subprocess.DEVNULL, check=False)
         output = process.stdout.decode("utf-8").replace("\r\n", "\n")
-        return "%s\nresult %d: %s" % (arguments, process.returncode, output)
+        return process.returncode, output
 
-    events = [json.loads(line)["event"] for line in subprocess.run(
-        readers[1] + ["--from", "out.zip", "list", "--json"], cwd=folder, stdout=subprocess.PIPE,
-        check=True).stdout.splitlines()]
-    calls = [["list", "--json"], ["list"], ["check", "--json"], ["find", "--json", "e"]]
-    calls += [["show", "--json", "--", event] for event in dict.fromkeys(events)]
-    return ["\n".join(read(reader, *call) for call in calls) for reader in readers]
+    _, lines = read(readers[1], "list", "--json")
+    events = dict.fromkeys(json.loads(line)["event"] for line in lines.splitlines())
+    calls = [["list", "--json"], ["list"], ["check", "--json"], ["find", "--json", "e"],
+             *(["show", "--json", "--", event] for event in events)]
+    return ["\n".join("{}\nresult {}: {}".format(call, *read(reader, *call)) for call in calls)
+            for reader in readers]
 
 
 def same_texts(name, texts):
     texts = [text.split("\n") for text in texts]
     difference = list(difflib.unified_diff(*texts, "Windows", "Linux", lineterm="", n=2))
-    print("%-40s %s (%d lines)" % (name, "differs" if difference else "same", len(texts[0])))
+    print(f"{name:40} {'differs' if difference else 'same'} ({len(texts[0])} lines)")
     print("\n".join(difference[:60]), end="\n" if difference else "")
     return not difference
 
 
-def compare(name, run, windows, linux):
-    return same_texts(name, [run(side) for side in (windows, linux)])
+class Comparison:
+    """The two sides, and whether all that was compared is the same."""
 
+    def __init__(self, windows_program, linux_program, scratch):
+        drive = Path(os.environ["WINEPREFIX"]).absolute() / "drive_c"
+        root, files = scratch / "root", scratch / "files"
+        self.windows = Side([WINE, windows_program], "\\", "cp1252", drive / "ProgramData",
+                            "C:\\ProgramData", drive / "files", "C:\\files")
+        self.linux = Side([linux_program], "/", "utf-8", root, str(root), files, str(files))
+        self.linux.environment["ORX_COMMON_APPDATA"] = str(root)
+        self.sides = {"Windows": self.windows, "Linux": self.linux}
+        self.readers = [[WINE, windows_program.with_name("orxhistory.exe")],
+                        [linux_program.with_name("orxhistory")]]
+        self.export = self.linux.maker / "Registry.reg"
+        self.is_same = True
+        self.linux.maker.mkdir(parents=True, exist_ok=True)
+        for side in self.sides.values():
+            side.reset()
 
-def compare_readers(windows, linux, readers):
-    """Both builds of the reader over the archives that the scenario has left."""
-    return all([same_texts("  read, archive of " + system, read_archive(side, readers))
-                for system, side in (("Windows", windows), ("Linux", linux))
-                if os.path.exists(os.path.join(side.files, "out.zip"))])
+    def compare(self, name, run, *arguments):
+        texts = [run(side, *arguments) for side in self.sides.values()]
+        self.is_same = same_texts(name, texts) and self.is_same
+
+    def compare_readers(self):
+        """Both builds of the reader over the archives that the last scenario has left."""
+        for system, side in self.sides.items():
+            if (side.files / "out.zip").exists():
+                texts = read_archive(side, self.readers)
+                self.is_same = same_texts(f"  read, archive of {system}", texts) and self.is_same
+
+    def use_sample_machine(self):
+        """An export in UTF-8 is nothing that Windows knows; in the registry's own order it comes
+        back."""
+        sample = (REPOSITORY / "scripts/sample-machine/Registry.reg").read_text("utf-8")
+        self.export.write_text(sample, "utf-16", newline="\r\n")
+        load_registry(self.windows, self.export)
+        export_registry(self.windows, self.export)
+
+    def use_limits(self):
+        self.export.write_bytes(limits_export())
+        load_registry(self.windows, self.export)
+
+    def compare_japanese(self):
+        self.windows.environment["ORX_LOCALE"] = "ja_JP.UTF-8"
+        self.windows.encoding = "cp932"
+        self.compare("second bytes like separators", run_steps, JAPANESE)
+        del self.windows.environment["ORX_LOCALE"]
+        self.windows.encoding = "cp1252"
 
 
 def main():
-    windows_program, linux_program, scratch = map(os.path.abspath, sys.argv[1:])
-    drive = os.path.join(os.environ["WINEPREFIX"], "drive_c")
-    windows = Side([WINE, windows_program], {}, "\\", "cp1252", os.path.join(drive, "ProgramData"),
-                   "C:\\ProgramData", os.path.join(drive, "files"), "C:\\files")
-    root, files = os.path.join(scratch, "root"), os.path.join(scratch, "files")
-    linux = Side([linux_program], {"ORX_COMMON_APPDATA": root}, "/", "utf-8", root, root, files,
-                 files)
-    os.makedirs(linux.maker, exist_ok=True)
-    for side in (windows, linux):
-        side.reset()
-    export = os.path.join(linux.maker, "Registry.reg")
-
-    # An export in UTF-8 is nothing that Windows knows; in the registry's own order it comes back.
-    with open(os.path.join(HERE, "sample-machine", "Registry.reg"), encoding="utf-8") as file:
-        sample = file.read()
-    with open(export, "w", encoding="utf-16", newline="\r\n") as file:
-        file.write(sample)
-    load_registry(windows, export)
-    export_registry(windows, export)
-    readers = [[WINE, os.path.join(os.path.dirname(windows_program), "orxhistory.exe")],
-               [os.path.join(os.path.dirname(linux_program), "orxhistory")]]
-    same = [compare("the sample machine", lambda s: run_steps(s, WHOLE_EVENT), windows, linux),
-            compare_readers(windows, linux, readers)]
-
-    with open(export, "wb") as file:
-        file.write(limits_export())
-    load_registry(windows, export)
+    comparison = Comparison(*(Path(word).absolute() for word in sys.argv[1:]))
+    comparison.use_sample_machine()
+    comparison.compare("the sample machine", run_steps, WHOLE_EVENT)
+    comparison.compare_readers()
+    comparison.use_limits()
     for name, steps in SCENARIOS.items():
-        same.append(compare(name, lambda s: run_steps(s, steps), windows, linux))
-    same.append(compare_readers(windows, linux, readers))
-    same.append(compare("links in place of the folders", run_links, windows, linux))
-    windows.environment["ORX_LOCALE"] = "ja_JP.UTF-8"
-    windows.encoding = "cp932"
-    same.append(compare("second bytes like separators", lambda s: run_steps(s, JAPANESE), windows,
-                        linux))
-    del windows.environment["ORX_LOCALE"]
-    windows.encoding = "cp1252"
-    same.append(compare("section names at the limit", run_section_names, windows, linux))
-    same.append(compare("overlapping starts", run_overlapping, windows, linux))
-    same.append(compare("killed starts", run_killed, windows, linux))
-    return 0 if all(same) else 1
+        comparison.compare(name, run_steps, steps)
+    comparison.compare_readers()
+    comparison.compare_japanese()
+    for name, run in (("links instead of the folders", run_links),
+                      ("section names at the limit", run_section_names),
+                      ("overlapping starts", run_overlapping), ("killed starts", run_killed)):
+        comparison.compare(name, run)
+    return 0 if comparison.is_same else 1
 
 
 if __name__ == "__main__":

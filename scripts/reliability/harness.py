@@ -35,6 +35,19 @@ def digest(path):
     return status.st_mode, status.st_uid, status.st_gid, changed, content
 
 
+def contents(folder, pattern="*"):
+    """What is below a folder: the bytes of each file by its path there; none for a folder."""
+    return {str(path.relative_to(folder)): path.read_bytes() if path.is_file() else b""
+            for path in sorted(folder.rglob(pattern))}
+
+
+def injecting(call, fault, *options):
+    """Words before a run in which that system call has the fault, in strace's words. Without
+    --seccomp-bpf, with which strace injects no signal."""
+    return ("strace", "-f", "-qq", "-o", "/dev/null", "-e", f"trace={call}", "-e",
+            f"inject={call}:{fault}", *options)
+
+
 def as_nobody():
     """For preexec_fn: the run is another user's."""
     os.setgroups([])
@@ -120,6 +133,19 @@ class Machine(contextlib.ExitStack):
     def sections(self):
         return history.parse_history(self.ini.read_bytes())
 
+    def log_of(self, identity, copy):
+        """The only log of an event, which is beside the copy's folder or, after its end, in it."""
+        logs = [log for log in (self.history / identity / history.LOG,
+                                self.history / copy / identity / history.LOG) if log.exists()]
+        check(len(logs) == 1, f"{len(logs)} logs of {identity}")
+        return logs[0]
+
+    def check_report(self, **options):
+        """A report packs exactly what exists, without what begins with a dot."""
+        self.must("-report", str(self.archive), **options)
+        found, packed = contents(self.history, "[!.]*"), history.read_archive(self.archive)
+        check(found == packed, f"archive {difference(found, packed)}")
+
     def record(self, *names, copy="C1"):
         """Whole events, with the installer's log and a copy."""
         for name in names:
@@ -153,15 +179,13 @@ class Machine(contextlib.ExitStack):
         shutil.rmtree(self.root)
         shutil.copytree(self.scratch / name, self.root, symlinks=True)
 
-    def mount(self, size):
-        """Puts a small empty file system over the root; the history folder is made anew."""
-        done = subprocess.run(["mount", "-t", "tmpfs", "-o", f"size={size}", "orx-test", self.root],
+    def mount(self, folder, size):
+        """Puts a small empty file system over a folder."""
+        done = subprocess.run(["mount", "-t", "tmpfs", "-o", f"size={size}", "orx-test", folder],
                               check=False, stderr=subprocess.DEVNULL)
         if done.returncode != 0:
             raise Skipped("nothing can be mounted here")
-        self.callback(subprocess.run, ["umount", "--lazy", self.root], check=True)
-        self.history.mkdir(parents=True)
-        self.watch()
+        self.callback(subprocess.run, ["umount", "--lazy", folder], check=True)
 
 
 def shown(words):

@@ -8,23 +8,27 @@ import threading
 import time
 
 import history
-from harness import Machine, in_threads
+from harness import Machine, in_threads, injecting
 from history import check
 
 WORKERS = 16
-SHARED = 4
+SHARED = [f"shared{number}" for number in range(4)]
 COPIES = 5
 
 
 class Crowd:
-    """The workers of one round and what they know to be finished."""
+    """The workers of one round and what they know to be finished. Lists and sets only grow, by one
+    element at a time, which needs no lock."""
+
+    has_whole_events = True
 
     def __init__(self, machine, seconds):
         self.machine = machine
         self.until = time.monotonic() + seconds
-        self.lock = threading.Lock()
-        self.runs = self.killed = self.reports = self.looks = self.begun = 0
-        self.started, self.ended, self.attempted = set(), set(), set()
+        self.results, self.reports = [], []
+        self.looks = 0
+        self.begun, self.started, self.ending = set(SHARED), set(SHARED), set()
+        self.copies = {}  # event: copy, of the finished ends
         self.messages = {}  # event: texts of the finished runs
         self.cut = set()  # texts of the killed ones
 
@@ -37,39 +41,31 @@ class Crowd:
         """True for a run that finished."""
         before = self.before(chance)
         result, output = self.machine.run(*words, before=before, timeout=60)
-        with self.lock:
-            self.runs += 1
-            self.killed += result != 0
+        self.results.append(result)
         check(result == 0 or before, f"result {result}: {words} {output}")
         return result == 0
 
     def send(self, chance, event, text):
-        finished = self.run(chance, "-logmessage", event, "-message", text)
-        with self.lock:
-            if finished:
-                self.messages.setdefault(event, []).append(text)
-            else:
-                self.cut.add(text)
+        if self.run(chance, "-logmessage", event, "-message", text):
+            self.messages.setdefault(event, []).append(text)
+        else:
+            self.cut.add(text)
 
     def live(self, chance, worker, number):
         """One event from its start to its end."""
         event = f"{worker}-{number}"
-        with self.lock:
-            self.begun += 1
+        self.begun.add(event)
         if not self.run(chance, "-start", event, "-Product", f"P{event}"):
             return
-        with self.lock:
-            self.started.add(event)
+        self.started.add(event)
         self.send(chance, event, f"{event} own first")
         length = chance.choice((10, 100, 5000, 60000))
-        self.send(chance, f"shared{number % SHARED}", f"{event} {'x' * length} shared")
+        self.send(chance, SHARED[number % len(SHARED)], f"{event} {'x' * length} shared")
         self.send(chance, event, f"{event} own second")
         copy = f"C{chance.randrange(COPIES)}"
-        with self.lock:
-            self.attempted.add(event)
+        self.ending.add(event)
         if self.run(chance, "-end", event, "-CopyName", copy, "-Result", f"R{event}"):
-            with self.lock:
-                self.ended.add(event)
+            self.copies[event] = copy
         if number % 10 == worker % 10:
             self.report(chance, worker)
 
@@ -78,7 +74,7 @@ class Crowd:
         if self.run(chance, "-report", str(archive)):
             entries = history.read_archive(archive)
             history.parse_history(entries["History.ini"], has_whole_events=True)
-            self.reports += 1
+            self.reports.append(archive)
 
     def message_during_start(self, number):
         """A run appends a message while the start still writes the log."""
@@ -92,10 +88,8 @@ class Crowd:
         start.join()
         lines = log.read_text(errors="replace").splitlines()
         check(lines.count("early message") == 1, "a start wrote over a message")
-        with self.lock:
-            self.started.add(event)
-            self.begun += 1
-            self.runs += 2
+        self.begun.add(event)
+        self.started.add(event)
 
     def work(self, outcome, worker):
         chance = random.Random(worker)
@@ -106,18 +100,14 @@ class Crowd:
 
     def read(self, outcome):
         while time.monotonic() < self.until:
-            outcome.attempt("overlap, reader", self.look)
+            outcome.attempt("overlap, reader", lambda: history.parse_history(
+                self.machine.ini.read_bytes(), self.has_whole_events))
             self.looks += 1
             time.sleep(0.01)
 
-    def look(self):
-        history.parse_history(self.machine.ini.read_bytes(), has_whole_events=True)
-
     def go(self, outcome):
-        for number in range(SHARED):
-            self.machine.must("-start", f"shared{number}")
-        self.started |= {f"shared{number}" for number in range(SHARED)}
-        self.begun += SHARED
+        for event in SHARED:
+            self.machine.must("-start", event)
         for number in range(10):
             outcome.attempt("overlap, early message", lambda n=number: self.message_during_start(n))
         in_threads([(self.work, outcome, worker) for worker in range(WORKERS)]
@@ -131,48 +121,40 @@ class Crowd:
         for event in self.started:
             for check_part in self.check_event, self.check_log:
                 outcome.attempt(f"overlap, event {event}",
-                                lambda f=check_part, e=event: f(sections, e))
+                                lambda f=check_part, e=event: f(sections.get(e), e))
         outcome.attempt("overlap, last report", self.check_last_report)
 
     def check_count(self, sections):
         count = int(sections["History"]["Count"])
-        check(len(self.started) <= count <= self.begun,
-              f"count {count}, finished {len(self.started)}, begun {self.begun}")
+        check(len(self.started) <= count <= len(self.begun),
+              f"count {count}, finished {len(self.started)}, begun {len(self.begun)}")
 
-    def check_event(self, sections, event):
-        check(event in sections, "lost section")
-        keys = sections[event]
-        check(keys["Complete_Flag"] == "TRUE" or event not in self.ended, "lost end")
-        check(keys["Complete_Flag"] == "FALSE" or event in self.attempted, "strange end")
-        if "-" in event:
-            check(keys["Product"] == f"P{event}", "lost product")
+    def check_event(self, keys, event):
+        check(keys, "lost section")
+        check(keys["Complete_Flag"] == "TRUE" or event not in self.copies, "lost end")
+        check(keys["Complete_Flag"] == "FALSE" or event in self.ending, "strange end")
+        check(keys["Product"] == f"P{event}" or "-" not in event, "lost product")
 
-    def log_of(self, keys, event):
-        """The log's file, which a killed end may have moved without turning the key."""
-        places = [folder / event / history.LOG for folder in
-                  (self.machine.history, self.machine.history / (keys["Copy_Name"] or "none"))]
-        found = [place for place in places if place.exists()]
-        check(len(found) == 1, f"{len(found)} logs")
-        check(event not in self.ended or str(found[0]) == keys["Event_Log_File"], "key of place")
-        return found[0]
-
-    def check_log(self, sections, event):
-        lines = self.log_of(sections[event], event).read_text(errors="replace").splitlines()
-        check(event not in self.ended or "( End )" in lines[-1], "log does not end")
+    def check_log(self, keys, event):
+        log = self.machine.log_of(event, keys["Copy_Name"] or "none")
+        lines = log.read_text(errors="replace").splitlines()
+        if event in self.copies:
+            check(str(log) == keys["Event_Log_File"], "the key names another log")
+            check("( End )" in lines[-1], "log does not end")
         sent = self.messages.get(event, [])
         found = [self.without_remains(line, sent) for line in lines
                  if line.endswith((" own first", " own second", " shared"))]
         check(sorted(line for line in found if line not in self.cut) == sorted(sent),
               "messages lost, torn or doubled")
         check(len(found) == len(set(found)), "a message twice")
-        check(event.startswith("shared") or [m for m in found if m in sent] == sent, "order")
+        check(event in SHARED or [m for m in found if m in sent] == sent, "order")
         check(not any("own first" in line or " own second" in line or "xxx" in line
                       for line in lines if line not in found
                       and not any(text.startswith(line) for text in self.cut)), "torn message")
 
     def without_remains(self, line, sent):
-        """The line without the beginning of a message whose run was killed in the middle of it:
-        the next one stands directly behind."""
+        """The line without the beginning of a message whose run was killed in the middle of it: the
+        next one follows on the same line."""
         if line in sent or line in self.cut:
             return line
         for text in sent:
@@ -182,20 +164,15 @@ class Crowd:
         return line
 
     def check_last_report(self):
-        archive = self.machine.scratch / "last.zip"
-        self.machine.must("-report", str(archive), timeout=120)
-        entries = history.read_archive(archive)
-        check(entries["History.ini"] == self.machine.ini.read_bytes(), "history in the archive")
-        temporary = self.machine.history / ".History.tmp"
+        self.machine.check_report(timeout=120)
         self.machine.must("-start", "after")
-        check(not temporary.exists(), "litter")
+        check(not (self.machine.history / ".History.tmp").exists(), "litter")
 
 
 class UndisturbedCrowd(Crowd):
     def check_count(self, sections):
-        count = int(sections["History"]["Count"])
-        check(count == len(self.started) == self.begun, f"count {count} of {self.begun}")
-        check(set(sections) == self.started | {"History"}, "sections")
+        check(self.started == self.begun == set(sections) - {"History"}, "sections")
+        check(int(sections["History"]["Count"]) == len(self.begun), "count")
         check(not list(self.machine.history.rglob(".*")), "litter")
 
 
@@ -209,25 +186,20 @@ class KilledCrowd(Crowd):
 class UnlockedCrowd(Crowd):
     """Runs may undo each other's changes here: only what each leaves must be whole."""
 
+    has_whole_events = False
+
     def before(self, chance):
         # The delay, in microseconds, leaves a new file empty for so long.
-        return ("strace", "-f", "--seccomp-bpf", "-o", "/dev/null", "-e", "trace=flock,fchmod",
-                "-e", "inject=flock:error=ENOLCK", "-e", "inject=fchmod:delay_enter=3000")
+        return injecting("flock", "error=ENOLCK", "-e", "trace=flock,fchmod",
+                         "-e", "inject=fchmod:delay_enter=3000")
 
     def live(self, chance, worker, number):
         event = f"{worker}-{number}"
         self.run(chance, "-start", event)
         self.run(chance, "-end", event, "-CopyName", "C")
 
-    def go(self, outcome):
-        self.machine.must("-start", "first")
-        super().go(outcome)
-
     def message_during_start(self, number):
         pass
-
-    def look(self):
-        self.machine.sections()
 
     def judge(self, outcome):
         outcome.attempt("overlap, history", self.machine.sections)
@@ -242,5 +214,7 @@ def attack_together(program, outcome, seconds, _):
         with Machine(program) as machine:
             crowd = kind(machine, seconds * share)
             crowd.go(outcome)
-        print(f"overlap, {name}: {crowd.runs} runs, {crowd.killed} of them killed, {crowd.reports} "
-              f"archives and {crowd.looks} histories read meanwhile", flush=True)
+        killed = len(crowd.results) - crowd.results.count(0)
+        print(f"overlap, {name}: {len(crowd.results)} runs, {killed} of them killed, "
+              f"{len(crowd.reports)} archives and {crowd.looks} histories read meanwhile",
+              flush=True)

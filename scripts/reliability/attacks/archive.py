@@ -2,15 +2,14 @@
 
 import contextlib
 import os
-import socket
 import stat
 import subprocess
 import time
 
 import history
-from harness import Skipped, attack
+from harness import attack, injecting
 from history import check
-from planted import RUNS, run_any
+from planted import RUNS, listen, run_any
 
 OLDER = b"an older archive"
 
@@ -51,11 +50,6 @@ def archive_in_the_history(machine):
     os.link(inside, machine.history / "other zip")
     machine.must("-report", str(machine.history / "C1/../C1/history.zip"))
     check(not [name for name in history.read_archive(inside) if "zip" in name], "holds the older")
-
-
-def listen(path):
-    with socket.socket(socket.AF_UNIX) as listener:
-        listener.bind(str(path))
 
 
 @attack(
@@ -164,11 +158,7 @@ def archive_on_a_full_disk(machine, room):
     """The disk of the archive has only that room."""
     machine.record("7")
     (machine.history / "big").write_bytes(os.urandom(2 << 20))
-    mounted = subprocess.run(["mount", "-t", "tmpfs", "-o", "size=4m", "orx-test",
-                              machine.archives], check=False, stderr=subprocess.DEVNULL)
-    if mounted.returncode != 0:
-        raise Skipped("nothing can be mounted here")
-    machine.callback(subprocess.run, ["umount", "--lazy", machine.archives], check=True)
+    machine.mount(machine.archives, "4m")
     machine.archive.write_bytes(OLDER)
     (machine.archives / "filler").write_bytes(bytes((4 << 20) - 4096 - room))
     check_older_stays(machine)
@@ -204,12 +194,6 @@ def link_in_place_of_the_temporary_file_of(machine, beginning, result):
     check(not links, f"renamed: {links}")
 
 
-def slowed(call, microseconds):
-    """Words before a run that make each such call of it take that time before it begins."""
-    return ("strace", "-f", "-qq", "-o", "/dev/null", "-e", f"trace={call}",
-            "-e", f"inject={call}:delay_enter={microseconds}")
-
-
 @attack(("packed", "C1/7/growing", "read"), ("collected", "../../../setup.log", "sendfile"))
 def file_that_grows_while_it_is(machine, name, call):
     """Somebody appends to it all the time, faster than it is read."""
@@ -219,7 +203,7 @@ def file_that_grows_while_it_is(machine, name, call):
     machine.callback(writer.wait)
     machine.callback(writer.kill)
     wait_for(path.exists, "does not grow")
-    machine.must("-report", str(machine.archive), before=slowed(call, 200000))
+    machine.must("-report", str(machine.archive), before=injecting(call, "delay_enter=200000"))
     writer.kill()
     machine.watch()
     entries = history.read_archive(machine.archive)
@@ -233,7 +217,7 @@ def containers_with_equal_process_numbers(machine):
     processes = []
     for call, microseconds in (("renameat2", 1000000), ("sendfile", 2000000)):
         archive = machine.archives / call
-        before = ("unshare", "--pid", "--fork", *slowed(call, microseconds))
+        before = ("unshare", "--pid", "--fork", *injecting(call, f"delay_enter={microseconds}"))
         processes.append((machine.start("-report", str(archive), before=before), archive))
         time.sleep(0.3)
     for process, archive in processes:

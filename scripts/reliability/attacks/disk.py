@@ -10,7 +10,9 @@ from history import check
 @attack(needs_root=True)
 def full_disk(machine):
     """A small file system with less and less room."""
-    machine.mount("512k")
+    machine.mount(machine.root, "512k")
+    machine.history.mkdir(parents=True)
+    machine.watch()
     machine.must("-start", "7")
     filler = machine.root / "filler"
     for room in (0, 4096, 8192, 12288, 20480, 65536):

@@ -6,13 +6,8 @@ import stat
 import time
 
 import history
-from harness import attack
+from harness import attack, injecting
 from history import check
-
-
-def injecting(call, fault):
-    return ("strace", "-f", "-o", "/dev/null", "-e", f"trace={call}",
-            "-e", f"inject={call}:{fault}")
 
 
 @attack(*((call, call) for call in ("fchown", "fchmod")))
@@ -42,8 +37,8 @@ def refused_by_the_file_system(machine, call, error, mode):
 @attack(*((name, name) for name in ("Summary.txt", "C1/Summary.txt")))
 def interrupted_opening_of(machine, name):
     machine.record("7")
-    machine.must("-report", str(machine.archive), before=(
-        *injecting("openat", "error=EINTR:when=1+2"), "-P", machine.history / name))
+    machine.must("-report", str(machine.archive), before=injecting(
+        "openat", "error=EINTR:when=1+2", "-P", machine.history / name))
     check(history.read_archive(machine.archive).get(name), "no summary")
 
 
