@@ -84,7 +84,10 @@ class UnitQuery {
 };
 
 int UnitQuery::Ask() {
-  const int opened = Library.OpenSystem(&Bus);
+  int opened = 0;
+  do {
+    opened = Library.OpenSystem(&Bus);
+  } while (opened == -EINTR);
   if (opened < 0) {
     return opened;
   }
