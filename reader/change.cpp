@@ -164,7 +164,7 @@ class ChangeWriter {
   static size_t BytesOf(const Change& change) {
     size_t bytes = sizeof change + change.Name.capacity();
     for (const std::string& part : change.Path) {
-      bytes += sizeof part + part.capacity();
+      bytes += sizeof(std::string) + part.capacity();
     }
     for (const FieldChange& field : change.Fields) {
       bytes += sizeof field + (field.Before ? field.Before->size() : 0) +

@@ -18,6 +18,6 @@ else
   git ls-files 'app/*.cpp' 'history/*.cpp' 'eventlog/*.cpp' 'inventory/*.cpp' 'products/*.cpp' \
     'report/*.cpp' 'reader/*.cpp' 'platform/*.cpp' ':!platform/windows' |
     xargs -P "$(nproc)" -n 4 clang-tidy -p build/release --quiet \
-      --extra-arg=-Wno-unknown-warning-option --extra-arg=-Xclang --extra-arg=-analyzer-config \
+      --extra-arg=-Wno-unknown-warning-option --extra-arg=-fno-caret-diagnostics --extra-arg=-Xclang --extra-arg=-analyzer-config \
       --extra-arg=-Xclang --extra-arg=mode=shallow
 fi
