@@ -118,20 +118,29 @@ TEST_F(Run, FailsWhenTheArchiveIsFull) {
   fs::remove_all(memory);
 }
 
+// The events of an inotify watch so far: their masks, and the names in the watched folder or "".
+std::vector<std::pair<uint32_t, std::string>> EventsOf(int watch) {
+  std::vector<std::pair<uint32_t, std::string>> events;
+  alignas(inotify_event) char buffer[4096];
+  const ssize_t size = ::read(watch, buffer, sizeof buffer);
+  for (ssize_t offset = 0; offset < size;) {
+    const auto* event = reinterpret_cast<const inotify_event*>(buffer + offset);
+    events.emplace_back(event->mask, event->len == 0 ? "" : event->name);
+    offset += static_cast<ssize_t>(sizeof *event + event->len);
+  }
+  ::close(watch);
+  return events;
+}
+
 // Through a temporary file that a report does not pack, if the run is killed.
 TEST_F(Run, ReplacesTheHistoryFileOnceForAStart) {
   const int watch = ::inotify_init1(IN_NONBLOCK);
   ASSERT_GE(::inotify_add_watch(watch, History.c_str(), IN_CREATE | IN_MOVED_TO), 0);
   EXPECT_EQ(Call("-start 7"), 0);
   std::string names;
-  alignas(inotify_event) char buffer[4096];
-  const ssize_t size = ::read(watch, buffer, sizeof buffer);
-  for (ssize_t offset = 0; offset < size;) {
-    const auto* event = reinterpret_cast<const inotify_event*>(buffer + offset);
-    names += std::string(event->name) + ' ';
-    offset += static_cast<ssize_t>(sizeof *event + event->len);
+  for (const auto& [mask, name] : EventsOf(watch)) {
+    names += name + ' ';
   }
-  ::close(watch);
   EXPECT_EQ(names, "7 .History.tmp History.ini ");
 }
 
@@ -144,16 +153,11 @@ TEST_F(Run, ClosesALogBeforeItIsMoved) {
   ASSERT_GE(::inotify_add_watch(watch, History.c_str(), IN_MOVED_FROM | IN_ONLYDIR), 0);
   EXPECT_EQ(Call("-end 7 -CopyName C1"), 0);
   std::vector<uint32_t> events;
-  alignas(inotify_event) char buffer[4096];
-  const ssize_t size = ::read(watch, buffer, sizeof buffer);
-  for (ssize_t offset = 0; offset < size;) {
-    const auto* event = reinterpret_cast<const inotify_event*>(buffer + offset);
-    if (event->len == 0 || std::string(event->name) == "7") {
-      events.push_back(event->mask & (IN_CLOSE_WRITE | IN_MOVED_FROM));
+  for (const auto& [mask, name] : EventsOf(watch)) {
+    if (name.empty() || name == "7") {
+      events.push_back(mask & (IN_CLOSE_WRITE | IN_MOVED_FROM));
     }
-    offset += static_cast<ssize_t>(sizeof *event + event->len);
   }
-  ::close(watch);
   EXPECT_EQ(events, (std::vector<uint32_t>{IN_CLOSE_WRITE, IN_MOVED_FROM}));
 }
 
