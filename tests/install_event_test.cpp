@@ -140,7 +140,8 @@ TEST(InstallEvent, HasRecordedItsStartBeforeTheSnapshot) {
   };
   EXPECT_EQ(RunTool({"-start", "1"}), 0);
   EXPECT_EQ(during, HistoryText(scratch));
-  EXPECT_NE(FileText(InHistory("1/ORXInstallEvent.Log")).find("\nof another run\n"), during.npos);
+  const std::string log = scratch.Neutral(FileText(InHistory("1/ORXInstallEvent.Log")));
+  EXPECT_NE(log.find("\nof another run\n"), log.npos);
 }
 
 // Notes whether a guard of the history file exists when a text is flushed: what is written under a
