@@ -1,4 +1,4 @@
-# orx_header_libraries: nlohmann-json and CLI11, which are headers alone, for the reader. A
+# orx_header_libraries: nlohmann-json and CLI11, which consist of headers only, for the reader. A
 # cross-build uses those of this system, and must not see its other headers.
 add_library(orx_header_libraries INTERFACE)
 

@@ -8,8 +8,8 @@
 // itself. The name of a group, of a member or of a user without a domain that needs more than 128
 // bytes with its terminator is returned as an empty text.
 //
-// All of them together take at most ten seconds in a run. After that the user is unknown if it was
-// not known by then, and nothing is listed. POSIX: a child process queries the name service once,
+// All calls together wait at most ten seconds in a run. After that a user who is not known yet
+// stays unknown, and the lists are empty. POSIX: a child process queries the name service once,
 // and all functions below use its result: a list that was not complete by then is empty. The server
 // is ignored.
 

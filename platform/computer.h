@@ -4,8 +4,6 @@
 #include <optional>
 #include <string>
 
-// What machine and system this is.
-
 // The machine's short (NetBIOS) name; nothing if it is empty or has more than 14 bytes.
 // Windows: GetComputerNameA with a size of 15. POSIX: the host name (uname) up to its first dot.
 std::optional<std::string> ShortComputerName();

@@ -2,6 +2,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
 
 // A regular file opened for reading, for as long as the object lives. On Windows nobody else may
@@ -16,18 +17,20 @@ class ExclusiveFile {
   ExclusiveFile(const ExclusiveFile&) = delete;
   ExclusiveFile& operator=(const ExclusiveFile&) = delete;
 
-  bool IsOpen() const;
+  bool IsOpen() const { return Opened != nullptr; }
 
   // In bytes, when it was opened; 0 without an open file.
   uint64_t Size() const { return SizeInBytes; }
 
-  // Fills at most size bytes of the buffer with the next ones of the file and returns how many; 0
-  // at the end, after a failure and without an open file. The end is where it was when the file was
-  // opened: a file that grows all the time has one, too.
+  // Reads the next bytes of the file, at most size of them, into the buffer and returns how many: 0
+  // at the end, after a failure and without an open file. What is appended after the opening is not
+  // read, so that a file that grows all the time has an end.
   size_t Read(char* buffer, size_t size);
 
  private:
-  intptr_t Handle = -1;
+  struct State;  // the system's handle of the file
+
+  std::unique_ptr<State> Opened;  // null without an open file
   uint64_t SizeInBytes = 0;
   uint64_t Offset = 0;
 };

@@ -40,7 +40,7 @@ bool MoveFolder(const std::string& source, const std::string& target);
 
 // Copies a regular file to a name that nothing has yet, with its last-write time and permissions
 // (Windows: attributes) where the file system can. A source that grows is copied up to the size
-// that it had when it was opened. The target appears whole or not at all: it is a TemporaryFile
+// that it had when it was opened. The target appears complete or not at all: it is a TemporaryFile
 // until then. False if anything of the target's name exists (a dangling link too) or the contents
 // cannot be copied.
 // Windows: ReadFile, WriteFile, SetFileTime, SetFileAttributesA; a source that is in use is waited

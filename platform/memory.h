@@ -1,7 +1,6 @@
 #pragma once
 
-// From here on, memory that the process frees is kept for what it needs next. Without that, a loop
-// that takes and frees some hundred kilobytes each time may get them from the system, page by page,
-// each time.
-// Windows: nothing. POSIX: mallopt.
+// From here on the process keeps the memory that it frees and uses it again. Otherwise a loop that
+// allocates and frees some hundred kilobytes may get them from the system, page by page, each time.
+// Windows: does nothing. POSIX: mallopt.
 void KeepFreedMemory();

@@ -1,31 +1,33 @@
 #pragma once
 
-#include <cstdint>
+#include <memory>
 #include <string>
 #include <string_view>
 
-// A file that the object makes, under a name that nothing has yet, and writes once from its
-// beginning to its end. Only its owner may read it (POSIX: mode 0600; Windows: default security).
-// What was not finished is removed with the object.
-// Windows: CreateFileA with CREATE_NEW. POSIX: open with O_EXCL.
+// A new file that is written once from its beginning to its end. Only its owner may read it (POSIX:
+// mode 0600; Windows: the security that new files inherit from the folder). The destructor removes
+// it unless it was finished.
+// Windows: CreateFileA with CREATE_NEW, WriteFile. POSIX: open with O_EXCL, write.
 class NewFile {
  public:
-  // Not open if anything of that name exists (a link that leads nowhere too), if the folder is
-  // missing, or if the name is that of a device.
+  // Not open if anything of that name exists (a dangling link too), if the folder is missing, or if
+  // the name is that of a device.
   explicit NewFile(const std::string& path);
   ~NewFile();
   NewFile(const NewFile&) = delete;
   NewFile& operator=(const NewFile&) = delete;
 
-  bool IsOpen() const;
+  bool IsOpen() const { return Opened != nullptr; }
 
-  // False if not all bytes were written.
+  // Appends the bytes. False if not all of them were written, or without an open file.
   bool Write(std::string_view bytes);
 
-  // Closes the file, which stays from then on. False if it was not open or could not be closed.
+  // Closes the file and keeps it. False without an open file, or if closing it fails.
   bool Finish();
 
  private:
+  struct State;  // the system's handle of the file
+
   std::string Path;
-  intptr_t Handle = -1;
+  std::unique_ptr<State> Opened;  // null without an open file
 };

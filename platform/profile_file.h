@@ -10,7 +10,7 @@
 // Every operation is one complete access to the named file: what one process writes, the next read
 // of any process sees. No argument may contain a line break or a NUL.
 //
-// A write replaces the whole file in one step, so that a reader never meets half of it. The
+// A write replaces the file in one step, so that a reader never sees half of it. The
 // temporary file is in the same folder, its name begins with a dot, and it can be read by nobody
 // who may not read the file itself; the new file has the permissions of the old one.
 // Windows: the system's profile calls; to write, they change a copy, which then replaces the file.
@@ -33,8 +33,8 @@ std::string ReadProfileValue(const std::string& path, const std::string& section
 bool WriteProfileValue(const std::string& path, const std::string& section, const std::string& key,
                        const std::string& value);
 
-// The whole number that a value begins with: blanks, a plus or minus sign or none, and decimal
-// digits, or hexadecimal ones after "0x", octal after "0o", binary after "0b". Of a number of more
+// The integer that a value begins with: blanks, a plus or minus sign or none, and decimal digits,
+// or hexadecimal ones after "0x", octal after "0o", binary after "0b". Of a number of more
 // than 32 bits the lowest 32. 0 if there is no digit. The fallback if the value is empty, does not
 // exist or cannot be read. Windows: GetPrivateProfileIntA.
 int32_t ReadProfileInt(const std::string& path, const std::string& section, const std::string& key,
@@ -54,10 +54,10 @@ std::string ReadProfileSectionNames(const std::string& path, uint32_t size);
 // that was changed is replaced once, with all that was written to it; if that fails, with nothing.
 //
 // A guard waits for other processes, but all guards of this process together at most ten seconds.
-// After that each takes the lock only if it is free, and else does nothing: then this process may
-// undo a change that another one makes at the same time. The same holds on a file system without
+// After that each takes the lock only if it is free. Without the lock this process may undo a
+// change that another one makes at the same time. The same holds on a file system without
 // locks, and for a folder that does not exist.
-// Windows: a named mutex of the whole machine, which reads take as well. POSIX: flock on the
+// Windows: a named mutex that all sessions share, which reads take as well. POSIX: flock on the
 // folder.
 class ProfileGuard {
  public:

@@ -63,5 +63,5 @@ class ProfileText {
 
   std::string Text;
   std::vector<Section> Sections;
-  mutable size_t LastFound = 0;  // most calls ask for the same section as the call before
+  mutable size_t LastFound = 0;  // most calls name the same section as the one before
 };

@@ -10,9 +10,9 @@
 // the registry stores them. What cannot be opened is empty.
 //
 // Windows: RegOpenKeyExA, RegQueryValueExA, RegEnumValueA, RegEnumKeyExA, RegCloseKey.
-// POSIX: the registry export ZEK/Registry.reg below the common application data folder, opened with
-// the first question and read once for each part of the registry that is asked for; so a run sees
-// one state of it. Only the letters A to Z have two cases. docs/registry-export.md has its format.
+// POSIX: the registry export ZEK/Registry.reg below the common application data folder. It is
+// opened by the first query, so that a run sees one state of it, and read once for each branch that
+// is queried. Only the letters A to Z have two cases. docs/registry-export.md has its format.
 
 inline constexpr uint32_t kRegistryText = 1;    // REG_SZ
 inline constexpr uint32_t kRegistryNumber = 4;  // REG_DWORD

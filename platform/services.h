@@ -5,8 +5,6 @@
 #include <string>
 #include <vector>
 
-// The services of the machine.
-
 struct ServiceEntry {
   std::string ServiceName;
   std::string DisplayName;
@@ -20,12 +18,12 @@ struct ServiceListing {
   std::vector<ServiceEntry> Entries;
 };
 
-// The services in the system's order.
+// The machine's services in the system's order.
 // Windows: OpenSCManagerA with access 0xF003F and EnumServicesStatusA for all Win32 services,
 // running or not.
 // POSIX: ListUnits of systemd over the system bus, through libsystemd, looked up at run time. These
 // are the service units that systemd has in memory: all that run or have failed, and those stopped
 // ones that another unit refers to; a stopped unit that nothing refers to is missing. Units with
 // the load state "not-found" are left out.
-// The whole takes at most the limit; after that, the error is ERROR_TIMEOUT (Windows) or ETIMEDOUT.
+// It returns after at most the limit; then the error is ERROR_TIMEOUT (Windows) or ETIMEDOUT.
 ServiceListing ListServices(std::chrono::milliseconds limit);

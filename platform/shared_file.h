@@ -2,6 +2,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
 
 enum class LinkPolicy { kFollow, kRefuse };
@@ -18,16 +19,18 @@ class SharedFile {
   SharedFile(const SharedFile&) = delete;
   SharedFile& operator=(const SharedFile&) = delete;
 
-  bool IsOpen() const;
+  bool IsOpen() const { return Opened != nullptr; }
 
   // In bytes, when it was opened; 0 without an open file.
   uint64_t Size() const { return SizeInBytes; }
 
-  // Fills at most size bytes of the buffer from the offset on and returns how many; fewer than
-  // asked at the end of the file, after a failure, and without an open file.
+  // Reads at most size bytes from the offset on into the buffer and returns how many: fewer at the
+  // end of the file and after a failure, 0 without an open file.
   size_t ReadAt(uint64_t offset, char* buffer, size_t size) const;
 
  private:
-  intptr_t Handle = -1;
+  struct State;  // the system's handle of the file
+
+  std::unique_ptr<State> Opened;  // null without an open file
   uint64_t SizeInBytes = 0;
 };

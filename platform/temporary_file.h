@@ -3,7 +3,7 @@
 #include <string>
 
 // A file that is written under a temporary name and then renamed to its target in one step, so that
-// nobody sees it half written. The constructor creates it empty, in the folder of its target, with
+// no reader sees half of it. The constructor creates it empty, in the folder of its target, with
 // an unused name from RandomPathBeside. Only its owner may read it (POSIX: mode 0600; Windows: the
 // security that new files inherit from the folder). The destructor removes it unless it was
 // renamed. A killed process leaves it under its temporary name, which begins with a dot.
@@ -17,7 +17,7 @@ class TemporaryFile {
   // False if the file could not be created; then both operations below return false.
   bool Exists() const { return !Name.empty(); }
 
-  // The path to write to. Whoever does so closes the file before one of the operations below.
+  // The path to write to; close what was opened there before one of the operations below.
   const std::string& Path() const { return Name; }
 
   // Forces the data to the disk, as far as the file system can, and renames the file over its

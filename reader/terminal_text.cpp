@@ -1,8 +1,9 @@
 #include "reader/terminal_text.h"
 
 #include <algorithm>
-#include <cstdint>
 #include <iterator>
+
+#include "platform/utf8.h"
 
 namespace {
 
@@ -25,18 +26,6 @@ bool IsIn(const Range (&ranges)[count], char32_t character) {
   return std::any_of(std::begin(ranges), std::end(ranges), [character](const Range& range) {
     return character >= range.First && character <= range.Last;
   });
-}
-
-// The first character of a valid text that is not empty, which is shortened by it.
-char32_t TakeCharacter(std::string_view& text) {
-  const auto first = static_cast<uint8_t>(text.front());
-  const size_t length = first < 0x80 ? 1 : first < 0xE0 ? 2 : first < 0xF0 ? 3 : 4;
-  char32_t character = length == 1 ? first : first & (0x7FU >> length);
-  for (const char c : text.substr(1, length - 1)) {
-    character = (character << 6) | (static_cast<uint8_t>(c) & 0x3F);
-  }
-  text.remove_prefix(std::min(length, text.size()));
-  return character;
 }
 
 size_t ColumnsOfCharacter(char32_t character) {

@@ -4,6 +4,8 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "platform/utf8.h"
+
 static bool IsAscii(std::string_view text) {
   return std::all_of(text.begin(), text.end(), [](char c) { return (c & 0x80) == 0; });
 }
@@ -67,22 +69,9 @@ std::string Shortened(std::string_view text, size_t most) {
   return std::string(kept) + (kept.size() < text.size() ? "\u2026" : "");
 }
 
-static void AppendUtf8(std::string& text, char16_t character) {
-  if (character < 0x80) {
-    text += static_cast<char>(character);
-  } else if (character < 0x800) {
-    text += static_cast<char>(0xC0 | (character >> 6));
-    text += static_cast<char>(0x80 | (character & 0x3F));
-  } else {
-    text += static_cast<char>(0xE0 | (character >> 12));
-    text += static_cast<char>(0x80 | ((character >> 6) & 0x3F));
-    text += static_cast<char>(0x80 | (character & 0x3F));
-  }
-}
-
 static std::string FromWindows1252(std::string_view raw) {
   // The characters of 0x80 to 0x9F; the others are those of Unicode.
-  constexpr char16_t special[] = {0x20AC, 0xFFFD, 0x201A, 0x0192, 0x201E, 0x2026, 0x2020, 0x2021,
+  constexpr char32_t special[] = {0x20AC, 0xFFFD, 0x201A, 0x0192, 0x201E, 0x2026, 0x2020, 0x2021,
                                   0x02C6, 0x2030, 0x0160, 0x2039, 0x0152, 0xFFFD, 0x017D, 0xFFFD,
                                   0xFFFD, 0x2018, 0x2019, 0x201C, 0x201D, 0x2022, 0x2013, 0x2014,
                                   0x02DC, 0x2122, 0x0161, 0x203A, 0x0153, 0xFFFD, 0x017E, 0x0178};
@@ -90,7 +79,7 @@ static std::string FromWindows1252(std::string_view raw) {
   text.reserve(raw.size() + raw.size() / 4);
   for (const char c : raw) {
     const auto byte = static_cast<uint8_t>(c);
-    AppendUtf8(text, byte >= 0x80 && byte < 0xA0 ? special[byte - 0x80] : char16_t{byte});
+    AppendUtf8(text, byte >= 0x80 && byte < 0xA0 ? special[byte - 0x80] : char32_t{byte});
   }
   return text;
 }

@@ -19,6 +19,11 @@ inline Descriptor OpenFile(const std::string& path, int flags, mode_t mode = 0) 
       RetryOnInterrupt([&] { return ::open(path.c_str(), flags | O_CLOEXEC, mode); }));
 }
 
+// Creates a file, for reading and writing, under a name that nothing has, not even a link.
+inline Descriptor CreateNew(const std::string& path, mode_t mode) {
+  return OpenFile(path, O_RDWR | O_CREAT | O_EXCL, mode);
+}
+
 enum class Links { kFollow, kNoFollow };
 
 // The status of the file at the path; with kNoFollow that of a symbolic link itself.
@@ -29,6 +34,18 @@ inline bool StatusOf(const std::string& path, Links links, struct stat& status) 
 
 inline bool StatusOf(const Descriptor& file, struct stat& status) {
   return RetryOnInterrupt([&] { return ::fstat(file.Get(), &status); }) == 0;
+}
+
+// Opens a regular file for reading and returns its status too. Anything else is not opened
+// (EINVAL), and the attempt does not wait, as without O_NONBLOCK it would for the writer of a pipe.
+inline Descriptor OpenRegularFile(const std::string& path, Links links, struct stat& status) {
+  const int linkFlag = links == Links::kNoFollow ? O_NOFOLLOW : 0;
+  Descriptor file = OpenFile(path, O_RDONLY | O_NONBLOCK | linkFlag);
+  if (file.IsOpen() && (!StatusOf(file, status) || !S_ISREG(status.st_mode))) {
+    file.Reset(-1);
+    errno = EINVAL;
+  }
+  return file;
 }
 
 inline bool RenameOver(const std::string& source, const std::string& target) {

@@ -86,17 +86,17 @@ static bool CopyContents(const Descriptor& source, const struct stat& status,
   return true;
 }
 
-static Descriptor OpenSource(const std::string& source, const std::string& trusted) {
+static Descriptor OpenSource(const std::string& source, const std::string& trusted,
+                             struct stat& status) {
   const OwnerRights rights(trusted);
-  // Without O_NONBLOCK the opening of a pipe would wait for its writer.
-  return OpenFile(source, O_RDONLY | O_NONBLOCK);
+  return OpenRegularFile(source, Links::kFollow, status);
 }
 
 bool CopyToNewFile(const std::string& source, const std::string& target,
                    const std::string& trusted) {
-  const Descriptor from = OpenSource(source, trusted);
   struct stat status = {};
-  if (!from.IsOpen() || !StatusOf(from, status) || !S_ISREG(status.st_mode)) {
+  const Descriptor from = OpenSource(source, trusted, status);
+  if (!from.IsOpen()) {
     return false;
   }
   TemporaryFile copy(target);

@@ -13,8 +13,8 @@ FolderLock::FolderLock(const std::string& folder, std::chrono::nanoseconds& time
     State = LockResult::kNoFolder;
     return;
   }
-  // Whoever may open the folder can keep the lock for ever: a call that waits for it may not
-  // return.
+  // Any process that may open the folder can keep the lock for ever, so a call that waits for it
+  // may never return.
   while (RetryOnInterrupt([&] { return ::flock(Folder.Get(), LOCK_EX | LOCK_NB); }) != 0) {
     if (errno != EWOULDBLOCK || timeLeft <= timeLeft.zero()) {
       return;

@@ -2,5 +2,5 @@
 
 #include <string>
 
-// The host name up to its first dot, of any length; empty if the kernel has none.
+// The host name (uname) up to its first dot, of any length; empty if the kernel has none.
 std::string HostName();

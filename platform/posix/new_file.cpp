@@ -1,41 +1,29 @@
 #include "platform/new_file.h"
 
-#include <fcntl.h>
-#include <unistd.h>
-
 #include "platform/posix/file_calls.h"
+#include "platform/posix/text_file.h"
 
-NewFile::NewFile(const std::string& path)
-    : Path(path), Handle(OpenFile(path, O_WRONLY | O_CREAT | O_EXCL, 0600).Release()) {}
+struct NewFile::State {
+  Descriptor File;
+};
+
+NewFile::NewFile(const std::string& path) : Path(path) {
+  Descriptor file = CreateNew(path, /*mode=*/0600);
+  if (file.IsOpen()) {
+    Opened = std::make_unique<State>(State{std::move(file)});
+  }
+}
 
 NewFile::~NewFile() {
   if (IsOpen()) {
-    ::close(static_cast<int>(Handle));
     RemoveFile(Path);
   }
 }
 
-bool NewFile::IsOpen() const { return Handle >= 0; }
-
-bool NewFile::Write(std::string_view bytes) {
-  size_t written = 0;
-  while (IsOpen() && written < bytes.size()) {
-    const ssize_t count = RetryOnInterrupt([&] {
-      return ::write(static_cast<int>(Handle), bytes.data() + written, bytes.size() - written);
-    });
-    if (count <= 0) {
-      return false;
-    }
-    written += static_cast<size_t>(count);
-  }
-  return IsOpen();
-}
+bool NewFile::Write(std::string_view bytes) { return IsOpen() && WriteAll(Opened->File, bytes); }
 
 bool NewFile::Finish() {
-  if (!IsOpen()) {
-    return false;
-  }
-  const int file = static_cast<int>(Handle);
-  Handle = -1;
-  return ::close(file) == 0;
+  const bool isClosed = IsOpen() && ::close(Opened->File.Release()) == 0;
+  Opened.reset();
+  return isClosed;
 }

@@ -27,7 +27,7 @@ static void WriteGroups(uid_t user, const Descriptor& output) {
   }
 }
 
-// The primary group first. Each user is asked for once in a run.
+// The primary group first. Each user is looked up once in a run.
 static const std::vector<gid_t>& GroupsOf(uid_t user) {
   static std::map<uid_t, std::vector<gid_t>> known;
   const auto [entry, isNew] = known.try_emplace(user);

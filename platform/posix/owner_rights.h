@@ -5,9 +5,9 @@
 #include <string>
 #include <vector>
 
-// While it exists, files are opened with the rights of another file's owner, if this process is
-// root's and the owner is another user; else nothing changes. A group counts if the name service
-// lists it for the owner within ten seconds.
+// While the object exists, this process opens files with the rights of the owner of the file at the
+// path (setfsuid, setfsgid, setgroups), if it is root's process and another user's file; otherwise
+// nothing changes. The owner's groups count if the name service lists them within ten seconds.
 class OwnerRights {
  public:
   explicit OwnerRights(const std::string& path);

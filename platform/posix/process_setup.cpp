@@ -7,7 +7,7 @@
 
 #include "platform/posix/descriptor.h"
 
-// The system hands out the lowest number that is free.
+// The system assigns the lowest free number.
 static void OpenStandardDescriptors() {
   int number = 0;
   while (number >= 0 && number <= STDERR_FILENO) {

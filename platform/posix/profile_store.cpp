@@ -24,30 +24,19 @@ bool ProfileStore::IsCurrent(const std::string& path, const File& file) {
          now.st_ctim.tv_nsec == file.Status.st_ctim.tv_nsec;
 }
 
-void ProfileStore::Keep(Descriptor opened, File& file) {
-  file.Opened = std::move(opened);
-  if (!StatusOf(file.Opened, file.Status)) {
-    file.Status = {};
-  }
-}
-
 void ProfileStore::Read(const std::string& path, File& file) {
   file.Text.reset();
   file.Opened.Reset(-1);
   file.Status = {};
-  // A link could lead anywhere, and opening a pipe would block the run.
-  Descriptor opened = OpenFile(path, O_RDONLY | O_NOFOLLOW | O_NONBLOCK);
-  if (!opened.IsOpen()) {
-    if (errno == ENOENT) {
-      file.Text = std::make_unique<ProfileText>("");
-    }
-    return;
+  file.Opened = OpenRegularFile(path, Links::kNoFollow, file.Status);  // a link can lead anywhere
+  std::optional<std::string> text;
+  if (file.Opened.IsOpen()) {
+    text = ReadAll(file.Opened);
+  } else if (errno == ENOENT) {
+    text = "";
   }
-  Keep(std::move(opened), file);
-  if (S_ISREG(file.Status.st_mode)) {
-    if (std::optional<std::string> text = ReadAll(file.Opened)) {
-      file.Text = std::make_unique<ProfileText>(std::move(*text));
-    }
+  if (text) {
+    file.Text = std::make_unique<ProfileText>(std::move(*text));
   }
 }
 
@@ -107,10 +96,6 @@ bool ProfileStore::IsLocked(const std::string& path) const {
   return lock != Locks.end() && lock->second.Result() == LockResult::kLocked;
 }
 
-static Descriptor CreateFile(const std::string& path, mode_t mode) {
-  return OpenFile(path, O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW, mode);
-}
-
 // Writes the text to a temporary file and renames it over the profile file.
 bool ProfileStore::Store(const std::string& path, File& file) const {
   const bool isReplacement = file.Status.st_mode != 0;
@@ -119,12 +104,12 @@ bool ProfileStore::Store(const std::string& path, File& file) const {
   Descriptor written;
   if (IsLocked(path)) {
     RemoveFile(temporary);  // only a run that was killed can have left it
-    written = CreateFile(temporary, mode);
+    written = CreateNew(temporary, mode);
   }
   if (!written.IsOpen()) {
     // No lock, or something of that name that cannot be removed: an event can be called anything.
     temporary = RandomPathBeside(path);
-    written = CreateFile(temporary, mode);
+    written = CreateNew(temporary, mode);
   }
   if (!written.IsOpen()) {
     return false;
@@ -137,6 +122,9 @@ bool ProfileStore::Store(const std::string& path, File& file) const {
     RemoveFile(temporary);
     return false;
   }
-  Keep(std::move(written), file);
+  file.Opened = std::move(written);
+  if (!StatusOf(file.Opened, file.Status)) {
+    file.Status = {};
+  }
   return true;
 }

@@ -23,16 +23,16 @@ class ProfileStore {
   static ProfileStore& GetInstance();
 
   // The text as it is now, valid until the next call: empty if there is no file, null if it cannot
-  // be read. After such a failure inside Enter and Leave, the file cannot be read or changed until
+  // be read. After such a failure between Enter and Leave, the file cannot be read or changed until
   // Leave: what was read before may be wrong and must not be written back.
   const ProfileText* Load(const std::string& path);
 
-  // Changes a key of the text that Load returns; to be called inside Enter and Leave.
+  // Changes a key of the text that Load returns; to be called between Enter and Leave.
   bool Set(const std::string& path, const std::string& section, const std::string& key,
            const std::string& value);
 
   // Locks the folder of the file until the last Leave. Calls nest, with the same path or others.
-  // Without the lock, runs go on: one may undo a change of another, but each leaves a whole file.
+  // Without the lock, runs go on: one may undo a change of another, but none leaves half a file.
   void Enter(const std::string& path);
 
   // The last one writes every file that was changed and frees the locks. False if a file could not
@@ -54,7 +54,6 @@ class ProfileStore {
 
   static bool IsCurrent(const std::string& path, const File& file);
   static void Read(const std::string& path, File& file);
-  static void Keep(Descriptor opened, File& file);
   bool IsLocked(const std::string& path) const;
   bool Store(const std::string& path, File& file) const;
 

@@ -57,8 +57,7 @@ uint32_t StateNumber(std::string_view activeState) {
 
 using Clock = std::chrono::steady_clock;
 
-// One question to systemd: which units there are. Each step returns 0 or more, or a negative error
-// number.
+// One query for the units of systemd. Each step returns 0 or more, or a negative error number.
 class UnitQuery {
  public:
   UnitQuery(const BusLibrary& library, std::chrono::milliseconds limit)
@@ -67,7 +66,7 @@ class UnitQuery {
   UnitQuery(const UnitQuery&) = delete;
   UnitQuery& operator=(const UnitQuery&) = delete;
 
-  int Ask();
+  int Send();
   int AwaitReply();
 
   std::vector<ServiceEntry> Entries;
@@ -83,7 +82,7 @@ class UnitQuery {
   int Outcome = 0;
 };
 
-int UnitQuery::Ask() {
+int UnitQuery::Send() {
   int opened = 0;
   do {
     opened = Library.OpenSystem(&Bus);
@@ -157,7 +156,7 @@ ServiceListing ListServices(std::chrono::milliseconds limit) {
     return {ELIBACC, {}};
   }
   UnitQuery query(library, limit);
-  int outcome = query.Ask();
+  int outcome = query.Send();
   if (outcome >= 0) {
     outcome = query.AwaitReply();
   }

@@ -8,8 +8,7 @@
 TemporaryFile::TemporaryFile(const std::string& target) : Target(target) {
   for (int attempt = 0; attempt < 8; ++attempt) {
     const std::string path = RandomPathBeside(target);
-    const Descriptor file = OpenFile(path, O_WRONLY | O_CREAT | O_EXCL, 0600);
-    if (file.IsOpen()) {
+    if (CreateNew(path, /*mode=*/0600).IsOpen()) {
       Name = path;
       return;
     }

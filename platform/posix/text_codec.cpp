@@ -6,6 +6,7 @@
 #include <cstdint>
 
 #include "platform/ascii_case.h"
+#include "platform/utf8.h"
 
 struct TextCodec::State {
   explicit State(iconv_t converter) : Converter(converter) {}
@@ -43,7 +44,7 @@ std::string TextCodec::ToUtf8(std::string_view text) const {
     const size_t converted = ::iconv(Shared->Converter, &input, &left, &output, &space);
     result.append(piece, sizeof piece - space);
     if (converted == static_cast<size_t>(-1) && errno != E2BIG) {
-      result += "\xEF\xBF\xBD";
+      AppendUtf8(result, kReplacementCharacter);
       ++input;
       --left;
     }

@@ -31,15 +31,14 @@ std::optional<std::string> ReadTextFile(const std::string& path) {
   return file.IsOpen() ? ReadAll(file) : std::nullopt;
 }
 
-bool WriteAll(const Descriptor& file, const std::string& text) {
-  size_t written = 0;
-  while (written < text.size()) {
-    const ssize_t count = RetryOnInterrupt(
-        [&] { return ::write(file.Get(), text.data() + written, text.size() - written); });
+bool WriteAll(const Descriptor& file, std::string_view bytes) {
+  while (!bytes.empty()) {
+    const ssize_t count =
+        RetryOnInterrupt([&] { return ::write(file.Get(), bytes.data(), bytes.size()); });
     if (count <= 0) {
       return false;
     }
-    written += static_cast<size_t>(count);
+    bytes.remove_prefix(static_cast<size_t>(count));
   }
   return true;
 }

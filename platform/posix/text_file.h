@@ -2,6 +2,7 @@
 
 #include <optional>
 #include <string>
+#include <string_view>
 
 #include "platform/posix/descriptor.h"
 
@@ -11,5 +12,5 @@ std::optional<std::string> ReadAll(const Descriptor& file);
 // All bytes of a file; nothing if it cannot be opened or read.
 std::optional<std::string> ReadTextFile(const std::string& path);
 
-// False if not all bytes of the text were written.
-bool WriteAll(const Descriptor& file, const std::string& text);
+// Writes at the current offset. False if not all bytes were written.
+bool WriteAll(const Descriptor& file, std::string_view bytes);

@@ -63,7 +63,7 @@ std::wstring NarrowToWide(const std::string& narrow) {
   return count == 0 ? L"" : wide;
 }
 
-// Receives the result of a network call: the whole list at once, as the calls ask for the largest
+// Receives the result of a network call: the entire list at once, as the calls request the largest
 // length.
 struct NetList {
   BYTE* Buffer = nullptr;

@@ -1,16 +1,14 @@
 #include "platform/windows/file_entry.h"
 
+UniqueSearch FindFirst(const std::string& pattern, WIN32_FIND_DATAA& first) {
+  HANDLE search = ::FindFirstFileA(pattern.c_str(), &first);
+  return UniqueSearch(search == INVALID_HANDLE_VALUE ? nullptr : search);
+}
+
 std::optional<WIN32_FIND_DATAA> FindEntry(const std::string& path) {
   WIN32_FIND_DATAA entry = {};
-  if (path.find_first_of("*?") != std::string::npos) {
-    return std::nullopt;
-  }
-  const HANDLE search = ::FindFirstFileA(path.c_str(), &entry);
-  if (search == INVALID_HANDLE_VALUE) {
-    return std::nullopt;
-  }
-  ::FindClose(search);
-  return entry;
+  const bool hasWildcard = path.find_first_of("*?") != std::string::npos;
+  return !hasWildcard && FindFirst(path, entry) ? std::optional(entry) : std::nullopt;
 }
 
 bool IsLink(const WIN32_FIND_DATAA& entry) {

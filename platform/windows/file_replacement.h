@@ -2,21 +2,16 @@
 
 #include <string>
 
-#include "platform/windows/system.h"
-
-// Opens an existing file and lets others read, write and delete it meanwhile; empty, with the
-// reason in GetLastError, if that fails.
-UniqueHandle OpenShared(const std::string& path, DWORD access);
-
-// Forces the data of a file to the disk; one that is in use is waited for, up to half a second.
+// Forces the data of a file to the disk (FlushFileBuffers); waits up to half a second for a program
+// that keeps it from being opened. False if that fails.
 bool FlushToDisk(const std::string& path);
 
-// Renames a file, over another one if there is one; a file that is in use is waited for, up to half
-// a second.
+// Renames a file and replaces the target if it exists (MoveFileExA); waits up to half a second for
+// a program that uses one of them. False if that fails.
 bool RenameOver(const std::string& source, const std::string& target);
 
-// Forces a new file to the disk and renames it over another one. Sharing violations are waited out,
-// up to half a second each. If another program does not let the target be deleted but lets it be
-// written, the contents are written into the target, which readers can see half done. False if all
-// of that fails: then the target is as it was.
+// Does both: forces a new file to the disk and renames it over the target. If another program keeps
+// the target open without sharing its deletion, but lets others write, the contents are written
+// into the target instead; a reader can see that half done. False if everything fails, with the
+// target as it was.
 bool ReplaceFileBy(const std::string& source, const std::string& target);

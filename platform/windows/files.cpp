@@ -1,20 +1,17 @@
 #include "platform/files.h"
 
-#include <algorithm>
 #include <cstdint>
+#include <optional>
 
 #include "platform/temporary_file.h"
 #include "platform/windows/file_entry.h"
-#include "platform/windows/file_replacement.h"
+#include "platform/windows/file_handle.h"
 #include "platform/windows/patience.h"
 
 // Empty for what has no identity, as a device. The query needs no access rights; a folder can only
 // be opened with the flag for backups.
 static std::optional<BY_HANDLE_FILE_INFORMATION> IdentityOf(const std::string& path) {
-  const UniqueHandle file = OwnIfValid(::CreateFileA(
-      path.c_str(), /*dwDesiredAccess=*/0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
-      /*lpSecurityAttributes=*/nullptr, OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS,
-      /*hTemplateFile=*/nullptr));
+  const UniqueHandle file = OpenExisting(path, /*access=*/0, kShareAll, FILE_FLAG_BACKUP_SEMANTICS);
   BY_HANDLE_FILE_INFORMATION identity = {};
   if (!file || ::GetFileInformationByHandle(file.get(), &identity) == FALSE) {
     return std::nullopt;
@@ -59,49 +56,18 @@ static bool IsNameTaken(const std::string& path) {
 bool MoveFolder(const std::string& source, const std::string& target) {
   // The system itself refuses every target but the source, in another spelling of its name.
   return KindOf(source) == FileKind::kFolder && !IsSymbolicLink(source) && !IsNameTaken(target) &&
-         CallWithPatience(10, AccessDenied::kMayPass,
+         CallWithPatience(kShortPatience, AccessDenied::kMayPass,
                           [&] { return ::MoveFileA(source.c_str(), target.c_str()) != FALSE; });
-}
-
-static bool CopyBytes(HANDLE source, uint64_t size, HANDLE target) {
-  char buffer[65536];
-  while (size > 0) {
-    const auto most = static_cast<DWORD>(std::min<uint64_t>(size, sizeof buffer));
-    DWORD count = 0;
-    DWORD written = 0;
-    if (::ReadFile(source, buffer, most, &count, /*lpOverlapped=*/nullptr) == FALSE ||
-        ::WriteFile(target, buffer, count, &written, /*lpOverlapped=*/nullptr) == FALSE ||
-        written != count) {
-      return false;
-    }
-    if (count == 0) {
-      break;
-    }
-    size -= count;
-  }
-  return true;
-}
-
-static UniqueHandle OpenSource(const std::string& path) {
-  UniqueHandle file;
-  CallWithPatience(10, AccessDenied::kIsFinal, [&] {
-    file = OpenShared(path, GENERIC_READ);
-    return file != nullptr;
-  });
-  return file;
 }
 
 // Not CopyFileA, which goes on while the source grows.
 static bool CopyContents(const std::string& source, const std::string& target) {
-  const UniqueHandle from = OpenSource(source);
-  const UniqueHandle to = OpenShared(target, GENERIC_WRITE);
+  const UniqueHandle from = OpenPatiently(kShortPatience, source, GENERIC_READ);
+  const UniqueHandle to = OpenExisting(target, GENERIC_WRITE);
+  const std::optional<uint64_t> size = RegularFileSize(from);
   BY_HANDLE_FILE_INFORMATION status = {};
-  if (!from || !to || ::GetFileType(from.get()) != FILE_TYPE_DISK ||
-      ::GetFileInformationByHandle(from.get(), &status) == FALSE) {
-    return false;
-  }
-  const uint64_t size = uint64_t{status.nFileSizeHigh} << 32 | status.nFileSizeLow;
-  if (!CopyBytes(from.get(), size, to.get())) {
+  if (!size || !to || ::GetFileInformationByHandle(from.get(), &status) == FALSE ||
+      !CopyBytes(from, *size, to)) {
     return false;
   }
   ::SetFileTime(to.get(), /*lpCreationTime=*/nullptr, /*lpLastAccessTime=*/nullptr,

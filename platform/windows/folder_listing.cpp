@@ -1,22 +1,18 @@
 #include "platform/folder_listing.h"
 
 #include "platform/windows/file_entry.h"
-#include "platform/windows/system.h"
 
 std::vector<FolderEntry> ListFolder(const std::string& path) {
   std::vector<FolderEntry> entries;
   WIN32_FIND_DATAA entry = {};
-  const HANDLE first = ::FindFirstFileA((path + "\\*.*").c_str(), &entry);
-  if (first == INVALID_HANDLE_VALUE) {
-    return entries;
-  }
-  const UniqueSearch search(first);
-  do {
+  const UniqueSearch search = FindFirst(path + "\\*.*", entry);
+  for (bool isFound = search != nullptr; isFound;
+       isFound = ::FindNextFileA(search.get(), &entry) != FALSE) {
     if (!IsLink(entry)) {
       const uint64_t size = (uint64_t{entry.nFileSizeHigh} << 32) | entry.nFileSizeLow;
       entries.push_back({entry.cFileName, size, entry.dwFileAttributes});
     }
-  } while (::FindNextFileA(search.get(), &entry) != FALSE);
+  }
   return entries;
 }
 

@@ -33,7 +33,7 @@ UniqueHandle OpenFolderMutex(const std::string& folder) {
   constexpr DWORD access = SYNCHRONIZE | MUTEX_MODIFY_STATE;  // 0x100001
   SECURITY_ATTRIBUTES security = {sizeof security, /*lpSecurityDescriptor=*/nullptr,
                                   /*bInheritHandle=*/FALSE};
-  // Everybody (WD) may use it, whoever made it. If this fails, it has default security.
+  // Every user (WD) may use it, whichever user created it. If this fails, it has default security.
   ::ConvertStringSecurityDescriptorToSecurityDescriptorA("D:(A;;0x100001;;;WD)", SDDL_REVISION_1,
                                                          &security.lpSecurityDescriptor,
                                                          /*SecurityDescriptorSize=*/nullptr);
@@ -54,7 +54,7 @@ FolderLock::FolderLock(const std::string& folder, std::chrono::nanoseconds& time
   const DWORD result =
       ::WaitForSingleObject(Mutex.get(), static_cast<DWORD>(std::max<int64_t>(patience, 0)));
   timeLeft -= std::chrono::steady_clock::now() - begin;
-  // An owner that ended without freeing it left every file whole.
+  // An owner that ended without releasing it left no file half written.
   IsOwner = result == WAIT_OBJECT_0 || result == WAIT_ABANDONED;
 }
 

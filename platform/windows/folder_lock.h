@@ -5,17 +5,17 @@
 
 #include "platform/windows/system.h"
 
-// A mutex named after a folder, owned for as long as the object lives. It is one for the whole
-// machine: processes of any session and user share it.
+// A mutex named after a folder, owned for as long as the object lives. Processes of every session
+// and user share it (CreateMutexExA, WaitForSingleObject).
 class FolderLock {
  public:
-  // Waits for another process at most as long as timeLeft says, and subtracts what it waited.
+  // Waits for another process for at most timeLeft, and subtracts the time that it waited.
   FolderLock(const std::string& folder, std::chrono::nanoseconds& timeLeft);
   ~FolderLock();
   FolderLock(const FolderLock&) = delete;
   FolderLock& operator=(const FolderLock&) = delete;
 
-  // False if somebody else kept the mutex, or the system refuses it.
+  // False if another process kept the mutex, or the system refuses it.
   bool IsLocked() const { return IsOwner; }
 
  private:
@@ -23,5 +23,5 @@ class FolderLock {
   bool IsOwner = false;
 };
 
-// The mutex of a folder, as everybody may open it; for tests too.
+// The mutex of a folder, not yet owned; empty if the system refuses it. Tests hold it too.
 UniqueHandle OpenFolderMutex(const std::string& folder);

@@ -5,7 +5,7 @@
 std::string GetFolderPath(int32_t csidl) {
   using Function = HRESULT(WINAPI*)(HWND, int, HANDLE, DWORD, LPSTR);
   constexpr DWORD defaultPath = 1;                     // SHGFP_TYPE_DEFAULT
-  static const SystemLibrary library("shfolder.dll");  // a run asks for many paths
+  static const SystemLibrary library("shfolder.dll");  // a run needs many paths
   const auto getFolderPath = library.Find<Function>("SHGetFolderPathA");
   if (getFolderPath == nullptr) {
     return "";

@@ -5,12 +5,16 @@
 // Other programs (scanners, indexers, viewers) open a file that was just written and keep it for a
 // moment. A call that meets one of them fails, although it would succeed a little later.
 
+// Numbers of attempts, 20 ms apart: about 0.2 seconds, and half a second for the history file.
+inline constexpr int kShortPatience = 10;
+inline constexpr int kLongPatience = 25;
+
 // Whether "access denied" can be such a moment too: it is for a rename over a file, and for the
 // move of a folder that contains an open file. Elsewhere it means missing rights.
 enum class AccessDenied { kIsFinal, kMayPass };
 
-// Repeats a call that returns false because of a sharing or lock violation: at most that many
-// attempts, 20 ms apart. Returns the last result, with its reason in GetLastError.
+// Repeats a call that returns false because of a sharing or lock violation, up to that many
+// attempts. Returns the last result, with its reason in GetLastError.
 template <typename Call>
 bool CallWithPatience(int attempts, AccessDenied denied, Call call) {
   for (int i = 1; !call(); ++i) {

@@ -4,6 +4,7 @@
 #include "platform/path.h"
 #include "platform/temporary_path.h"
 #include "platform/windows/file_entry.h"
+#include "platform/windows/file_handle.h"
 #include "platform/windows/file_replacement.h"
 #include "platform/windows/patience.h"
 
@@ -50,12 +51,10 @@ ProfileStore::Readable ProfileStore::OpenForReading(const std::string& path) {
   }
   Readable readable;
   readable.Path = file.Changes == State::kChanged ? file.Copy : path;
-  const bool isOpen = CallWithPatience(25, AccessDenied::kIsFinal, [&] {
-    readable.Opened = OpenShared(readable.Path, GENERIC_READ);
+  const bool isOpen = CallWithPatience(kLongPatience, AccessDenied::kIsFinal, [&] {
+    readable.Opened = OpenExisting(readable.Path, GENERIC_READ);
     char byte = 0;
-    DWORD count = 0;
-    return readable.Opened && ::ReadFile(readable.Opened.get(), &byte, sizeof byte, &count,
-                                         /*lpOverlapped=*/nullptr) != FALSE;
+    return readable.Opened && ReadSome(readable.Opened, &byte, sizeof byte);
   });
   if (!isOpen && !IsMissing(::GetLastError())) {
     file.Changes = State::kFailed;
@@ -74,7 +73,7 @@ bool ProfileStore::MakeCopy(const std::string& path, File& file) const {
     // No lock, or something of that name that cannot be removed: an event can be called anything.
     file.Copy = RandomPathBeside(path);
   }
-  return CallWithPatience(25, AccessDenied::kIsFinal,
+  return CallWithPatience(kLongPatience, AccessDenied::kIsFinal,
                           [&] {
                             return ::CopyFileA(path.c_str(), file.Copy.c_str(),
                                                /*bFailIfExists=*/TRUE) != FALSE;
@@ -90,7 +89,8 @@ bool ProfileStore::Write(const std::string& path, const std::string& section,
     file.Changes = isReadable && MakeCopy(path, file) ? State::kChanged : State::kFailed;
   }
   const bool isWritten =
-      file.Changes == State::kChanged && CallWithPatience(25, AccessDenied::kIsFinal, [&] {
+      file.Changes == State::kChanged &&
+      CallWithPatience(kLongPatience, AccessDenied::kIsFinal, [&] {
         return ::WritePrivateProfileStringA(section.c_str(), key.c_str(), value.c_str(),
                                             file.Copy.c_str()) != FALSE;
       });

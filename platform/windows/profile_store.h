@@ -32,7 +32,7 @@ class ProfileStore {
              const std::string& value);
 
   // Locks the folder of the file until the last Leave. Calls nest, with the same path or others.
-  // Without the lock, runs go on: one may undo a change of another, but each leaves a whole file.
+  // Without the lock, runs go on: one may undo a change of another, but none leaves half a file.
   void Enter(const std::string& path);
 
   // The last one replaces every file that was changed and frees the locks. False if a file could

@@ -1,7 +1,7 @@
 #pragma once
 
-// The system's header without the parts that are not used here, and an owning type for each kind of
-// handle. An empty owner holds null.
+// The system's header without the parts that are not used here, and the owner of what CloseHandle
+// closes: files, processes, threads, mutexes. An empty owner holds null.
 
 #define WIN32_LEAN_AND_MEAN
 #ifndef NOMINMAX
@@ -9,7 +9,6 @@
 #endif
 #include <windows.h>
 
-#include <cstdint>
 #include <memory>
 
 struct HandleCloser {
@@ -21,11 +20,3 @@ using UniqueHandle = std::unique_ptr<void, HandleCloser>;
 inline UniqueHandle OwnIfValid(HANDLE handle) {
   return UniqueHandle(handle == INVALID_HANDLE_VALUE ? nullptr : handle);
 }
-
-// A handle as the platform-neutral headers keep it.
-inline HANDLE AsHandle(intptr_t number) { return reinterpret_cast<HANDLE>(number); }
-
-struct SearchCloser {
-  void operator()(HANDLE search) const { ::FindClose(search); }
-};
-using UniqueSearch = std::unique_ptr<void, SearchCloser>;

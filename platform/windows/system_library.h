@@ -4,14 +4,14 @@
 
 #include "platform/windows/system.h"
 
-// A library of the system, loaded at run time from the system folder and from nowhere else: the
-// program's own folder, which Windows searches first, is often a temporary one that others can
-// write to. Without the library no function is found.
+// A library that is loaded at run time, from the system folder only (LoadLibraryExA): the program's
+// own folder, which Windows searches first, is often a temporary one that others can write to. If
+// it cannot be loaded, no function is found.
 class SystemLibrary {
  public:
   explicit SystemLibrary(const char* name);
 
-  // Null if there is no function of that name.
+  // The function of that name (GetProcAddress); null if there is none.
   template <typename Function>
   Function Find(const char* name) const {
     return Module == nullptr ? nullptr

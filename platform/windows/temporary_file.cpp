@@ -3,16 +3,14 @@
 #include "platform/files.h"
 #include "platform/temporary_path.h"
 #include "platform/windows/file_entry.h"
+#include "platform/windows/file_handle.h"
 #include "platform/windows/file_replacement.h"
 #include "platform/windows/patience.h"
 
 TemporaryFile::TemporaryFile(const std::string& target) : Target(target) {
   for (int attempt = 0; attempt < 8; ++attempt) {
     const std::string path = RandomPathBeside(target);
-    const UniqueHandle file = OwnIfValid(::CreateFileA(
-        path.c_str(), GENERIC_WRITE, /*dwShareMode=*/0, /*lpSecurityAttributes=*/nullptr,
-        CREATE_NEW, FILE_ATTRIBUTE_NORMAL, /*hTemplateFile=*/nullptr));
-    if (file) {
+    if (CreateNew(path)) {
       Name = path;
       return;
     }
@@ -42,7 +40,7 @@ bool TemporaryFile::Replace() {
 }
 
 bool TemporaryFile::MoveToNew() {
-  const bool isMoved = Exists() && CallWithPatience(10, AccessDenied::kIsFinal, [this] {
+  const bool isMoved = Exists() && CallWithPatience(kShortPatience, AccessDenied::kIsFinal, [this] {
                          return ::MoveFileA(Name.c_str(), Target.c_str()) != FALSE;
                        });
   if (isMoved) {

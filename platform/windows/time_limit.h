@@ -11,9 +11,9 @@ class TimeLimit {
   // For all calls together.
   explicit TimeLimit(std::chrono::milliseconds limit) : Left(limit) {}
 
-  // Runs the work on a thread and returns its result. Returns nothing if the time is over first;
-  // the thread is then abandoned and ends with the process. So the work must own what it uses.
-  // Returns nothing, too, without running the work, if no time is left or no thread can be created.
+  // Runs the work on a thread (CreateThread) and returns its result. Returns nothing if the time is
+  // over first: the thread then runs on until the process ends, so the work must own what it uses.
+  // Returns nothing, and does not run the work, if no time is left or no thread can be created.
   template <typename Work>
   auto Call(Work work) -> std::optional<decltype(work())> {
     auto result = std::make_shared<std::optional<decltype(work())>>();

@@ -10,8 +10,8 @@
 #include "platform/profile_file.h"
 #include "tests/support/scratch_folder.h"
 
-// The tests of this folder check what a header of platform/ promises, with the implementation of
-// this build, on every system. Where systems differ by contract, the case says so.
+// The tests of this folder check the contracts of the headers in platform/ on every system. Where
+// the contract differs between systems, so does the expected value.
 
 namespace fs = std::filesystem;
 using namespace std::string_literals;
@@ -22,7 +22,7 @@ inline const std::string device = isWindows ? "NUL" : "/dev/null";
 // A test that has a scratch folder.
 class Platform : public testing::Test, protected ScratchFolder {};
 
-// Two writes while another owner has the lock of the file: only the first one waits, for 60 ms.
+// Writes twice while another owner holds the lock: only the first write waits, for 60 ms.
 inline void ExpectOneWaitForTheLock(const std::string& ini) {
   using std::chrono::steady_clock;
   const std::chrono::milliseconds limit(60);

@@ -1,6 +1,10 @@
 #include "platform/files.h"
 
 #include <chrono>
+#include <ctime>
+#include <numeric>
+#include <set>
+#include <tuple>
 
 #include "platform/folder_listing.h"
 #include "tests/platform/contract.h"
@@ -8,6 +12,15 @@
 namespace {
 
 using Files = Platform;
+
+// The names in a folder, sorted, each followed by a blank.
+std::string Names(const std::string& folder) {
+  std::set<std::string> names;
+  for (const FolderEntry& entry : ListFolder(folder)) {
+    names.insert(entry.Name == "." || entry.Name == ".." ? "" : entry.Name + ' ');
+  }
+  return std::accumulate(names.begin(), names.end(), ""s);
+}
 
 TEST_F(Files, HaveAKind) {
   const std::string file = Make("file", "");
@@ -24,7 +37,7 @@ TEST_F(Files, HaveAKind) {
   EXPECT_TRUE(KindOf(device) != FileKind::kFile && KindOf(device) != FileKind::kFolder);
 }
 
-TEST_F(Files, AreTheSameUnderAnySpelling) {
+TEST_F(Files, AreTheSameUnderSeveralPaths) {
   const std::string file = Make("file", "x");
   Make("other", "x");
   Make("folder/");
@@ -37,7 +50,7 @@ TEST_F(Files, AreTheSameUnderAnySpelling) {
   EXPECT_FALSE(IsSameFile(In("none"), In("none")));
 }
 
-TEST_F(Files, MovesAFolderToAFreeNameOnly) {
+TEST_F(Files, AreMovedToAnUnusedNameOnly) {
   Make("from/sub/file", "text");
   Make("empty/");
   Make("file", "");
@@ -52,7 +65,7 @@ TEST_F(Files, MovesAFolderToAFreeNameOnly) {
   EXPECT_EQ(Tree(), "empty/\nfile\nto/\nto/sub/\nto/sub/file\n");
 }
 
-TEST_F(Files, CopiesToANewFileOnly) {
+TEST_F(Files, AreCopiedToAnUnusedNameOnly) {
   const std::string text(100000, 't');
   const std::string source = Make("source", text);
   fs::last_write_time(source, fs::last_write_time(source) - std::chrono::hours(1000));
@@ -73,6 +86,40 @@ TEST_F(Files, CopiesToANewFileOnly) {
   EXPECT_EQ(Tree(), "copy\nfolder/\nsource\ntaken\n");
   fs::permissions(source, fs::perms::owner_all);  // Windows removes no file that is read-only
   fs::permissions(In("copy"), fs::perms::owner_all);
+}
+
+TEST_F(Files, AreListedWithTheirProperties) {
+  Make("plain", "12345");
+  fs::permissions(Make("fixed", ""), fs::perms::owner_read);
+  Make(".dot", "");
+  Make("folder/");
+  constexpr uint32_t readOnly = 1;
+  for (const auto& [name, size, attributes] : ListFolder(Root)) {
+    EXPECT_EQ(attributes, FileAttributes(In(name))) << name;
+    const bool isFolder = name == "folder" || name == "." || name == "..";
+    EXPECT_EQ((attributes & kFolderAttribute) != 0, isFolder) << name;
+    EXPECT_EQ((attributes & readOnly) != 0, name == "fixed") << name;
+    EXPECT_TRUE(isFolder || size == (name == "plain" ? 5 : 0)) << name;
+  }
+  EXPECT_EQ(Names(Root), ".dot fixed folder plain ");
+  EXPECT_EQ(Names(In("folder")), "");
+  EXPECT_TRUE(ListFolder(In("none")).empty() && ListFolder(In("plain")).empty());
+  fs::permissions(In("fixed"), fs::perms::owner_all);
+}
+
+TEST_F(Files, HaveTheTimeOfTheirLastWrite) {
+  const std::time_t before = std::time(nullptr);
+  Make("file", "x");
+  Make("folder/");
+  for (const char* name : {"file", "folder"}) {
+    const CalendarTime time = LastWriteTime(In(name)).value();
+    tm fields = {};
+    std::tie(fields.tm_year, fields.tm_mon, fields.tm_mday, fields.tm_hour, fields.tm_min,
+             fields.tm_sec, fields.tm_isdst) =
+        std::tuple(time.Year - 1900, time.Month - 1, time.Day, time.Hour, time.Minute, time.Second,
+                   -1);
+    EXPECT_NEAR(std::difftime(std::mktime(&fields), before), 0, 5);
+  }
 }
 
 }  // namespace

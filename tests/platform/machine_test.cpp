@@ -1,9 +1,13 @@
-// What every machine answers about itself, its accounts and its services.
+// What every machine reports about itself.
 
+#include <algorithm>
 #include <chrono>
+#include <cstdlib>
 
 #include "platform/accounts.h"
 #include "platform/computer.h"
+#include "platform/known_folders.h"
+#include "platform/processes.h"
 #include "platform/services.h"
 #include "tests/platform/contract.h"
 
@@ -17,7 +21,26 @@ TEST(Computer, HasAVersionAndProcessors) {
   EXPECT_TRUE(info.ProcessorLevel > 0 || info.ProcessorArchitecture == 0xFFFF);
 }
 
-TEST(Accounts, HaveDomainsAndFitTheirBuffer) {
+TEST(KnownFolders, IncludeCommonApplicationData) {
+  const char* variable = std::getenv("ORX_COMMON_APPDATA");
+  static std::string restored = "ORX_COMMON_APPDATA="s + (variable == nullptr ? "" : variable);
+  ::putenv(const_cast<char*>("ORX_COMMON_APPDATA="));  // Windows does not read it
+  const std::string folder = GetFolderPath(kCommonAppDataFolder);
+  ::putenv(restored.data());
+  EXPECT_TRUE(fs::is_directory(folder)) << folder;
+  EXPECT_TRUE(isWindows || folder == "/var/lib") << folder;
+  EXPECT_EQ(GetFolderPath(/*csidl=*/9999), "");
+}
+
+TEST(Processes, IncludeThisOne) {
+  const std::vector<uint32_t> ids = ListProcessIDs().value();
+  EXPECT_NE(std::find(ids.begin(), ids.end(), OwnProcessID()), ids.end());
+  EXPECT_EQ(FirstModuleOf(OwnProcessID()).value().BaseName,
+            isWindows ? "orx_platform_tests.exe" : "orx_platform_tests");
+  EXPECT_FALSE(FirstModuleOf(4294967292U));
+}
+
+TEST(Accounts, HaveADomainAndAtMost127Bytes) {
   EXPECT_NE(DomainUserName().value().find('\\'), std::string::npos);
   EXPECT_EQ(WorkstationUserName().value().find('\\'), std::string::npos);
   for (const std::string& group : ListLocalGroups("")) {
@@ -30,7 +53,7 @@ TEST(Accounts, HaveDomainsAndFitTheirBuffer) {
   EXPECT_TRUE(ListLocalGroupMembers("", "no such group").empty());
 }
 
-TEST(Services, AreListedOrRefused) {
+TEST(Services, AreListedOrAnErrorIsReturned) {
   const ServiceListing listing = ListServices(std::chrono::seconds(2));
   EXPECT_TRUE(listing.Error == 0 || listing.Entries.empty());
   for (const ServiceEntry& entry : listing.Entries) {

@@ -6,8 +6,8 @@
 
 namespace {
 
-// A character whose second byte equals a backslash in the Japanese code page; elsewhere its bytes
-// are two characters, and on Windows the second one is a separator.
+// One character in the Japanese code page, whose second byte equals a backslash; elsewhere two
+// characters, of which the second one is a separator on Windows.
 const std::string hyou = "\x95\x5C";
 const bool isOneCharacter = IsLeadByte(hyou[0]) || !isWindows;
 
@@ -25,7 +25,7 @@ TEST(Path, IsSplitAtItsLastSeparator) {
   }
 }
 
-TEST(Path, KeepsTheSecondByteOfACharacter) {
+TEST(Path, IsNotSplitInsideACharacter) {
   const std::string name = "a" + hyou + ".log";
   const std::string path = JoinPath(hyou, name);
   EXPECT_EQ(path, isOneCharacter ? hyou + kPathSeparator + name : hyou + name);

@@ -11,7 +11,8 @@ namespace {
 
 class ProfileFile : public Platform {
  protected:
-  // What is read of each value after it was written, each followed by a bar, as in the list.
+  // Writes each value of the list, and returns what is read after each one, in the form of the
+  // list.
   std::string ReadEach(const std::string& values, const std::function<std::string()>& read) const {
     std::istringstream stream(values);
     std::string text;
@@ -25,7 +26,7 @@ class ProfileFile : public Platform {
   const std::string Ini = In("a.ini");
 };
 
-TEST_F(ProfileFile, CutsValuesAtTheBuffersEnd) {
+TEST_F(ProfileFile, CutsValuesToTheSizeOfTheBuffer) {
   EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "0123456789"));
   for (const uint32_t size : {0U, 1U, 2U, 10U, 11U, 12U, 256U}) {
     const std::string expected = "0123456789"s.substr(0, std::max(size, 1U) - 1);
@@ -36,7 +37,7 @@ TEST_F(ProfileFile, CutsValuesAtTheBuffersEnd) {
   EXPECT_EQ(Tree(), "a.ini\n");
 }
 
-TEST_F(ProfileFile, TakesBlanksAndOnePairOfQuotesOffAValue) {
+TEST_F(ProfileFile, RemovesBlanksAndOnePairOfQuotes) {
   const auto readText = [this] { return ReadProfileValue(Ini, "S", "Key", "none", 256); };
   EXPECT_EQ(ReadEach(R"("a"|'a'|""a""|" a "|"a|a"|"a'|"a" "b"|"|""|  a b  | "a" |a=b;c|[x]||  |)",
                      readText),
@@ -78,7 +79,7 @@ TEST_F(ProfileFile, ListsSectionsAsFarAsTheyFit) {
   }
 }
 
-TEST_F(ProfileFile, IsNotMadeWhereItCannotBe) {
+TEST_F(ProfileFile, FailsWhereNoFileCanBeCreated) {
   Make("folder/");
   EXPECT_FALSE(WriteProfileValue(In("folder"), "S", "Key", "v"));
   EXPECT_FALSE(WriteProfileValue(In("none/a.ini"), "S", "Key", "v"));
@@ -86,7 +87,7 @@ TEST_F(ProfileFile, IsNotMadeWhereItCannotBe) {
   EXPECT_EQ(Tree(), "folder/\n");
 }
 
-TEST_F(ProfileFile, ChangesAtOnceWhenTheOutermostGuardEnds) {
+TEST_F(ProfileFile, IsReplacedOnceWhenTheOutermostGuardEnds) {
   const std::string before = "[S]\nKey=b\n";
   Make("a.ini", before);
   const std::string other = Make("other/b.ini", before);
@@ -114,7 +115,7 @@ TEST_F(ProfileFile, ChangesAtOnceWhenTheOutermostGuardEnds) {
   EXPECT_EQ(Tree(), "a.ini\nc.ini\nother/\nother/b.ini\n");
 }
 
-// The count that was taken from a file that could not be read must not be written to it.
+// A count that could not be read is taken for 0, which must not be written back.
 TEST_F(ProfileFile, IsNotWrittenAfterAReadThatFailed) {
   fs::create_directory(Ini);
   {

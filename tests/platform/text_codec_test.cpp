@@ -4,7 +4,7 @@
 
 namespace {
 
-TEST(TextCodec, ReadsTheEncodingsOfBothSystemsAndNoOthers) {
+TEST(TextCodec, ReadsTheSameEncodingsOnBothSystems) {
   const char* cases[][3] = {
       {"CP1252", "\x80 \xFC", "\u20AC \u00FC"},
       {"cp932", "\x95\x5C\\a", "\u8868\\a"},
@@ -24,7 +24,7 @@ TEST(TextCodec, ReadsTheEncodingsOfBothSystemsAndNoOthers) {
   }
 }
 
-TEST(TextCodec, GoesOnAfterWhatIsNoCharacter) {
+TEST(TextCodec, ContinuesAfterInvalidBytes) {
   // Half a character at the end, and before a blank.
   const std::optional<TextCodec> codec = TextCodec::Open("CP932");
   ASSERT_TRUE(codec);

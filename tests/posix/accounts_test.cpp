@@ -1,4 +1,4 @@
-// The whole program's report over made-up users and groups.
+// The program's report with supplied users and groups.
 
 #include <gtest/gtest.h>
 #include <unistd.h>
@@ -14,12 +14,12 @@ namespace {
 
 constexpr const char* wrapper = "/usr/lib/x86_64-linux-gnu/libnss_wrapper.so";
 
-// What the report says of them, without the rules of its tables.
+// The section of the report about them, without the rules of its tables.
 std::string ReportOver(const std::string& passwd, const std::string& group) {
   const ScratchFolder scratch;
   scratch.Make("passwd", passwd);
   scratch.Make("group", group);
-  // The sanitizer's library wants to be the first that is loaded.
+  // The sanitizer would demand to be the first library that is loaded.
   const std::string command =
       "ASAN_OPTIONS=verify_asan_link_order=0 LD_PRELOAD=" + std::string(wrapper) +
       " NSS_WRAPPER_PASSWD=" + scratch.In("passwd") + " NSS_WRAPPER_GROUP=" + scratch.In("group") +
@@ -31,7 +31,7 @@ std::string ReportOver(const std::string& passwd, const std::string& group) {
   return std::regex_replace(section, std::regex("[-=]{35,}\n"), "");
 }
 
-TEST(Accounts, CountOnceAndFitTheirBuffer) {
+TEST(Accounts, AreListedOnceWithAtMost127Bytes) {
   if (!std::filesystem::exists(wrapper)) {
     GTEST_SKIP() << "needs the package libnss-wrapper";
   }

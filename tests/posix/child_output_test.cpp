@@ -51,7 +51,7 @@ TEST(ChildOutput, EndsAtTheLimit) {
   }
 }
 
-// A child that cannot be ended must hold neither a lock nor the reader of the standard streams.
+// A child that cannot be killed must keep no lock and no pipe of the caller open.
 TEST(ChildOutput, ComesFromAChildWithoutOtherDescriptors) {
   const int other = ::dup(STDIN_FILENO);
   const std::string text = Output([](const Descriptor& output) {

@@ -1,4 +1,4 @@
-// The limits of what a machine answers, on machines other than this one.
+// The limits of what the program reads of a machine, with the values of other machines.
 
 #include <gtest/gtest.h>
 #include <sched.h>
@@ -31,7 +31,7 @@ std::string ShortNameOf(const std::string& hostName) {
 
 TEST(Machine, HasAShortNameOfAtMost14Characters) {
   if (ShortNameOf("a").empty()) {
-    GTEST_SKIP() << "needs the right to make a namespace";
+    GTEST_SKIP() << "needs the right to create a namespace";
   }
   for (const auto& [hostName, name] :
        {std::pair("fourteen-bytes", "fourteen-bytes"), std::pair("fifteen-bytes--", "none"),

@@ -14,7 +14,6 @@ int NextDescriptor() {
   return next;
 }
 
-// In a process of its own: what the caller closed is open, and no signal ends it.
 TEST(ProcessSetup, OpensClosedDescriptorsAndIgnoresSignals) {
   const auto run = [] {
     const int next = NextDescriptor();

@@ -24,7 +24,7 @@ class ProfileOnPosix : public Platform {
   const std::string Ini = Make("a.ini", "[S]\nKey=old\n");
 };
 
-TEST_F(ProfileOnPosix, IsReadAgainAfterAChangeThatOnlyTheChangeTimeShows) {
+TEST_F(ProfileOnPosix, IsReadAgainIfOnlyItsChangeTimeDiffers) {
   EXPECT_EQ(Value(), "old");
   struct stat before = {};
   ASSERT_EQ(::stat(Ini.c_str(), &before), 0);
@@ -35,7 +35,7 @@ TEST_F(ProfileOnPosix, IsReadAgainAfterAChangeThatOnlyTheChangeTimeShows) {
   EXPECT_EQ(Value(), "new");
 }
 
-TEST_F(ProfileOnPosix, IsAsBeforeAfterAReplacementThatFailed) {
+TEST_F(ProfileOnPosix, IsUnchangedAfterAFailedReplacement) {
   EXPECT_EQ(Value(), "old");
   std::signal(SIGXFSZ, SIG_IGN);
   rlimit limit = {};
@@ -78,7 +78,7 @@ TEST_F(ProfileOnPosix, KeepsOwnerPermissionsAndAccessList) {
     const ssize_t size = ::getxattr(path.c_str(), listName, buffer, sizeof buffer);
     return std::string(buffer, size < 0 ? 0 : static_cast<size_t>(size));
   };
-  // The folder's default for new files must not come in, and the file's own list must stay.
+  // The folder's default list must not be added, and the file's own list must be kept.
   if (::setxattr(Root.c_str(), "system.posix_acl_default", list.data(), list.size(), 0) != 0) {
     GTEST_SKIP() << "a file system without access control lists";
   }

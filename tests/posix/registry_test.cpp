@@ -1,5 +1,5 @@
-// The registry of an export: what the files in registry_cases/ make, in every encoding, and what a
-// reader of large and of strange files must withstand.
+// The registry that an export describes: the files in registry_cases/ in every encoding, and
+// exports that are large, damaged or hostile.
 
 #include "platform/registry.h"
 
@@ -72,13 +72,13 @@ TEST(Registry, ReadsEveryFormOfExport) {
   }
 }
 
-TEST(Registry, ReadsWhatPrecedesACut) {
+TEST(Registry, ReadsATruncatedExport) {
   const std::string text = Case("every_form.reg");
-  for (const auto& [whole, marker] :
+  for (const auto& [complete, marker] :
        {std::pair(text, "Second"s), std::pair(AsUtf16(text), AsUtf16("Second").substr(2))}) {
-    const size_t firstKeyEnd = whole.find(marker);
-    for (size_t size = firstKeyEnd; size < whole.size(); size += 3) {
-      EXPECT_NE(Dump(whole.substr(0, size)).find("\nOther=4294901778:A\n"), std::string::npos);
+    const size_t firstKeyEnd = complete.find(marker);
+    for (size_t size = firstKeyEnd; size < complete.size(); size += 3) {
+      EXPECT_NE(Dump(complete.substr(0, size)).find("\nOther=4294901778:A\n"), std::string::npos);
     }
   }
 }
@@ -118,8 +118,8 @@ TEST(Registry, KeepsTheLimitsOfNames) {
   }
 }
 
-// Whatever was asked before.
-TEST(Registry, AnswersAPathWithABackslashAtItsEndAlike) {
+// Whatever was queried before.
+TEST(Registry, IgnoresABackslashAtTheEndOfAPath) {
   const std::string text = header + "[HKEY_LOCAL_MACHINE\\A\\B\\C]\n\"a\"=\"b\"\n";
   for (const std::string earlier : {"", "A\\B", "A\\B\\", "A\\B\\C\\", "A\\B\\C\\\\"}) {
     RegistryExport registry(ReaderOf(text));
@@ -133,34 +133,34 @@ TEST(Registry, AnswersAPathWithABackslashAtItsEndAlike) {
   }
 }
 
-// Each of these takes long, or all of the stack, with a reader that is careless about it.
-TEST(Registry, EnduresMonstrousExports) {
+// With a careless parser each of these takes minutes or overflows the stack.
+TEST(Registry, ReadsHugeLinesInLinearTime) {
   constexpr size_t many = 50000;
   constexpr size_t megabytes = 2 << 20;
   const std::string key = "[HKEY_LOCAL_MACHINE\\S]\n";
   const std::string levels = Repeated("\\k", megabytes / 2);
-  const std::string monsters[] = {Repeated(" ", megabytes),
-                                  Repeated(key + "[-HKEY_LOCAL_MACHINE\\S]\n", many / 10),
-                                  "\"a\"=hex:00" + Repeated(",\\\n00", many) + ",",
-                                  "\"a\"=\"" + Repeated("x", megabytes),
-                                  "\"a\"=\"" + Repeated("no end\n", many),
-                                  "[HKEY_LOCAL_MACHINE\\S" + levels + "]",
-                                  "[-HKEY_LOCAL_MACHINE" + levels + "]",
-                                  Repeated("[", many) + Repeated("\\\n", many),
-                                  Repeated("\"", many) + Repeated("\"a\"=\"\n", many),
-                                  Repeated("\0"s, many) + Repeated("@=hex:\\", many)};
-  for (const std::string& monster : monsters) {
-    const std::string text = header + key + monster + '\n' + key + "\"after\"=\"2\"\n";
+  const std::string hugeLines[] = {Repeated(" ", megabytes),
+                                   Repeated(key + "[-HKEY_LOCAL_MACHINE\\S]\n", many / 10),
+                                   "\"a\"=hex:00" + Repeated(",\\\n00", many) + ",",
+                                   "\"a\"=\"" + Repeated("x", megabytes),
+                                   "\"a\"=\"" + Repeated("no end\n", many),
+                                   "[HKEY_LOCAL_MACHINE\\S" + levels + "]",
+                                   "[-HKEY_LOCAL_MACHINE" + levels + "]",
+                                   Repeated("[", many) + Repeated("\\\n", many),
+                                   Repeated("\"", many) + Repeated("\"a\"=\"\n", many),
+                                   Repeated("\0"s, many) + Repeated("@=hex:\\", many)};
+  for (const std::string& huge : hugeLines) {
+    const std::string text = header + key + huge + '\n' + key + "\"after\"=\"2\"\n";
     for (const std::string& bytes : {text, AsUtf16(text)}) {
       RegistryExport registry(ReaderOf(bytes));
-      EXPECT_EQ(registry.Read("S", "after", 100).Bytes, "2\0"s) << monster.substr(0, 40);
+      EXPECT_EQ(registry.Read("S", "after", 100).Bytes, "2\0"s) << huge.substr(0, 40);
       EXPECT_EQ(registry.SubKeyNames("S").size(), 0U);
     }
   }
 }
 
-// Neither for more keys nor for names with a backslash, which look like paths.
-TEST(Registry, DoesNotReadMoreForMoreQuestions) {
+// Neither for more keys nor for subkeys that do not exist.
+TEST(Registry, DoesNotReadMoreForMoreQueries) {
   std::string text = header;
   for (int i = 0; i < 2000; ++i) {
     const std::string parent = i < 1000 ? "SOFTWARE\\Other\\" : "SOFTWARE\\ZEK\\ORX\\";

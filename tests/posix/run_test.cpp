@@ -1,4 +1,4 @@
-// The program as an installer runs it: whole processes over a scratch folder.
+// The program as an installer runs it: processes over a scratch folder.
 
 #include <gtest/gtest.h>
 #include <sys/inotify.h>
@@ -40,7 +40,7 @@ class Run : public testing::Test, protected ScratchFolder {
   const std::string History = In("ZEK/ORXHistory/");
 };
 
-TEST_F(Run, ReturnsItsExitResults) {
+TEST_F(Run, ReturnsExitResults) {
   const std::string usage = "ORXInstallEvent";
   // The arguments, the result and how the output begins. What prints touches no history.
   const std::tuple<const char*, int, std::string> cases[] = {
@@ -64,7 +64,7 @@ TEST_F(Run, RecordsLocalTimes) {
             0);
 }
 
-TEST_F(Run, SurvivesHistoryFilesOfAnyKind) {
+TEST_F(Run, AcceptsAnyHistoryFile) {
   // The text, the count after a start and the number of sections.
   const std::tuple<std::string, const char*, size_t> cases[] = {
       {"", "1", 2},
@@ -86,8 +86,8 @@ TEST_F(Run, SurvivesHistoryFilesOfAnyKind) {
   }
 }
 
-// What is at the name of a file before a run, and what must hold after it.
-TEST_F(Run, LeavesWhatIsNoRegularFile) {
+// A script that prepares the history folder before a run, and a condition that holds after it.
+TEST_F(Run, DoesNotTouchSpecialFiles) {
   const char* cases[][2] = {
       {"mkdir -p History.ini/inside", "test -d History.ini/inside"},
       {"echo '[Other]' >other; ln -s other History.ini",

@@ -1,4 +1,4 @@
-// The services that a stand-in for the system bus, with a service manager on it, lists.
+// The services that are listed from a fake system bus with a fake service manager.
 
 #include "platform/services.h"
 
@@ -17,7 +17,7 @@
 
 namespace {
 
-// What is listed while another process serves the system bus.
+// The listing while another process serves the system bus.
 ServiceListing ListFrom(const std::function<void(int client)>& serve,
                         std::chrono::milliseconds limit = std::chrono::seconds(10)) {
   const std::string name = "orx-bus-" + std::to_string(::getpid());
@@ -41,16 +41,16 @@ ServiceListing ListFrom(const std::function<void(int client)>& serve,
   return listing;
 }
 
-// How the manager answers the question for its units.
-using Answer = int (*)(sd_bus_message* question);
+// How the manager replies to the query for its units.
+using Answer = int (*)(sd_bus_message* query);
 
 int AnswerCall(sd_bus_message* call, void* answer, sd_bus_error*) {
   if (sd_bus_message_is_method_call(call, "org.freedesktop.DBus", "Hello") > 0) {
     return sd_bus_reply_method_return(call, "s", ":1.1");
   }
   const char* manager = "org.freedesktop.systemd1.Manager";
-  const bool isQuestion = sd_bus_message_is_method_call(call, manager, "ListUnits") > 0;
-  return isQuestion ? (*static_cast<const Answer*>(answer))(call) : 0;
+  const bool isQuery = sd_bus_message_is_method_call(call, manager, "ListUnits") > 0;
+  return isQuery ? (*static_cast<const Answer*>(answer))(call) : 0;
 }
 
 std::function<void(int)> Manager(Answer answer) {
@@ -67,7 +67,7 @@ std::function<void(int)> Manager(Answer answer) {
   };
 }
 
-int ListUnits(sd_bus_message* question) {
+int ListUnits(sd_bus_message* query) {
   const char* const units[][4] = {{"zeta.service", "ORX Server", "loaded", "active"},
                                   {"a.socket", "No service", "loaded", "active"},
                                   {"off.service", "", "loaded", "inactive"},
@@ -79,7 +79,7 @@ int ListUnits(sd_bus_message* question) {
                                   {"odd.service", "Odd", "loaded", "maintenance"},
                                   {"a.service.mount", "No service", "loaded", "active"}};
   sd_bus_message* reply = nullptr;
-  sd_bus_message_new_method_return(question, &reply);
+  sd_bus_message_new_method_return(query, &reply);
   sd_bus_message_open_container(reply, 'a', "(ssssssouso)");
   for (const auto& [name, description, load, state] : units) {
     sd_bus_message_append(reply, "(ssssssouso)", name, description, load, state, "sub", "", "/unit",
@@ -102,7 +102,7 @@ TEST(Services, AreTheInstalledServiceUnitsInTheOrderOfTheBus) {
             "odd.service|Odd|0 ");
 }
 
-TEST(Services, AreMissingWhereTheAnswerIsNone) {
+TEST(Services, ReturnTheErrorOfAFailedQuery) {
   ::setenv("DBUS_SYSTEM_BUS_ADDRESS", "unix:path=/no/bus", /*overwrite=*/1);
   EXPECT_EQ(ListServices(std::chrono::seconds(1)).Error, uint32_t{ENOENT});
   const std::pair<Answer, uint32_t> cases[] = {

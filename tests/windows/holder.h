@@ -8,14 +8,9 @@
 #include <string>
 #include <thread>
 
-#include "platform/windows/system.h"
+#include "platform/windows/file_handle.h"
 
-inline UniqueHandle OpenExisting(const std::string& path, DWORD access, DWORD share) {
-  return OwnIfValid(::CreateFileA(path.c_str(), access, share, /*lpSecurityAttributes=*/nullptr,
-                                  OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, /*hTemplateFile=*/nullptr));
-}
-
-// Another program: what it acquires it keeps until the object ends, or for the time given.
+// Another program: it keeps what it has acquired until the object ends or the time has passed.
 class Holder {
  public:
   Holder(const std::function<UniqueHandle()>& acquire, std::chrono::steady_clock::duration time)
@@ -26,6 +21,9 @@ class Holder {
         }) {
     EXPECT_TRUE(Acquired.get_future().get());
   }
+  // It has a file open for reading.
+  Holder(const std::string& path, DWORD share, std::chrono::steady_clock::duration time)
+      : Holder([&] { return OpenExisting(path, GENERIC_READ, share); }, time) {}
   ~Holder() {
     Ended.set_value();
     Thread.join();

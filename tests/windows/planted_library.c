@@ -1,4 +1,5 @@
-/* Stands beside the program under the name of a library of the system. Whoever loads it ends. */
+/* Copied beside the program under the name of a library of the system; ends a process that loads
+   it. */
 #include <windows.h>
 
 BOOL WINAPI DllMain(HINSTANCE instance, DWORD reason, LPVOID reserved) {

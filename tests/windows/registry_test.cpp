@@ -7,7 +7,7 @@ namespace {
 constexpr size_t limit = 100;
 
 // Every Windows has this key and value.
-TEST(Registry, IsThatOfTheSystem) {
+TEST(Registry, IsTheOneOfTheSystem) {
   const std::string key = "Software\\Microsoft\\WINDOWS NT\\CurrentVersion";
   const auto read = [](const std::string& path, size_t size) {
     return ReadRegistryData(path, "CURRENTVERSION", size, RegistryAccess::kQueryValue);

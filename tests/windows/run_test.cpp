@@ -1,5 +1,5 @@
-// The program as an installer runs it: whole processes, among other programs that hold files. The
-// history is that of the machine, which is why these tests must be asked for.
+// The program as an installer runs it, while other programs hold files. It replaces the machine's
+// history, so these tests run only if a variable is set.
 
 #include <cstdlib>
 #include <thread>
@@ -34,7 +34,7 @@ class Run : public Platform {
   static std::string InHistory(const std::string& name) { return JoinPath(GetHistoryDir(), name); }
 };
 
-TEST_F(Run, LeavesOtherEventsAloneWhateverTheName) {
+TEST_F(Run, RefusesNamesThatLeadToOtherEvents) {
   EXPECT_EQ(Call("-start 42 -Product first"), 0);
   const std::string log = FileText(InHistory("42\\ORXInstallEvent.Log"));
   EXPECT_NE(log, "");
@@ -50,7 +50,7 @@ TEST_F(Run, LeavesOtherEventsAloneWhateverTheName) {
   }
 }
 
-TEST_F(Run, MakesNoFolderWhoseLogHasNoRoom) {
+TEST_F(Run, RefusesAFolderWhoseLogPathIsTooLong) {
   const size_t longest = 259 - InHistory("\\ORXInstallEvent.Log").size();
   for (const size_t length : {longest, longest + 1}) {
     const std::string name(length, 'x');
@@ -84,7 +84,7 @@ TEST_F(Run, WaitsForASummaryThatIsHeld) {
   EXPECT_EQ(Call("-start 1"), 0);
   const std::string summary = InHistory("Summary.txt");
   WriteFileText(summary, "old");
-  const Holder holder([&] { return OpenExisting(summary, GENERIC_READ, FILE_SHARE_READ); }, 100ms);
+  const Holder holder(summary, FILE_SHARE_READ, 100ms);
   CInstallHistory().WriteSummary();
   EXPECT_NE(FileText(summary), "old");
 }

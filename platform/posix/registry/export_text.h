@@ -7,12 +7,12 @@
 #include <string>
 #include <string_view>
 
-#include "platform/posix/utf16.h"
+#include "platform/utf8.h"
 
 // The text of a registry export, in UTF-8 or UTF-16LE. Offsets and sizes count bytes.
 
-// Copies bytes of the export from an offset on and returns how many: fewer than asked for only at
-// the end, or where reading fails. An export ends after 1 GiB, so that 32 bits hold an offset.
+// Copies up to size bytes of the export, from an offset on, and returns how many: fewer only at the
+// end, or where reading fails. An export ends after 1 GiB, so that 32 bits hold an offset.
 using ByteReader = std::function<size_t(uint64_t offset, char* buffer, size_t size)>;
 inline constexpr uint64_t kLongestExport = uint64_t{1} << 30;
 
@@ -43,6 +43,6 @@ inline std::string_view Decoded(std::string_view bytes, size_t width, std::strin
   if (width == 1) {
     return bytes;
   }
-  NarrowInto(buffer, bytes);
+  DecodeUtf16(buffer, bytes);
   return buffer;
 }

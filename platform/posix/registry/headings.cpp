@@ -57,7 +57,7 @@ uint32_t VisitHeadings(const ByteReader& read, const ExportFormat& format,
     got = read(offset, buffer.get(), bufferSize);
     const std::string_view all(buffer.get(), got);
     const size_t lastLineEnd = LastLineEnd(all, width);
-    // Whole lines, except at the end of the export; none of a line that is longer than the buffer.
+    // Complete lines, except at the end of the export; no part of one longer than the buffer.
     const std::string_view lines = all.substr(0, got == bufferSize ? lastLineEnd : got);
     size_t at = startsMidLine ? FindCharacter(lines, width, '\n', 0) : 0;
     while ((at = FindCharacter(lines, width, '[', at)) < lines.size()) {

@@ -5,6 +5,7 @@
 #include <string_view>
 
 #include "platform/ascii_case.h"
+#include "platform/utf8.h"
 
 // Names of keys and values, and key paths: names with one backslash between them. All in UTF-8.
 
@@ -26,25 +27,15 @@ inline bool IsAtOrBelow(std::string_view path, std::string_view top) {
 
 inline std::string_view FirstName(std::string_view path) { return path.substr(0, path.find('\\')); }
 
-// Of a key Windows allows 255 characters, counted in UTF-16: four bytes of UTF-8 are two.
-inline bool IsNameTooLong(std::string_view name) {
-  size_t characters = 0;
-  for (const char c : name) {
-    const auto byte = static_cast<uint8_t>(c);
-    characters += byte >= 0xF0 ? 2 : (byte & 0xC0) == 0x80 ? 0 : 1;
-  }
-  return characters > 255;
-}
-
-// Whether a path has no empty name, none that is too long, and at most 512 names, as Windows
-// allows.
+// Whether Windows allows the path: at most 512 names, none empty or longer than 255 characters,
+// counted in UTF-16.
 inline bool IsKeyPath(std::string_view path) {
   if (path.empty()) {
     return true;
   }
   for (int level = 0; level < 512; ++level) {
     const std::string_view name = FirstName(path);
-    if (name.empty() || IsNameTooLong(name)) {
+    if (name.empty() || Utf16Length(name) > 255) {
       return false;
     }
     if (name.size() == path.size()) {

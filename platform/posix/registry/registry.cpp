@@ -36,14 +36,14 @@ std::string_view KeyPathOf(std::string_view path) {
   return IsKeyPath(path) ? path : "\\\\";
 }
 
-// The keys beside one are likely to be asked for next. The parent of two names is a hive.
+// The siblings of a key are likely to be queried next. The parent of two names is a hive.
 std::string_view BranchTop(std::string_view path) {
   const std::string_view parent = path.substr(0, std::min(path.rfind('\\'), path.size()));
   return parent.find('\\') == std::string_view::npos ? path : parent;
 }
 
-// Kept for the whole run, as the interface has free functions and reading the export is slow. If
-// the folder changes, as in tests, the registry of the new folder replaces it.
+// Kept until the process ends, as the interface has free functions and reading the export is slow.
+// If the folder changes, as in tests, the registry of the new folder replaces it.
 RegistryExport& MachineRegistry() {
   static std::string currentPath;
   static std::optional<RegistryExport> current;

@@ -8,9 +8,9 @@
 #include "platform/posix/registry/branch.h"
 #include "platform/posix/registry/values.h"
 
-// Answers the questions of platform/registry.h from the bytes of a registry export. A question
-// about a key outside the branches read so far reads the export once and keeps one branch: that of
-// the key's parent, but never a whole hive. A question about values reads the lines of that key.
+// The functions of platform/registry.h over the bytes of a registry export. A query for a key
+// outside the branches read so far reads the export once and keeps one branch: that of the key's
+// parent, but never an entire hive. A query for values reads the lines of that key.
 class RegistryExport {
  public:
   explicit RegistryExport(ByteReader read);
@@ -26,6 +26,6 @@ class RegistryExport {
   ByteReader ReadBytes;
   ExportFormat Format;
   std::list<RegistryBranch> Branches;
-  std::optional<std::string> CurrentKey;  // whose values were asked for last
+  std::optional<std::string> CurrentKey;  // the last one whose values were read
   RegistryValues CurrentValues;
 };

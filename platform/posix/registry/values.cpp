@@ -139,7 +139,7 @@ class LineParser {
     const bool isText =
         data.Type == kRegistryText || data.Type == kExpandableText || data.Type == kMultipleText;
     if (isText && IsHexTextWide) {
-      NarrowInto(data.Bytes, std::string(data.Bytes));
+      DecodeUtf16(data.Bytes, std::string(data.Bytes));
     }
     return data;
   }

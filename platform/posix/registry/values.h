@@ -12,9 +12,9 @@
 // The values of one key.
 class RegistryValues {
  public:
-  // Adds what the lines below one of the key's headings say, in UTF-8. A value that is there
-  // already is replaced or, by "name"=-, removed. A line that cannot be read is skipped. One that
-  // begins with a bracket is a damaged heading, and ends the reading.
+  // Parses the lines below one of the key's headings, in UTF-8. An existing value is replaced or,
+  // by "name"=-, removed. A line that cannot be parsed is skipped. One that begins with a bracket
+  // is a damaged heading, and ends the parsing.
   void AddLines(std::string_view lines, const ExportFormat& format);
 
   // In the order in which they were first written, and spelled so.

@@ -1,0 +1,153 @@
+// The classes that open files.
+
+#include <fstream>
+#include <tuple>
+
+#include "platform/exclusive_file.h"
+#include "platform/new_file.h"
+#include "platform/shared_file.h"
+#include "platform/temporary_file.h"
+#include "tests/platform/contract.h"
+
+namespace {
+
+using OpenFiles = Platform;
+
+std::string Piece(const SharedFile& file, uint64_t offset, size_t size) {
+  std::string bytes(size, '#');
+  bytes.resize(file.ReadAt(offset, bytes.data(), size));
+  return bytes;
+}
+
+TEST_F(OpenFiles, AreRegularFilesOnly) {
+  std::error_code error;  // links are not possible everywhere
+  fs::create_symlink(Make("file", "text"), In("link"), error);
+  for (const std::string& path : {Make("folder/"), In("none"), In("link"), device, ""s}) {
+    ExclusiveFile exclusive(path);
+    char byte = 0;
+    EXPECT_FALSE(exclusive.IsOpen() || exclusive.Read(&byte, 1) > 0 || exclusive.Size() > 0)
+        << path;
+    for (const LinkPolicy links : {LinkPolicy::kRefuse, LinkPolicy::kFollow}) {
+      const SharedFile shared(path, links);
+      const bool isText = path == In("link") && links == LinkPolicy::kFollow && !error;
+      EXPECT_EQ(shared.IsOpen(), isText) << path;
+      EXPECT_EQ(Piece(shared, 0, 9), isText ? "text" : "") << path;
+    }
+  }
+}
+
+TEST_F(OpenFiles, CanBeReadByOneProgramOnly) {
+  const std::string bytes = "line\r\n\x1A\0"s + std::string(5000, 'b');
+  const std::string path = Make("file", bytes);
+  {
+    ExclusiveFile file(path);
+    char buffer[6000];
+    const size_t first = file.Read(buffer, 9);
+    const size_t rest = file.Read(buffer + first, sizeof buffer - first);
+    EXPECT_EQ(std::string(buffer, first + rest), bytes);
+    EXPECT_EQ(ExclusiveFile(path).IsOpen(), !isWindows);
+  }
+  EXPECT_TRUE(ExclusiveFile(path).IsOpen());
+}
+
+TEST_F(OpenFiles, EndWhereTheyEndedWhenOpened) {
+  const std::string path = Make("file", "0123456789");
+  ExclusiveFile file(path);
+  std::ofstream(path, std::ios::app) << "more";  // impossible on Windows
+  char buffer[20];
+  EXPECT_EQ(file.Size(), 10U);
+  EXPECT_EQ(file.Read(buffer, 4), 4U);
+  EXPECT_EQ(file.Read(buffer, sizeof buffer), 6U);
+  EXPECT_EQ(std::string(buffer, 6), "456789");
+  EXPECT_EQ(file.Read(buffer, sizeof buffer), 0U);
+}
+
+TEST_F(OpenFiles, AreReadAtAnyOffset) {
+  const SharedFile file(Make("a", "0123456789"), LinkPolicy::kRefuse);
+  EXPECT_EQ(file.Size(), 10U);
+  const std::tuple<uint64_t, size_t, const char*> cases[] = {
+      {0, 10, "0123456789"},      {3, 2, "34"}, {8, 9, "89"}, {10, 1, ""}, {0, 0, ""}, {11, 1, ""},
+      {uint64_t{1} << 40, 1, ""},
+  };
+  for (const auto& [offset, size, text] : cases) {
+    EXPECT_EQ(Piece(file, offset, size), text) << offset;
+  }
+}
+
+TEST_F(OpenFiles, CanBeReplacedWhileTheyAreShared) {
+  const SharedFile file(Make("a", "old"), LinkPolicy::kRefuse);
+  fs::rename(In("a"), In("b"));
+  Make("a", "new");
+  EXPECT_EQ(Piece(file, 0, 10), "old");
+  EXPECT_TRUE(fs::remove(In("b")));
+}
+
+TEST_F(OpenFiles, AreRemovedUnlessNewOnesAreFinished) {
+  { EXPECT_TRUE(NewFile(In("a")).Write("half")); }
+  EXPECT_EQ(Tree(), "");
+  NewFile file(In("a"));
+  EXPECT_TRUE(file.Write("one") && file.Write("") && file.Write("\0\n"s));
+  EXPECT_TRUE(file.Finish());
+  EXPECT_FALSE(file.Finish() || file.Write("more"));
+  EXPECT_EQ(FileText(In("a")), "one\0\n"s);
+  const fs::perms owners = fs::perms::owner_read | fs::perms::owner_write;
+  EXPECT_TRUE(isWindows || fs::status(In("a")).permissions() == owners);
+}
+
+TEST_F(OpenFiles, ReplaceNothingIfTheyAreNew) {
+  std::error_code error;
+  fs::create_symlink(In("elsewhere"), In("link"), error);
+  EXPECT_TRUE(error || !NewFile(In("link")).IsOpen());
+  for (const std::string& path : {Make("file", "old"), Make("folder/"), In("none/a"), device}) {
+    NewFile file(path);
+    EXPECT_FALSE(file.IsOpen() || file.Write("new") || file.Finish()) << path;
+  }
+  EXPECT_EQ(FileText(In("file")), "old");
+  EXPECT_FALSE(fs::exists(In("elsewhere")));
+}
+
+TEST_F(OpenFiles, HaveUniqueTemporaryNames) {
+  {
+    const TemporaryFile first(In("target"));
+    const TemporaryFile second(In("target"));
+    for (const TemporaryFile* file : {&first, &second}) {
+      ASSERT_TRUE(file->Exists());
+      EXPECT_EQ(FolderPart(file->Path()), FolderPart(In("target")));
+      EXPECT_TRUE(BaseName(file->Path()).starts_with('.'));
+      EXPECT_EQ(fs::file_size(file->Path()), 0U);
+      const fs::perms owners = fs::perms::owner_read | fs::perms::owner_write;
+      EXPECT_TRUE(isWindows || fs::status(file->Path()).permissions() == owners);
+    }
+    EXPECT_NE(first.Path(), second.Path());
+  }
+  EXPECT_EQ(Tree(), "");
+  TemporaryFile none(In("none/target"));
+  EXPECT_FALSE(none.Exists() || none.Replace() || none.MoveToNew());
+}
+
+TEST_F(OpenFiles, ReplaceRegularFilesOnly) {
+  Make("old", "old");
+  Make("folder/");
+  std::error_code error;
+  fs::create_symlink(In("old"), In("link"), error);
+  fs::create_symlink(In("nothing"), In("dangling"), error);
+  const std::string before = Tree();
+  for (const std::string target : {"old", "folder", "link", "dangling"}) {
+    const bool isTaken = fs::exists(fs::symlink_status(In(target)));
+    TemporaryFile file(In(target));
+    WriteFileText(file.Path(), "text of " + target);
+    EXPECT_EQ(file.MoveToNew(), !isTaken) << target;
+    EXPECT_EQ(isTaken && file.Replace(), target == "old") << target;
+  }
+  EXPECT_TRUE(error || Tree() == before) << Tree();
+  EXPECT_EQ(FileText(In("old")), "text of old");
+
+  for (bool (TemporaryFile::*operation)() : {&TemporaryFile::Replace, &TemporaryFile::MoveToNew}) {
+    TemporaryFile file(In("new"));
+    EXPECT_TRUE((file.*operation)());
+    EXPECT_FALSE(file.Exists() || file.Replace() || file.MoveToNew());
+    EXPECT_TRUE(fs::remove(In("new")));
+  }
+}
+
+}  // namespace
