@@ -87,6 +87,17 @@ struct Contents {
   }
 };
 
+std::map<Holder, Contents> CountContents(const std::set<Holder>& holders,
+                                         const std::vector<Change>& changes) {
+  std::map<Holder, Contents> contents;
+  for (const Change& change : changes) {
+    if (const auto holder = OutermostHolder(holders, change); holder != holders.end()) {
+      contents[*holder].Count(change.Where);
+    }
+  }
+  return contents;
+}
+
 std::string TitleOf(const Change& change) {
   const auto part = [&change](size_t i) {
     return i < change.Path.size() ? change.Path[i] : std::string();
@@ -167,12 +178,7 @@ ChangeLine LineOfOthers(size_t count) {
 
 std::vector<ChangeGroup> GroupChanges(const std::vector<Change>& changes, bool showsAll) {
   const std::set<Holder> holders = showsAll ? std::set<Holder>() : HoldersIn(changes);
-  std::map<Holder, Contents> contents;
-  for (const Change& change : changes) {
-    if (const auto holder = OutermostHolder(holders, change); holder != holders.end()) {
-      contents[*holder].Count(change.Where);
-    }
-  }
+  const std::map<Holder, Contents> contents = CountContents(holders, changes);
   Grouping grouping;
   const Change* folded = nullptr;
   size_t foldedProcesses = 0;

@@ -58,15 +58,9 @@ class RunReader {
       Cursor = kStartTitle.starts_with(Text) ? Text.size() : Cursor;
       return;
     }
-    const Mark& start = AllMarks.front();
-    AddMessages(Cursor, start.Begin);
-    LineReader lines(Text.substr(start.Begin));
-    Run.Start = ReadStart(lines);
-    if (Run.Start) {
-      Identity = Run.Start->Identity;
-      Run.Computer = ReadComputer(lines);
-    }
-    Cursor = Text.size() - lines.Remaining().size();
+    AddMessages(Cursor, AllMarks.front().Begin);
+    LineReader lines(Text.substr(AllMarks.front().Begin));
+    ReadStartBlocks(lines);
     const auto box = std::find_if(AllMarks.begin(), AllMarks.end(), [this](const Mark& mark) {
       return mark.Begin >= Cursor && mark.Kind == MarkKind::kBeforeBox;
     });
@@ -80,6 +74,15 @@ class RunReader {
     const std::string_view action = box->Text.substr(Identity->size() + words.size());
     Run.StartAction = action.substr(0, action.rfind(" Starts "));
     ReadBefore(Marks(box, AllMarks.end()));
+  }
+
+  void ReadStartBlocks(LineReader& lines) {
+    Run.Start = ReadStart(lines);
+    if (Run.Start) {
+      Identity = Run.Start->Identity;
+      Run.Computer = ReadComputer(lines);
+    }
+    Cursor = Text.size() - lines.Remaining().size();
   }
 
   void SkipBrokenBox(LineReader lines) {

@@ -70,6 +70,15 @@ void AskNameService(const Descriptor& output) {
   WriteAll(output, records);
 }
 
+// Adds the group if it is new; systems may list one more than once.
+std::vector<std::string>& MembersOf(const std::string& group, NameServiceAnswers& answers) {
+  const auto [entry, isNew] = answers.Members.try_emplace(group);
+  if (isNew) {
+    answers.Groups.push_back(group);
+  }
+  return entry->second;
+}
+
 // Without the end record some groups or members are missing: then it returns no groups at all.
 NameServiceAnswers ParseRecords(std::string_view records) {
   NameServiceAnswers answers;
@@ -83,14 +92,9 @@ NameServiceAnswers ParseRecords(std::string_view records) {
       case 'u':
         answers.OwnUser = text;
         break;
-      case 'g': {
-        const auto [entry, isNew] = answers.Members.try_emplace(text);
-        if (isNew) {
-          answers.Groups.push_back(text);
-        }
-        members = &entry->second;
+      case 'g':
+        members = &MembersOf(text, answers);
         break;
-      }
       case 'm':
         if (members != nullptr) {
           members->push_back(text);

@@ -96,21 +96,29 @@ bool ProfileStore::IsLocked(const std::string& path) const {
   return lock != Locks.end() && lock->second.Result() == LockResult::kLocked;
 }
 
+// Makes the temporary file and sets its path. Not open if it cannot be made.
+Descriptor ProfileStore::NewFileBeside(const std::string& path, mode_t mode,
+                                       std::string& temporary) const {
+  temporary = FixedPathBeside(path);
+  Descriptor file;
+  if (IsLocked(path)) {
+    RemoveFile(temporary);  // only a run that was killed can have left it
+    file = CreateNew(temporary, mode);
+  }
+  if (!file.IsOpen()) {
+    // No lock, or something of that name that cannot be removed: an event can be called anything.
+    temporary = RandomPathBeside(path);
+    file = CreateNew(temporary, mode);
+  }
+  return file;
+}
+
 // Writes the text to a temporary file and renames it over the profile file.
 bool ProfileStore::Store(const std::string& path, File& file) const {
   const bool isReplacement = file.Status.st_mode != 0;
   const mode_t mode = isReplacement ? 0600 : 0666;  // closed, until CopyAccess opens it
-  std::string temporary = FixedPathBeside(path);
-  Descriptor written;
-  if (IsLocked(path)) {
-    RemoveFile(temporary);  // only a run that was killed can have left it
-    written = CreateNew(temporary, mode);
-  }
-  if (!written.IsOpen()) {
-    // No lock, or something of that name that cannot be removed: an event can be called anything.
-    temporary = RandomPathBeside(path);
-    written = CreateNew(temporary, mode);
-  }
+  std::string temporary;
+  Descriptor written = NewFileBeside(path, mode, temporary);
   if (!written.IsOpen()) {
     return false;
   }

@@ -55,6 +55,7 @@ class ProfileStore {
   static bool IsCurrent(const std::string& path, const File& file);
   static void Read(const std::string& path, File& file);
   bool IsLocked(const std::string& path) const;
+  Descriptor NewFileBeside(const std::string& path, mode_t mode, std::string& temporary) const;
   bool Store(const std::string& path, File& file) const;
 
   std::map<std::string, File> Files;
