@@ -14,7 +14,7 @@ static bool IsHelp(std::string_view argument) {
   });
 }
 
-// Exit results: 0 to 2 from CInstallHistory::Run, 3 if the archive is not complete.
+// Exit codes: 0 to 2 from CInstallHistory::Run, 3 if the archive is not complete.
 int main(int argc, char** argv) {
   PrepareProcess();
   if (argc == 2 && IsHelp(argv[1])) {

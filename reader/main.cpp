@@ -15,7 +15,7 @@ static ViewOptions OptionsOf(const CommandLine& line, const Utf8Terminal& termin
   return options;
 }
 
-// Exit results: 0 done; 1 for a check that found something and a search that found nothing; 2 for a
+// Exit codes: 0 done; 1 for a check that found something and a search that found nothing; 2 for a
 // failure, which one line on standard error explains.
 int main(int argc, char** argv) {
   PrepareProcess();

@@ -4,7 +4,7 @@
 The commands of one comparison take turns (A B A B ...), so that a change of the machine's speed
 affects all of them. CPU time, of program and system together, decides; elapsed time is printed too.
 A ratio is that of the medians; the span after it is the lowest and highest ratio of one round.
-The exit result is not 0 only if something could not be measured.
+The exit code is not 0 only if something could not be measured.
 """
 import argparse
 import contextlib

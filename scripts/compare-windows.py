@@ -3,7 +3,7 @@
 
     compare-windows.py WINDOWS_PROGRAM LINUX_PROGRAM SCRATCH_FOLDER
 
-Exit results, output, history files, reports, summaries and archives must be the same, but for
+Exit codes, output, history files, reports, summaries and archives must be the same, but for
 separators, line ends, times and what shows the machine itself. The readers beside the programs must
 give the same answers for an archive. Ends with 1 and the differences.
 WINEPREFIX names a Windows of its own: its history and its registry keys of the tool are replaced.
