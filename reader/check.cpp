@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <string>
+#include <string_view>
 #include <unordered_set>
 #include <utility>
 
@@ -134,14 +135,3 @@ class Checker {
 }  // namespace
 
 FindingList CheckHistory(const History& history) { return Checker(history).Check(); }
-
-std::string_view LevelName(FindingLevel level) {
-  switch (level) {
-    case FindingLevel::kError:
-      return "error";
-    case FindingLevel::kWarning:
-      return "warning";
-    default:
-      return "note";
-  }
-}

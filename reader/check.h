@@ -1,13 +1,8 @@
 #pragma once
 
-#include <string_view>
-
 #include "reader/finding.h"
 #include "reader/history.h"
 
 // What is wrong or missing in a history, in the order of its events. It does not include
 // Source::Findings.
 FindingList CheckHistory(const History& history);
-
-// "error", "warning" or "note".
-std::string_view LevelName(FindingLevel level);

@@ -5,6 +5,17 @@
 #include "reader/limits.h"
 #include "reader/text_encoding.h"
 
+std::string_view LevelName(FindingLevel level) {
+  switch (level) {
+    case FindingLevel::kError:
+      return "error";
+    case FindingLevel::kWarning:
+      return "warning";
+    default:
+      return "note";
+  }
+}
+
 void FindingList::Add(Finding finding) {
   if (Bytes > kMostBytesOfFindings) {
     return;

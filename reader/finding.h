@@ -2,11 +2,15 @@
 
 #include <cstddef>
 #include <string>
+#include <string_view>
 #include <vector>
 
 // What is wrong or missing in a history. All texts are UTF-8.
 
 enum class FindingLevel { kError, kWarning, kNote };
+
+// "error", "warning" or "note".
+std::string_view LevelName(FindingLevel level);
 
 struct Finding {
   FindingLevel Level = FindingLevel::kError;

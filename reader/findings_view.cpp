@@ -1,6 +1,5 @@
 #include <algorithm>
 
-#include "reader/check.h"
 #include "reader/views.h"
 
 static Colour ColourOf(FindingLevel level) {

@@ -27,10 +27,9 @@ class HistoryFiles {
   const std::string& PathOf(size_t file) const { return Paths[file]; }
 
  private:
-  std::vector<std::string> Paths;  // of the files of the source
-  std::vector<size_t> ByPath;      // files, sorted
-  std::vector<size_t>
-      ByLoweredPath;  // sorted without case; those that differ in it alone by number
+  std::vector<std::string> Paths;     // of the files of the source
+  std::vector<size_t> ByPath;         // files, sorted
+  std::vector<size_t> ByLoweredPath;  // without case; paths that differ only in it, by number
 };
 
 // The part of a path of any system after its last separator.

@@ -1,14 +1,15 @@
 #include "reader/html.h"
 
 #include <algorithm>
-#include <cstdint>
 #include <cstdio>
+
+#include "platform/utf8.h"
 
 namespace {
 
 struct CodePoints {
-  uint32_t First;
-  uint32_t Last;
+  char32_t First;
+  char32_t Last;
 };
 
 // Shown by number: controls, and what is invisible or changes the direction of the text around it.
@@ -17,30 +18,15 @@ constexpr CodePoints numbered[] = {
     {0x2028, 0x202E}, {0x2060, 0x206F}, {0xFEFF, 0xFEFF}, {0xE0000, 0xE007F},
 };
 
-bool IsNumbered(uint32_t codePoint) {
+bool IsNumbered(char32_t codePoint) {
   return std::any_of(std::begin(numbered), std::end(numbered),
                      [codePoint](const CodePoints& range) {
                        return codePoint >= range.First && codePoint <= range.Last;
                      });
 }
 
-// The length in bytes of the sequence that this byte begins.
-size_t SequenceLength(char first) {
-  const auto byte = static_cast<unsigned char>(first);
-  return byte < 0xC0 ? 1 : byte < 0xE0 ? 2 : byte < 0xF0 ? 3 : 4;
-}
-
-uint32_t CodePointOf(std::string_view sequence) {
-  const auto first = static_cast<unsigned char>(sequence[0]);
-  uint32_t codePoint = sequence.size() == 1 ? first : first & (0x7FU >> sequence.size());
-  for (const char next : sequence.substr(1)) {
-    codePoint = codePoint << 6 | (static_cast<unsigned char>(next) & 0x3FU);
-  }
-  return codePoint;
-}
-
-std::string_view EntityOf(char c) {
-  switch (c) {
+std::string_view EntityOf(char32_t codePoint) {
+  switch (codePoint) {
     case '&':
       return "&amp;";
     case '<':
@@ -61,17 +47,17 @@ std::string_view EntityOf(char c) {
 std::string EscapeHtml(std::string_view text) {
   std::string html;
   html.reserve(text.size());
-  for (size_t i = 0; i < text.size();) {
-    const std::string_view sequence = text.substr(i, SequenceLength(text[i]));
-    i += sequence.size();
-    if (const uint32_t codePoint = CodePointOf(sequence); IsNumbered(codePoint)) {
+  while (!text.empty()) {
+    const std::string_view before = text;
+    const char32_t codePoint = TakeCharacter(text);
+    if (IsNumbered(codePoint)) {
       char number[16] = {};
-      std::snprintf(number, sizeof number, "[U+%04X]", codePoint);
+      std::snprintf(number, sizeof number, "[U+%04X]", static_cast<unsigned>(codePoint));
       html += number;
       continue;
     }
-    const std::string_view entity = EntityOf(sequence[0]);
-    html += entity.empty() ? sequence : entity;
+    const std::string_view entity = EntityOf(codePoint);
+    html += entity.empty() ? before.substr(0, before.size() - text.size()) : entity;
   }
   return html;
 }

@@ -3,8 +3,6 @@
 #include <nlohmann/json.hpp>
 #include <utility>
 
-#include "reader/check.h"
-
 namespace {
 
 using Json = nlohmann::ordered_json;

@@ -8,8 +8,8 @@
 #include "reader/history.h"
 
 // The JSON objects, each on one line without a line feed at its end. The text is valid UTF-8
-// whatever the arguments have. The source is the name of the archive or folder as on
-// the command line.
+// whatever the arguments have. The source is the name of the archive or folder as on the command
+// line.
 
 // The facts of an event and the number of its changes.
 std::string EventJson(std::string_view source, const Event& event);

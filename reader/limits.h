@@ -30,8 +30,7 @@ inline constexpr size_t kMostStarts = 1000;
 inline constexpr size_t kMostRows = 50'000;  // of one part of a snapshot
 
 // Of what is shown.
-inline constexpr size_t kMostBytesOfFindings = 8
-                                               << 20;  // of those of the source, and of the events
+inline constexpr size_t kMostBytesOfFindings = 8 << 20;  // of the source's, and of the events'
 inline constexpr size_t kMostBytesOfFindingText = 1000;
 inline constexpr size_t kMostBytesOfPageText = 4000;  // of one value, message or name on the page
 inline constexpr size_t kWidestColumn = 60;           // columns that the list pads a cell to

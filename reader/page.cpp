@@ -4,7 +4,6 @@
 #include <set>
 #include <string>
 
-#include "reader/check.h"
 #include "reader/event_text.h"
 #include "reader/folded_changes.h"
 #include "reader/html.h"
@@ -24,10 +23,10 @@ struct StateLook {
 };
 
 constexpr StateLook stateLooks[] = {
-    {EventState::kOk, "ok", "\xE2\x9C\x93", "ended well"},
-    {EventState::kFailed, "failed", "\xE2\x9C\x95", "ended with a failure"},
-    {EventState::kEnded, "ended", "\xE2\x80\xA2", "ended, the result says neither"},
-    {EventState::kOpen, "open", "\xE2\x80\xA6", "started, not ended"},
+    {EventState::kOk, "ok", "\u2713", "ended well"},
+    {EventState::kFailed, "failed", "\u2715", "ended with a failure"},
+    {EventState::kEnded, "ended", "\u2022", "ended, the result says neither"},
+    {EventState::kOpen, "open", "\u2026", "started, not ended"},
     {EventState::kNoStart, "no-start", "?", "ended without a start"},
 };
 

@@ -56,7 +56,7 @@ std::string ShortenedLabel(std::string_view text, size_t most) {
   for (size_t i = 0; i < text.size(); ++i) {
     const bool isFirstByte = (static_cast<unsigned char>(text[i]) & 0xC0U) != 0x80;
     if (isFirstByte && ++characters > most) {
-      return std::string(text.substr(0, i)) + "\xE2\x80\xA6";
+      return std::string(text.substr(0, i)) + "\u2026";
     }
   }
   return std::string(text);
