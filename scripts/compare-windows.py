@@ -334,7 +334,7 @@ def run_killed(side):
         process.communicate()
     side.start(["-start", "last"]).communicate(timeout=60)
     text = side.plain((side.history / "History.ini").read_bytes())
-    sections = parse_history((history_lines(text) + "\n").encode(), has_whole_events=True)
+    sections = parse_history((history_lines(text) + "\n").encode(), has_complete_events=True)
     check(sections["History"]["Count"] == str(len(sections) - 1), f"count of {list(sections)}")
     check(not list(side.history.glob(".*")), "litter")
     return "whole"

@@ -1,4 +1,4 @@
-"""The history file and the archive as all scripts read and write them."""
+"""The history file and the archive, as all scripts read and write them."""
 
 import re
 import zipfile
@@ -37,10 +37,10 @@ def format_history(sections):
                    for name, keys in sections.items())
 
 
-def parse_history(data, has_whole_events=False):
-    """The sections of a history file as the program writes it, in file order. Raises a Fault for a
-    line that is neither section nor key, for a name that comes twice, for a last line that is cut
-    and, on request, for an event with other keys than those of a start."""
+def parse_history(data, has_complete_events=False):
+    """The sections of a history file as the program writes it, in file order. A Fault: a line that
+    is neither section nor key, a repeated name, a cut last line and, on request, an event without
+    all keys of a start."""
     check(data.endswith(b"\n"), "the history does not end with a line end")
     sections = {}
     keys = None
@@ -56,9 +56,21 @@ def parse_history(data, has_whole_events=False):
         keys[key] = value
     check(re.fullmatch(r"\d+", sections.get("History", {}).get("Count", "")), "no Count")
     for name, keys in sections.items():
-        check(not has_whole_events or name == "History" or set(keys) == set(EVENT_KEYS),
+        check(not has_complete_events or name == "History" or set(keys) == set(EVENT_KEYS),
               f"part of section {name}")
     return sections
+
+
+def changed(sections, *changes):
+    """The sections after some keys, by section, were set. Setting an identity is a start, which
+    counts."""
+    result = {name: dict(keys) for name, keys in sections.items()}
+    for name, keys in changes:
+        result.setdefault(name, {}).update(keys)
+        if "Event_ID" in keys:
+            count = result.setdefault("History", {"Count": "0"})
+            count["Count"] = str(int(count["Count"]) + 1)
+    return result
 
 
 def without_times(sections):
@@ -66,17 +78,23 @@ def without_times(sections):
                    for key, value in keys.items()} for name, keys in sections.items()}
 
 
-def read_archive(path, has_blank_names=False):
-    """The entries of a valid archive of a history by name; no part of a name begins with a dot.
-    Blanks around a name are cut off, so that two files with names of nothing else may be one."""
+def archive_entries(path, encoding="utf-8"):
+    """The entries of a valid archive in its order: name, zipfile's properties, contents."""
     try:
         with zipfile.ZipFile(path) as archive:
-            check(archive.testzip() is None, f"damaged entry: {archive.testzip()}")
-            names = archive.namelist()
-            entries = {name: archive.read(name) for name in names}
+            # The names have no mark for their encoding, and so are decoded as code page 437.
+            return [(info.filename.encode("cp437").decode(encoding, "surrogateescape"), info,
+                     archive.read(info)) for info in archive.infolist()]
     except (zipfile.BadZipFile, OSError, ValueError, EOFError, zlib.error) as error:
         raise Fault(f"no valid archive: {error}") from error
-    check(has_blank_names or len(entries) == len(names), "an entry twice")
-    for name in names:
+
+
+def read_archive(path, has_blank_names=False):
+    """The contents of an archive's entries by name; no part of a name begins with a dot. The
+    program cuts blanks around a name off, so that two names of nothing else are one."""
+    packed = archive_entries(path)
+    entries = {name: data for name, _, data in packed}
+    check(has_blank_names or len(entries) == len(packed), "an entry twice")
+    for name in entries:
         check(not any(part.startswith(".") for part in name.split("/")), f"litter: {name}")
     return entries

@@ -1,6 +1,6 @@
 """Runs of all kinds, sixteen at once, over one history: first undisturbed, then with every third
 run killed at a random moment, then on a file system without locks. Meanwhile a reader parses the
-history file. At the end everything that finished must be there, whole and once.
+history file. At the end everything that finished must be there, complete and once.
 """
 
 import random
@@ -8,7 +8,7 @@ import threading
 import time
 
 import history
-from harness import Machine, in_threads, injecting
+from harness import Target, in_threads, injecting, wait_for
 from history import check
 
 WORKERS = 16
@@ -17,36 +17,38 @@ COPIES = 5
 
 
 class Crowd:
-    """The workers of one round and what they know to be finished. Lists and sets only grow, by one
-    element at a time, which needs no lock."""
+    """The workers of one round and what they know to be finished. Lists and sets are only added to,
+    one element at a time, which needs no lock."""
 
-    has_whole_events = True
+    has_complete_events = True
 
-    def __init__(self, machine, seconds):
+    def __init__(self, machine, seconds, killed_share=0):
         self.machine = machine
         self.until = time.monotonic() + seconds
-        self.results, self.reports = [], []
-        self.looks = 0
+        self.killed_share = killed_share
+        self.codes, self.reports = [], []
+        self.parsed = 0
         self.begun, self.started, self.ending = set(SHARED), set(SHARED), set()
         self.copies = {}  # event: copy, of the finished ends
-        self.messages = {}  # event: texts of the finished runs
-        self.cut = set()  # texts of the killed ones
+        self.messages = {}  # event: messages of the finished runs
+        self.cut = set()  # messages of the killed ones
 
     def before(self, chance):
         """The words before a run: none, or a command that kills it."""
-        del chance
-        return ()
+        if chance.random() >= self.killed_share:
+            return ()
+        return ("timeout", "--signal=KILL", f"{chance.uniform(0.001, 0.08):.4f}")
 
     def run(self, chance, *words):
         """True for a run that finished."""
         before = self.before(chance)
-        result, output = self.machine.run(*words, before=before, timeout=60)
-        self.results.append(result)
-        check(result == 0 or before, f"result {result}: {words} {output}")
-        return result == 0
+        code, output = self.machine.run(*words, before=before, timeout=60)
+        self.codes.append(code)
+        check(code == 0 or before, f"exit code {code}: {words} {output}")
+        return code == 0
 
     def send(self, chance, event, text):
-        if self.run(chance, "-logmessage", event, "-message", text):
+        if self.run(chance, "-logmessage", event, "-message", f"^{text}$"):
             self.messages.setdefault(event, []).append(text)
         else:
             self.cut.add(text)
@@ -58,10 +60,10 @@ class Crowd:
         if not self.run(chance, "-start", event, "-Product", f"P{event}"):
             return
         self.started.add(event)
-        self.send(chance, event, f"{event} own first")
+        self.send(chance, event, f"{event} first")
         length = chance.choice((10, 100, 5000, 60000))
-        self.send(chance, SHARED[number % len(SHARED)], f"{event} {'x' * length} shared")
-        self.send(chance, event, f"{event} own second")
+        self.send(chance, SHARED[number % len(SHARED)], f"{event} {'x' * length}")
+        self.send(chance, event, f"{event} second")
         copy = f"C{chance.randrange(COPIES)}"
         self.ending.add(event)
         if self.run(chance, "-end", event, "-CopyName", copy, "-Result", f"R{event}"):
@@ -73,7 +75,7 @@ class Crowd:
         archive = self.machine.scratch / f"{worker}.zip"
         if self.run(chance, "-report", str(archive)):
             entries = history.read_archive(archive)
-            history.parse_history(entries["History.ini"], has_whole_events=True)
+            history.parse_history(entries["History.ini"], has_complete_events=True)
             self.reports.append(archive)
 
     def message_during_start(self, number):
@@ -82,14 +84,12 @@ class Crowd:
         log = self.machine.history / event / history.LOG
         start = threading.Thread(target=self.machine.run, args=("-start", event))
         start.start()
-        while not log.exists():
-            time.sleep(0.0005)
-        self.machine.must("-logmessage", event, "-message", "early message")
+        wait_for(log.exists, "no log")
+        self.machine.must("-logmessage", event, "-message", "^early$")
         start.join()
-        lines = log.read_text(errors="replace").splitlines()
-        check(lines.count("early message") == 1, "a start wrote over a message")
         self.begun.add(event)
         self.started.add(event)
+        self.messages[event] = ["early"]
 
     def work(self, outcome, worker):
         chance = random.Random(worker)
@@ -101,30 +101,30 @@ class Crowd:
     def read(self, outcome):
         while time.monotonic() < self.until:
             outcome.attempt("overlap, reader", lambda: history.parse_history(
-                self.machine.ini.read_bytes(), self.has_whole_events))
-            self.looks += 1
+                self.machine.ini.read_bytes(), self.has_complete_events))
+            self.parsed += 1
             time.sleep(0.01)
 
     def go(self, outcome):
         for event in SHARED:
             self.machine.must("-start", event)
         for number in range(10):
-            outcome.attempt("overlap, early message", lambda n=number: self.message_during_start(n))
+            outcome.attempt("overlap, early message", lambda: self.message_during_start(number))
         in_threads([(self.work, outcome, worker) for worker in range(WORKERS)]
                    + [(self.read, outcome)])
         self.judge(outcome)
 
     def judge(self, outcome):
-        sections = (outcome.attempt("overlap, history", self.machine.sections)
-                    or {"History": {"Count": "0"}})
+        sections = outcome.attempt("overlap, history", self.machine.sections) or {}
         outcome.attempt("overlap, count", lambda: self.check_count(sections))
         for event in self.started:
             for check_part in self.check_event, self.check_log:
                 outcome.attempt(f"overlap, event {event}",
-                                lambda f=check_part, e=event: f(sections.get(e), e))
+                                lambda: check_part(sections.get(event), event))
         outcome.attempt("overlap, last report", self.check_last_report)
 
     def check_count(self, sections):
+        check(self.started <= set(sections) - {"History"} <= self.begun, "sections")
         count = int(sections["History"]["Count"])
         check(len(self.started) <= count <= len(self.begun),
               f"count {count}, finished {len(self.started)}, begun {len(self.begun)}")
@@ -132,7 +132,7 @@ class Crowd:
     def check_event(self, keys, event):
         check(keys, "lost section")
         check(keys["Complete_Flag"] == "TRUE" or event not in self.copies, "lost end")
-        check(keys["Complete_Flag"] == "FALSE" or event in self.ending, "strange end")
+        check(keys["Complete_Flag"] == "FALSE" or event in self.ending, "end without a run")
         check(keys["Product"] == f"P{event}" or "-" not in event, "lost product")
 
     def check_log(self, keys, event):
@@ -141,52 +141,33 @@ class Crowd:
         if event in self.copies:
             check(str(log) == keys["Event_Log_File"], "the key names another log")
             check("( End )" in lines[-1], "log does not end")
-        sent = self.messages.get(event, [])
-        found = [self.without_remains(line, sent) for line in lines
-                 if line.endswith((" own first", " own second", " shared"))]
-        check(sorted(line for line in found if line not in self.cut) == sorted(sent),
-              "messages lost, torn or doubled")
+        found = [message for line in lines for message in self.messages_of(line)]
         check(len(found) == len(set(found)), "a message twice")
-        check(event in SHARED or [m for m in found if m in sent] == sent, "order")
-        check(not any("own first" in line or " own second" in line or "xxx" in line
-                      for line in lines if line not in found
-                      and not any(text.startswith(line) for text in self.cut)), "torn message")
+        finished = [message for message in found if message not in self.cut]
+        sent = self.messages.get(event, [])
+        check(sorted(finished) == sorted(sent), "messages lost or torn")
+        check(event in SHARED or finished == sent, "order")
 
-    def without_remains(self, line, sent):
-        """The line without the beginning of a message whose run was killed in the middle of it: the
-        next one follows on the same line."""
-        if line in sent or line in self.cut:
-            return line
-        for text in sent:
-            remains = line[:-len(text)]
-            if line.endswith(text) and any(cut.startswith(remains) for cut in self.cut):
-                return text
-        return line
+    def messages_of(self, line):
+        """The messages of a line, one or none. What a killed run has written of its message is
+        before that of the next run."""
+        before, *parts = line.split("^")
+        check(not before or not parts, "text before a message")
+        messages = [parts.pop()[:-1]] if parts and line.endswith("$") else []
+        for part in parts:
+            check(any(f"{message}$".startswith(part) for message in self.cut), "torn message")
+        return messages
 
     def check_last_report(self):
         self.machine.check_report(timeout=120)
         self.machine.must("-start", "after")
-        check(not (self.machine.history / ".History.tmp").exists(), "litter")
-
-
-class UndisturbedCrowd(Crowd):
-    def check_count(self, sections):
-        check(self.started == self.begun == set(sections) - {"History"}, "sections")
-        check(int(sections["History"]["Count"]) == len(self.begun), "count")
         check(not list(self.machine.history.rglob(".*")), "litter")
 
 
-class KilledCrowd(Crowd):
-    def before(self, chance):
-        if chance.random() < 2 / 3:
-            return ()
-        return ("timeout", "--signal=KILL", f"{chance.uniform(0.001, 0.08):.4f}")
-
-
 class UnlockedCrowd(Crowd):
-    """Runs may undo each other's changes here: only what each leaves must be whole."""
+    """Runs may undo each other's changes here: only what each leaves must be complete."""
 
-    has_whole_events = False
+    has_complete_events = False
 
     def before(self, chance):
         # The delay, in microseconds, leaves a new file empty for so long.
@@ -205,16 +186,14 @@ class UnlockedCrowd(Crowd):
         outcome.attempt("overlap, history", self.machine.sections)
 
 
-ROUNDS = (("undisturbed", UndisturbedCrowd, 0.5), ("killed", KilledCrowd, 0.35),
-          ("without locks", UnlockedCrowd, 0.15))
-
-
 def attack_together(program, outcome, seconds, _):
-    for name, kind, share in ROUNDS:
-        with Machine(program) as machine:
-            crowd = kind(machine, seconds * share)
+    for name, share, kind, options in (
+            ("undisturbed", 0.5, Crowd, {}), ("killed", 0.35, Crowd, {"killed_share": 1 / 3}),
+            ("without locks", 0.15, UnlockedCrowd, {})):
+        with Target(program) as machine:
+            crowd = kind(machine, seconds * share, **options)
             crowd.go(outcome)
-        killed = len(crowd.results) - crowd.results.count(0)
-        print(f"overlap, {name}: {len(crowd.results)} runs, {killed} of them killed, "
-              f"{len(crowd.reports)} archives and {crowd.looks} histories read meanwhile",
+        killed = len(crowd.codes) - crowd.codes.count(0)
+        print(f"overlap, {name}: {len(crowd.codes)} runs, {killed} of them killed, "
+              f"{len(crowd.reports)} archives and {crowd.parsed} histories read meanwhile",
               flush=True)

@@ -4,7 +4,7 @@
     run.py [--program PATH] [--only NAME] [--seconds N] [--list]
 
 Without options every attack runs against build/release/ORXInstallEventLog; what does not hold is
-printed under the attack's name, and the result is 1. "--only NAME" runs the attacks whose name
+printed under the attack's name, and the exit code is 1. "--only NAME" runs the attacks whose name
 contains NAME ("kill: report, write 117" is one of a family), "--program" another program, for
 example an older one that must fail. "--seconds N" limits the three large families (kill, overlap,
 planted) to about N seconds together, as a sample; all other attacks always run.
@@ -12,25 +12,25 @@ planted) to about N seconds together, as a sample; all other attacks always run.
 To add an attack, write a short function in one of the files of attacks/:
 
     @attack()
-    def pipe_as_archive_name(machine):
-        os.mkfifo(machine.archive)
-        machine.must("-report", str(machine.archive), result=3)
+    def folder_as_archive_name(machine):
+        machine.archive.mkdir()
+        machine.report(code=3)
 
-It gets a scratch machine of its own (harness.Machine): `run`, `must`, `start` and `record` run the
-program, `sections` reads the history strictly, `history.read_archive` an archive. `check(holds,
-message)` states a promise. The machine is removed whatever happens, what was given to
-`machine.callback` before that; that nothing outside the history has changed is checked after every
+It gets a temporary machine of its own (harness.Target): `run`, `must`, `start`, `record` and
+`report` run the program, `sections` and `packed` read the history and the archive strictly.
+`check(holds, message)` states a promise. The machine is removed whatever happens, after what was
+given to `machine.callback`; that nothing outside the history has changed is checked after every
 attack. Several rows of one attack are written as a table:
 
-    @attack(("a pipe", os.mkfifo), ("a folder", os.mkdir))
-    def taken_archive_name(machine, make):
+    @attack("Summary.txt", "History.ini")
+    def archive_in_place_of(machine, name):
 
-"needs_root=True" skips an attack for other users. A new file in attacks/ is found by itself.
+An attack that begins with `require_root()` is skipped for other users. A new file in attacks/ is
+found by itself.
 """
 
 import argparse
 import importlib
-import os
 import sys
 from pathlib import Path
 
@@ -40,19 +40,13 @@ import history  # noqa: E402
 import kill  # noqa: E402
 import overlap  # noqa: E402
 import planted  # noqa: E402
-from harness import ATTACKS, Outcome, run_attack  # noqa: E402
+from harness import ATTACKS, run_attack  # noqa: E402
+from machine import Outcome  # noqa: E402
 
-# Name, function, share of the seconds of a sample, seconds of a whole run (0: until all is done).
+# Name, function, share of the seconds of a sample, seconds without a limit (0: until all is done).
 FAMILIES = (("kill", kill.attack_calls, 0.6, 0),
             ("overlap", overlap.attack_together, 0.2, 90),
             ("planted", planted.attack_paths, 0.2, 0))
-
-
-def load_attacks():
-    folder = Path(__file__).parent / "attacks"
-    sys.path.insert(0, str(folder.parent))
-    for file in sorted(folder.glob("*.py")):
-        importlib.import_module(f"attacks.{file.stem}")
 
 
 def main():
@@ -63,28 +57,25 @@ def main():
     parser.add_argument("--seconds", type=float, default=0)
     parser.add_argument("--list", action="store_true", help="print the names and do nothing")
     options = parser.parse_args()
-    load_attacks()
-    attacks = [entry for entry in ATTACKS if options.only in entry.name]
+    for file in sorted((Path(__file__).parent / "attacks").glob("*.py")):
+        importlib.import_module(f"attacks.{file.stem}")
+    attacks = [name for name in ATTACKS if options.only in name]
     families = [family for family in FAMILIES
                 if options.only in family[0] or options.only.startswith(family[0] + ": ")]
     if options.list:
-        print("\n".join([entry.name for entry in attacks] + [family[0] for family in families]))
+        print("\n".join([*attacks, *(family[0] for family in families)]))
         return
     if not attacks and not families:
         parser.error("no attack has that name")
     outcome = Outcome()
-    for entry in attacks:
-        if entry.needs_root and os.geteuid() != 0:
-            print(f"skipped {entry.name}: only root can try it")
-            continue
-        outcome.attempt(entry.name, lambda entry=entry: run_attack(options.program, entry.action))
+    for name in attacks:
+        outcome.attempt(name, lambda: run_attack(options.program, ATTACKS[name]))
     print(f"{len(attacks)} attacks: {outcome.summary()}", flush=True)
     shares = sum(share for _, _, share, _ in families)
-    for name, attack_family, share, whole in families:
-        seconds = options.seconds * share / shares if options.seconds else whole
+    for name, attack_family, share, unlimited in families:
+        seconds = options.seconds * share / shares if options.seconds else unlimited
         only = options.only if ":" in options.only else ""
-        outcome.attempt(name, lambda f=attack_family, s=seconds, o=only: f(
-            options.program, outcome, s, o))
+        outcome.attempt(name, lambda: attack_family(options.program, outcome, seconds, only))
     print(outcome.summary())
     sys.exit(1 if outcome.faults else 0)
 

@@ -7,9 +7,9 @@ import subprocess
 import time
 
 import history
-from harness import attack, injecting
+from harness import RUNS, attack, injecting, require_root, wait_for
 from history import check
-from planted import RUNS, listen, run_any
+from planted import KINDS
 
 OLDER = b"an older archive"
 
@@ -18,78 +18,52 @@ def failure_line(path):
     return f" Failed to create file '{path}'\n".encode()
 
 
-def success_line(path):
-    return f"The file '{path}' is created successfully\n".encode()
-
-
-def check_older_stays(machine, **options):
-    """A report that cannot be completed leaves the older archive and nothing else."""
-    before = os.listdir(machine.archives)
-    output = machine.must("-report", str(machine.archive), result=3, **options)
-    check(machine.archive.read_bytes() == OLDER, "older archive lost")
-    check(os.listdir(machine.archives) == before, "litter")
-    return output
-
-
-def wait_for(holds, message):
-    until = time.monotonic() + 10
-    while not holds():
-        check(time.monotonic() < until, message)
-        time.sleep(0.002)
+def check_no_litter(machine):
+    check(os.listdir(machine.archives) == [machine.archive.name], "litter")
 
 
 @attack()
 def archive_in_the_history(machine):
     """It contains neither itself nor the older one, under any name."""
     for words in RUNS:
-        run_any(machine, words)
+        machine.run_any(words)
     inside = machine.history / "C1" / "history.zip"
-    for _ in range(2):
-        machine.must("-report", str(inside))
-        check(not [name for name in history.read_archive(inside) if "zip" in name], "holds itself")
-    os.link(inside, machine.history / "other zip")
-    machine.must("-report", str(machine.history / "C1/../C1/history.zip"))
-    check(not [name for name in history.read_archive(inside) if "zip" in name], "holds the older")
+    for name in ("C1/history.zip", "C1/history.zip", "C1/../C1/history.zip"):
+        machine.must("-report", str(machine.history / name))
+        check(not [entry for entry in history.read_archive(inside) if "zip" in entry],
+              "contains itself or the older one")
+        (machine.history / "other zip").unlink(missing_ok=True)
+        os.link(inside, machine.history / "other zip")
 
 
-@attack(
-    ("a pipe", os.mkfifo),
-    ("a socket", listen),
-    ("a folder", os.mkdir),
-    ("a link to a file", lambda path: path.symlink_to("../outside/file")),
-    ("a link to nothing", lambda path: path.symlink_to("../outside/new")))
-def archive_name_taken_by(machine, make):
+@attack(*(kind for kind in KINDS if kind != "hard link"), "device")
+def archive_name_taken_by(machine, kind):
     machine.record("7")
-    make(machine.archive)
+    if kind == "device":
+        require_root()
+        os.mknod(machine.archive, stat.S_IFCHR | 0o600, os.makedev(1, 3))
+    else:
+        KINDS[kind](machine.archive, machine.outside)
     before = machine.archive.lstat()
-    output = machine.must("-report", str(machine.archive), result=3)
+    output = machine.report(code=3)
     check(output == failure_line(machine.archive), f"prints {output}")
     after = machine.archive.lstat()
     check((after.st_ino, after.st_mode) == (before.st_ino, before.st_mode), "replaced")
-    check(os.listdir(machine.archives) == [machine.archive.name], "litter")
+    check_no_litter(machine)
 
 
-@attack(needs_root=True)
-def archive_name_taken_by_a_device(machine):
-    os.mknod(machine.archive, stat.S_IFCHR | 0o600, os.makedev(1, 3))
-    machine.record("7")
-    machine.must("-report", str(machine.archive), result=3)
-    check(stat.S_ISCHR(machine.archive.lstat().st_mode), "device replaced")
-
-
-@attack(*((name, name) for name in (
-    "History.ini", "C1/../History.ini", "C1/7/ORXInstallEvent.Log", "open/ORXInstallEvent.Log",
-    "Summary.txt", "C1/Summary.txt", "linked/ORXInstallEvent.Log", "hard link")))
+@attack("History.ini", "C1/../History.ini", "C1/7/ORXInstallEvent.Log", "open/ORXInstallEvent.Log",
+        "Summary.txt", "C1/Summary.txt", "linked/ORXInstallEvent.Log", "hard link")
 def archive_in_place_of(machine, name):
     """Files that the history itself uses, also in other spellings."""
     machine.record("7")
     machine.must("-start", "open")
     (machine.history / "linked").symlink_to("C1/7")
-    machine.must("-report", str(machine.archive))
+    machine.report()
     os.link(machine.ini, machine.history / "hard link")
-    before = (machine.history / name).read_bytes()
     path = machine.history / name
-    output = machine.must("-report", str(path), result=3)
+    before = path.read_bytes()
+    output = machine.must("-report", str(path), code=3)
     check(output == failure_line(path), f"prints {output}")
     check(path.read_bytes() == before, "replaced")
 
@@ -97,8 +71,14 @@ def archive_in_place_of(machine, name):
 @attack()
 def archive_is_its_owners_alone(machine):
     machine.record("7")
-    machine.must("-report", str(machine.archive), preexec_fn=lambda: os.umask(0))
+    machine.report(preexec_fn=lambda: os.umask(0))
     check(stat.S_IMODE(machine.archive.stat().st_mode) == 0o600, "others can read it")
+
+
+def record_much(machine, megabytes):
+    """An event, and so much that does not pack."""
+    machine.record("7")
+    (machine.history / "big").write_bytes(os.urandom(megabytes << 20))
 
 
 def start_archive(machine, archive):
@@ -118,50 +98,53 @@ def start_archive(machine, archive):
 @attack()
 def killed_report(machine):
     """Killed in the middle of the archive. What it leaves is in no later archive."""
-    machine.record("7")
-    (machine.history / "big").write_bytes(os.urandom(16 << 20))
+    record_much(machine, megabytes=16)
     for archive in (machine.archive, machine.history / "C1/a.zip"):
         archive.write_bytes(OLDER)
         process = start_archive(machine, archive)
         process.kill()
         process.wait()
         check(archive.read_bytes() == OLDER, "older archive lost")
-    machine.must("-report", str(machine.archive))
-    check("C1/a.zip" in history.read_archive(machine.archive), "incomplete")
+    machine.report()
+    check("C1/a.zip" in machine.packed(), "incomplete")
 
 
 @attack()
 def reports_to_one_name(machine):
     """The history changes between two reports that overlap. The last one stays."""
-    machine.record("7")
-    (machine.history / "big").write_bytes(os.urandom(8 << 20))
+    record_much(machine, megabytes=8)
     processes = [start_archive(machine, machine.archive)]
     (machine.history / "C1/7/new").write_bytes(os.urandom(4 << 20))
     processes.append(machine.start("-report", str(machine.archive)))
     for process in processes:
-        check(process.wait(20) == 0, "result of a report")
-        check("big" in history.read_archive(machine.archive), "incomplete")
-    check(os.listdir(machine.archives) == [machine.archive.name], "litter")
+        check(process.wait(20) == 0, "exit code of a report")
+        check("big" in machine.packed(), "incomplete")
+    check_no_litter(machine)
 
 
 @attack(("at once", 64 << 10), ("near the end", 4 << 20))
 def archive_over_the_file_size_limit(machine, limit):
-    machine.record("7")
-    (machine.history / "big").write_bytes(os.urandom(4 << 20))
+    record_much(machine, megabytes=4)
     machine.archive.write_bytes(OLDER)
-    output = check_older_stays(machine, before=("prlimit", f"--fsize={limit}"))
-    check(output == success_line(machine.archive), f"prints {output}")
+    output = machine.report(code=3, before=("prlimit", f"--fsize={limit}"))
+    check(output == f"The file '{machine.archive}' is created successfully\n".encode(),
+          f"prints {output}")
+    check(machine.archive.read_bytes() == OLDER, "older archive lost")
+    check_no_litter(machine)
 
 
-@attack(*((f"{room} bytes", room) for room in (0, 4 << 10, 64 << 10, 1 << 20)), needs_root=True)
-def archive_on_a_full_disk(machine, room):
-    """The disk of the archive has only that room."""
-    machine.record("7")
-    (machine.history / "big").write_bytes(os.urandom(2 << 20))
+@attack(*((f"{left} bytes", left) for left in (0, 4 << 10, 64 << 10, 1 << 20)))
+def archive_on_a_full_disk(machine, left):
+    """The disk of the archive has only so much left."""
+    record_much(machine, megabytes=2)
     machine.mount(machine.archives, "4m")
     machine.archive.write_bytes(OLDER)
-    (machine.archives / "filler").write_bytes(bytes((4 << 20) - 4096 - room))
-    check_older_stays(machine)
+    filler = machine.archives / "filler"
+    filler.write_bytes(bytes((4 << 20) - 4096 - left))
+    machine.report(code=3)
+    check(machine.archive.read_bytes() == OLDER, "older archive lost")
+    filler.unlink()
+    check_no_litter(machine)
 
 
 # Before a temporary file is opened again to write to it or to flush it, somebody replaces it by a
@@ -184,17 +167,17 @@ int open(const char* path, int flags, int mode) {
 
 
 @attack(("a collected copy", "root/ZEK/ORXHistory/C1/7/.", 0), ("the archive", "archives/.", 3))
-def link_in_place_of_the_temporary_file_of(machine, beginning, result):
+def link_in_place_of_the_temporary_file_of(machine, beginning, code):
     machine.record("7")
     machine.archive.write_bytes(OLDER)
-    machine.must("-report", str(machine.archive), result=result, variables={
+    machine.report(code=code, variables={
         **machine.with_functions(SWAP), "TEMPORARY": f"{machine.scratch}/{beginning}",
         "OUTSIDE": str(machine.outside / "file")})
     links = [path for path in machine.scratch.rglob("[!.]*") if path.is_symlink()]
     check(not links, f"renamed: {links}")
 
 
-@attack(("packed", "C1/7/growing", "read"), ("collected", "../../../setup.log", "sendfile"))
+@attack(("packed", "C1/7/appended", "read"), ("collected", "../../../setup.log", "sendfile"))
 def file_that_grows_while_it_is(machine, name, call):
     """Somebody appends to it all the time, faster than it is read."""
     machine.record("7")
@@ -203,24 +186,24 @@ def file_that_grows_while_it_is(machine, name, call):
     machine.callback(writer.wait)
     machine.callback(writer.kill)
     wait_for(path.exists, "does not grow")
-    machine.must("-report", str(machine.archive), before=injecting(call, "delay_enter=200000"))
+    machine.report(before=injecting(call, "delay_enter=200000"))
     writer.kill()
     machine.watch()
-    entries = history.read_archive(machine.archive)
-    check({"C1/7/growing", "C1/7/setup.log"} & set(entries), "not packed")
+    check({"C1/7/appended", "C1/7/setup.log"} & set(machine.packed()), "not packed")
 
 
-@attack(needs_root=True)
+@attack()
 def containers_with_equal_process_numbers(machine):
     """Two reports collect one file at once."""
+    require_root()
     machine.record("7")
-    processes = []
+    processes = {}
     for call, microseconds in (("renameat2", 1000000), ("sendfile", 2000000)):
-        archive = machine.archives / call
         before = ("unshare", "--pid", "--fork", *injecting(call, f"delay_enter={microseconds}"))
-        processes.append((machine.start("-report", str(archive), before=before), archive))
+        archive = machine.archives / call
+        processes[archive] = machine.start("-report", str(archive), before=before)
         time.sleep(0.3)
-    for process, archive in processes:
-        check(process.wait(20) == 0, "result of a report")
+    for archive, process in processes.items():
+        check(process.wait(20) == 0, "exit code of a report")
         copy = history.read_archive(archive)["C1/7/setup.log"]
         check(copy == machine.source.read_bytes(), "a copy is cut")

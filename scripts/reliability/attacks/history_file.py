@@ -5,12 +5,11 @@ import os
 import stat
 import time
 
-import history
 from harness import attack, injecting
 from history import check
 
 
-@attack(*((call, call) for call in ("fchown", "fchmod")))
+@attack("fchown", "fchmod")
 def temporary_file_of_a_closed_history(machine, call):
     """Killed at that call, the run leaves its temporary file as everybody could have seen it."""
     machine.must("-start", "7")
@@ -30,16 +29,15 @@ def refused_by_the_file_system(machine, call, error, mode):
     machine.must("-start", "7", before=injecting(call, f"error={error}"))
     machine.ini.chmod(0o660)
     machine.must("-start", "8", before=injecting(call, f"error={error}"))
-    check(machine.sections()["History"]["Count"] == "2", "not recorded")
+    check(machine.count() == 2, "not recorded")
     check(stat.S_IMODE(machine.ini.stat().st_mode) == mode, "permissions")
 
 
-@attack(*((name, name) for name in ("Summary.txt", "C1/Summary.txt")))
+@attack("Summary.txt", "C1/Summary.txt")
 def interrupted_opening_of(machine, name):
     machine.record("7")
-    machine.must("-report", str(machine.archive), before=injecting(
-        "openat", "error=EINTR:when=1+2", "-P", machine.history / name))
-    check(history.read_archive(machine.archive).get(name), "no summary")
+    machine.report(before=injecting("openat", "error=EINTR:when=1+2", "-P", machine.history / name))
+    check(machine.packed().get(name), "no summary")
 
 
 @attack()
@@ -51,10 +49,10 @@ def lock_that_is_never_freed(machine):
     fcntl.flock(holder, fcntl.LOCK_EX)
     began = time.monotonic()
     runs = [machine.start(*words) for words in (("-start", "8"), ("-unknown",))]
-    results = [run.wait(timeout=20) for run in runs]
-    check(results == [0, 2], f"results {results}")
+    codes = [run.wait(timeout=20) for run in runs]
+    check(codes == [0, 2], f"exit codes {codes}")
     check(time.monotonic() - began < 15, "waits again")
-    check(machine.sections()["History"]["Count"] == "2", "not recorded")
+    check(machine.count() == 2, "not recorded")
 
 
 @attack(("first start", "-start", "7"), ("start", "-start", "8"), ("restart", "-start", "8"),

@@ -4,7 +4,6 @@ import os
 
 from harness import attack
 from history import check
-from planted import run_any
 
 HOSTILE = ("..", "../outside", "../../../outside", "a/../../../../outside", ".", "./7", "7/.",
            "7/..", "...", ".. ", " ..", "..\\..", "C:\\outside", "\\\\host\\share", "History",
@@ -27,11 +26,11 @@ def hostile_names(machine):
                       ("-end", name, "-CopyName", f"copy{number}", "-Result", LONG),
                       ("-start", f"event{number}"),
                       ("-end", f"event{number}", "-CopyName", name)):
-            run_any(machine, words)
-    run_any(machine, ("-report",))
+            machine.run_any(words)
+    machine.run_any(("-report",))
     machine.must("-start", "last")
+    check(machine.count() == 2 * len(names) + 1, "count")
     sections = machine.sections()
-    check(sections["History"]["Count"] == str(2 * len(names) + 1), "count")
     check("last" in sections, "last start")
     for name in names:
         keys = sections[name.replace("\r\n", " ").replace("\n", " ").strip()]
@@ -41,7 +40,7 @@ def hostile_names(machine):
 
 @attack()
 def hostile_history(machine):
-    """A history file that names places outside as copies and identities."""
+    """A history file whose copies and identities lead out."""
     out = os.path.relpath(machine.outside, machine.history)
     (machine.history / "linked").symlink_to(machine.outside)
     text = "[History]\nCount=9\n"
@@ -51,5 +50,5 @@ def hostile_history(machine):
                  f"[in {name}]\nCopy_Name={name}\nLog_File_Name={machine.source}\n"
                  f"[folder {name}]\nCopy_Name={name}/folder\nTrace_File={machine.source}\n")
     machine.ini.write_text(text)
-    run_any(machine, ("-report",))
+    machine.run_any(("-report",))
     check(machine.archive.exists(), "no archive")

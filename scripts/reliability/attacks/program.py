@@ -1,4 +1,4 @@
-"""The program file itself, and what its caller leaves it."""
+"""The program file itself, and the standard streams that it gets from its caller."""
 
 import json
 import os
@@ -18,8 +18,8 @@ def hardening(machine):
     check("GNU_RELRO" in segments, "no RELRO")
     check(any("GNU_STACK" in line and " RW " in line for line in segments.splitlines()),
           "stack can be executed")
-    check("RPATH" not in dynamic and "RUNPATH" not in dynamic and "TEXTREL" not in dynamic,
-          "RPATH or TEXTREL")
+    for entry in ("RPATH", "RUNPATH", "TEXTREL"):
+        check(entry not in dynamic, entry)
     check("__stack_chk_fail" in read("--dyn-syms"), "no stack protector")
     # Where the compiler can tell that no call needs it, the program holds no trace of it.
     commands = json.loads((machine.built.parent / "compile_commands.json").read_text())
@@ -44,7 +44,7 @@ def closed_descriptors(machine, closing):
 
 @attack(("start", "-start", "../x"), ("report", "-report", "{archive}"), ("help", "-help"))
 def closed_pipe_on_standard_output(machine, *words):
-    """The work is done, and the result says so."""
+    """The work is done, and the exit code says so."""
     reader, writer = os.pipe()
     os.close(reader)
     machine.callback(os.close, writer)

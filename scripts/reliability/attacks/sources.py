@@ -10,8 +10,9 @@ import time
 from pathlib import Path
 
 import history
-from harness import NOBODY, Skipped, as_nobody, attack
+from harness import NOBODY, as_nobody, attack, require_root
 from history import check
+from machine import Skipped
 
 HEADER = "Windows Registry Editor Version 5.00\n\n"
 KEY = "[HKEY_LOCAL_MACHINE\\SOFTWARE\\ZEK\\ORX\\InstalledCopies\\C1\\GLOBAL_PROFILE]\n"
@@ -24,9 +25,9 @@ def write_export(machine, text):
     machine.watch()
 
 
-def report_of(machine, **options):
+def event_report(machine, **options):
     machine.must("-start", "7", **options)
-    return (machine.history / "7" / "ORXInstallEvent.Log").read_bytes()
+    return (machine.history / "7" / history.LOG).read_bytes()
 
 
 def limit_memory():
@@ -45,10 +46,9 @@ def limit_memory():
 def hostile_registry_export(machine, make):
     """It costs a small multiple of its size in memory and little time, and the good lines count."""
     write_export(machine, make() + GOOD)
-    before = resource.getrusage(resource.RUSAGE_CHILDREN)
-    report = report_of(machine, preexec_fn=limit_memory)
-    after = resource.getrusage(resource.RUSAGE_CHILDREN)
-    seconds = after.ru_utime - before.ru_utime
+    began = resource.getrusage(resource.RUSAGE_CHILDREN).ru_utime
+    report = event_report(machine, preexec_fn=limit_memory)
+    seconds = resource.getrusage(resource.RUSAGE_CHILDREN).ru_utime - began
     check(seconds < 2, f"{seconds:.1f} s of CPU time")
     check(b"Seen:" in report, "the last key is missing")
 
@@ -56,7 +56,7 @@ def hostile_registry_export(machine, make):
 @attack()
 def registry_line_without_closing_quotation_mark(machine):
     write_export(machine, KEY + '"open"="text\n";next"="kept"\n')
-    check(b";next:" in report_of(machine), "the next line is lost")
+    check(b";next:" in event_report(machine), "the next line is lost")
 
 
 @attack()
@@ -66,7 +66,7 @@ def process_name_with_control_characters(machine):
     shutil.copy(shutil.which("sleep"), program)
     with subprocess.Popen([program, "60"]) as process:
         machine.callback(process.kill)
-        report = report_of(machine)
+        report = event_report(machine)
         process.kill()
     check(b"x?4) Services?[2J??\n" in report, "the name is not shown as agreed")
     check(b"\x1b" not in report and b"\n4) Services\x1b" not in report, "forged")
@@ -93,24 +93,24 @@ struct group* getgrent(void) { static int call; return answer(call++, &staff); }
 
 @attack()
 def interrupted_name_service(machine):
-    report = report_of(machine, variables=machine.with_functions(INTERRUPTED_NAME_SERVICE))
+    report = event_report(machine, variables=machine.with_functions(INTERRUPTED_NAME_SERVICE))
     check(re.search(rb"Logged on User:\S+\\ana\n", report), "the user is not named")
     rows = re.findall(rb"(?m)^staff(?: +\S+\\(\w+))?$", report)
     check(rows == [b"", b"bo", b"ana"], f"rows of the group: {rows}")
 
 
-@attack(needs_root=True)
+@attack()
 def interrupted_name_service_for_an_owners_groups(machine):
     """Root collects for the owner of a history what one of his groups may read."""
+    require_root()
     os.chown(machine.history, NOBODY, NOBODY)
     os.chown(machine.source, 0, 100)
     machine.source.chmod(0o640)
     machine.watch()
     machine.must("-start", "7", "-l", str(machine.source), preexec_fn=as_nobody)
     machine.must("-end", "7", preexec_fn=as_nobody)
-    machine.must("-report", str(machine.archive),
-                 variables=machine.with_functions(INTERRUPTED_NAME_SERVICE))
-    check("7/setup.log" in history.read_archive(machine.archive), "not collected")
+    machine.report(variables=machine.with_functions(INTERRUPTED_NAME_SERVICE))
+    check("7/setup.log" in machine.packed(), "not collected")
 
 
 SILENT_NAME_SERVICE = """
@@ -125,13 +125,13 @@ def silent_name_service(machine):
     """It costs its rows and at most ten seconds."""
     variables = machine.with_functions(SILENT_NAME_SERVICE)
     began = time.monotonic()
-    report = report_of(machine, variables=variables)
+    report = event_report(machine, variables=variables)
     seconds = time.monotonic() - began
     check(seconds < 12, f"{seconds:.0f} s")
     check(b"6) ORX ODBC Driver Info:" in report, "the rest of the snapshot is missing")
     for path in Path("/proc").glob("[0-9]*/cmdline"):
         with contextlib.suppress(OSError):  # a process that has ended meanwhile
-            check(bytes(machine.program) not in path.read_bytes(), "a process is left")
+            check(os.fsencode(machine.program[0]) not in path.read_bytes(), "a process is left")
 
 
 @attack()
@@ -142,7 +142,7 @@ def groups_with_one_name(machine):
     passwd, group = machine.scratch / "passwd", machine.scratch / "group"
     passwd.write_text("root:x:0:0::/:/bin/sh\n")
     group.write_text("twice:x:100:ana\ntwice:x:101:bo\n")
-    report = report_of(machine, variables={
+    report = event_report(machine, variables={
         "LD_PRELOAD": wrapper, "NSS_WRAPPER_PASSWD": str(passwd), "NSS_WRAPPER_GROUP": str(group)})
     rows = [line.split()[-1].split(b"\\")[-1] for line in report.splitlines()
             if line.startswith(b"twice")]

@@ -5,14 +5,13 @@ import shutil
 import stat
 
 import history
-from harness import MARKER, NOBODY, as_nobody, attack, digest
+from harness import MARKER, NOBODY, RUNS, as_nobody, attack, digest, require_root
 from history import check
-from planted import RUNS, run_any
 
 
 @attack(("history folder", history.HISTORY), ("maker's folder", "ZEK"))
 def linked_folder(machine, name):
-    """Whoever came first may have placed it: nothing is written through it, nothing packed."""
+    """Whoever came first may have made it: nothing is written through it, nothing packed."""
     elsewhere = machine.scratch / "elsewhere"
     (elsewhere / "ORXHistory").mkdir(parents=True)
     (elsewhere / "ORXHistory" / "file").write_bytes(MARKER)
@@ -21,15 +20,16 @@ def linked_folder(machine, name):
     link.symlink_to(elsewhere)
     machine.watch()
     for words in RUNS[:-1]:
-        machine.must(*words, result=1)
-    machine.must("-report", str(machine.archive), result=3)
+        machine.must(*words, code=1)
+    machine.report(code=3)
     found = sorted(path.name for path in elsewhere.rglob("*"))
     check(found == ["ORXHistory", "file"], f"made through the link: {found}")
 
 
-@attack(needs_root=True)
+@attack()
 def planted_section(machine):
     """The owner of a history has root collect files: his own, and one that only root may read."""
+    require_root()
     os.chown(machine.history, NOBODY, NOBODY)
     secret, own = machine.outside / "file", machine.outside / "folder" / "own.log"
     own.write_text("the user's own words\n")
@@ -39,22 +39,22 @@ def planted_section(machine):
     machine.watch()
     machine.must("-start", "7", "-l", str(secret), "-t", str(own), preexec_fn=as_nobody)
     machine.must("-end", "7", preexec_fn=as_nobody)
-    machine.must("-report", str(machine.archive))
-    packed = history.read_archive(machine.archive)
-    check(MARKER not in b"".join(packed.values()), "packed what its owner may not read")
-    check("7/own.log" in packed, "an honest file is missing")
+    machine.report()
+    check(MARKER not in b"".join(machine.packed().values()), "packed what its owner may not read")
+    check("7/own.log" in machine.packed(), "a file of his own is missing")
 
 
-@attack(needs_root=True)
+@attack()
 def foreign_history(machine):
     """The history folder of another user: root adds to it and leaves it to its owner."""
+    require_root()
     os.chown(machine.history, NOBODY, NOBODY)
     os.chmod(machine.archives, 0o777)
     machine.watch()
     machine.must("-start", "first", preexec_fn=as_nobody)
     os.chmod(machine.ini, 0o640)
     for words in RUNS:
-        run_any(machine, words)
+        machine.run_any(words)
     status = machine.ini.stat()
     check((status.st_uid, stat.S_IMODE(status.st_mode)) == (NOBODY, 0o640), "owner or mode")
     machine.must("-end", "first", preexec_fn=as_nobody)
@@ -62,23 +62,24 @@ def foreign_history(machine):
     machine.check_outside()
 
 
-@attack(needs_root=True)
+@attack()
 def read_only_history(machine):
     """A user who may only read: nothing changes, and no installer is stopped."""
+    require_root()
     for words in RUNS:
-        run_any(machine, words)
+        machine.run_any(words)
     machine.must("-start", "open")
     os.chmod(machine.archives, 0o777)
     machine.archive.unlink()
     inside = {path: digest(path) for path in machine.history.rglob("*")}
     for words in (*RUNS, ("-start", "new"), ("-end", "open", "-CopyName", "C9")):
-        run_any(machine, words, preexec_fn=as_nobody)
+        machine.run_any(words, preexec_fn=as_nobody)
     check(machine.archive.exists(), "no archive")
     check(inside == {path: digest(path) for path in machine.history.rglob("*")}, "changed")
     os.chmod(machine.history, 0o700)
     for words in RUNS:
-        run_any(machine, words, preexec_fn=as_nobody)
+        machine.run_any(words, preexec_fn=as_nobody)
     shutil.rmtree(machine.root / "ZEK")
     machine.watch()
-    machine.must("-start", "new", result=1, preexec_fn=as_nobody)
+    machine.must("-start", "new", code=1, preexec_fn=as_nobody)
     check(not (machine.root / "ZEK").exists(), "made a folder")

@@ -1,0 +1,136 @@
+"""A machine on which a program keeps its history, and the report of the promises that it breaks."""
+
+import contextlib
+import difflib
+import itertools
+import os
+import signal
+import subprocess
+import tempfile
+import time
+import traceback
+from pathlib import Path
+
+import history
+from history import Fault, check
+
+
+class Skipped(Exception):
+    """The case is not possible on this machine."""
+
+
+class Machine(contextlib.ExitStack):
+    """A program, and a folder that is its common application data folder. Without a folder it is a
+    temporary one, in memory where possible: the order of the system calls is tested, not the disk.
+    At its end it kills what was started and undoes what `callback` was given, the last first."""
+
+    def __init__(self, *program, root=None):
+        super().__init__()
+        self.program = program
+        if not root:
+            parent = "/dev/shm" if os.access("/dev/shm", os.W_OK) else None
+            self.scratch = Path(self.enter_context(
+                tempfile.TemporaryDirectory(prefix="orx-", dir=parent)))
+            self.scratch.chmod(0o755)
+        self.root = root or self.scratch / "root"
+        self.history = self.root / history.HISTORY
+        self.ini = self.history / "History.ini"
+        self.variables = {"ORX_COMMON_APPDATA": str(self.root)}
+        self.options = {"stdin": subprocess.DEVNULL, "stdout": subprocess.DEVNULL,
+                        "stderr": subprocess.DEVNULL, "cwd": "/"}
+
+    def popen(self, words, before=(), variables=None, **options):
+        """A process of the program, after the words in `before`."""
+        return subprocess.Popen(
+            [os.fsencode(word) for word in (*before, *self.program, *words)],
+            env={**os.environ, **self.variables, **(variables or {})}, **self.options | options)
+
+    def start(self, *words, **options):
+        """A run in the background, killed at the machine's end."""
+        process = self.popen(words, **options)
+        self.callback(process.wait)
+        self.callback(process.kill)
+        return process
+
+    def run(self, *words, timeout=20, **options):
+        """The exit code and the standard output of a run. One that needs longer is a Fault."""
+        options = {"stdout": subprocess.PIPE, **options}
+        with self.popen(words, start_new_session=True, **options) as process:
+            try:
+                output, _ = process.communicate(timeout=timeout)
+            except subprocess.TimeoutExpired as error:
+                os.killpg(process.pid, signal.SIGKILL)
+                raise Fault(f"hangs: {shown(words)}") from error
+        return process.returncode, output
+
+    def must(self, *words, code=0, **options):
+        """The standard output of a run that must have that exit code."""
+        found, output = self.run(*words, **options)
+        check(found == code, f"exit code {found} instead of {code}: {shown(words)}")
+        return output
+
+    def sections(self):
+        return history.parse_history(self.ini.read_bytes())
+
+
+def shown(words):
+    return " ".join(repr(word) if len(word) < 80 else repr(word[:77]) + "..." for word in words)
+
+
+def contents(folder, pattern="*"):
+    """The bytes of all files below a folder by their paths there; none for a folder."""
+    return {str(path.relative_to(folder)): path.read_bytes() if path.is_file() else b""
+            for path in sorted(folder.rglob(pattern))}
+
+
+def check_equal(found, expected, message):
+    """Compares texts or dictionaries of texts. The Fault has the lines that differ."""
+    if found != expected:
+        raise Fault(f"{message}: {difference(found, expected)}")
+
+
+def difference(found, expected):
+    if isinstance(found or expected, dict):
+        found, expected = found or {}, expected or {}
+        return "; ".join(f"{name}: {difference(found.get(name), expected.get(name))}"
+                         for name in sorted({*found, *expected})
+                         if found.get(name) != expected.get(name))
+    lines = [(text.decode(errors="replace") if isinstance(text, bytes) else text or "").split("\n")
+             for text in (found, expected)]
+    changed = difflib.unified_diff(*lines, "found", "expected", lineterm="", n=1)
+    return "\n".join(line[:300] for line in itertools.islice(changed, 60))
+
+
+class Outcome:
+    """Runs cases, prints what does not hold under the name of its case, and counts."""
+
+    def __init__(self):
+        self.attempts = 0
+        self.skipped = 0
+        self.faults = 0
+        self.began = time.monotonic()
+
+    def attempt(self, name, action):
+        """Runs one case. Whatever it raises is reported under its name."""
+        self.attempts += 1
+        try:
+            return action()
+        except Skipped as reason:
+            self.skipped += 1
+            print(f"skipped {name}: {reason}", flush=True)
+        except Fault as fault:
+            self.note(name, fault)
+        except Exception as error:  # a case that ends otherwise is no reason to end the others
+            last = traceback.extract_tb(error.__traceback__)[-1]
+            self.note(name, f"{type(error).__name__}: {error} "
+                      f"({Path(last.filename).name}, line {last.lineno})")
+        return None
+
+    def note(self, name, fault):
+        self.faults += 1
+        if self.faults <= 50:
+            print(f"FAULT {name}: {str(fault)[:2000]}", flush=True)
+
+    def summary(self):
+        return (f"{self.attempts - self.skipped - self.faults} held, {self.skipped} skipped, "
+                f"{self.faults} broken, {time.monotonic() - self.began:.0f} s")
