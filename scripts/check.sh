@@ -41,7 +41,7 @@ reliability() {
 page() {
   step build scripts/build.sh release
   scripts/install-packages.sh page >/dev/null
-  step page python3 scripts/check_page.py build/release/ORXInstallEventLog build/release/orxhistory
+  step page python3 scripts/check_page.py
 }
 
 packages() {

@@ -5,57 +5,60 @@
 
 Exit codes, output, history files, reports, summaries and archives must be the same, but for
 separators, line ends, times and what shows the machine itself. The readers beside the programs must
-give the same answers for an archive. Ends with 1 and the differences.
+print the same for an archive. The exit code is 1 after differences, which are printed.
 WINEPREFIX names a Windows of its own: its history and its registry keys of the tool are replaced.
 """
-import difflib
 import json
 import os
 import re
+import shlex
 import shutil
+import string
 import subprocess
 import sys
 import time
-import zipfile
 from pathlib import Path
 
-from history import HISTORY, REPOSITORY, check, parse_history
+from history import REPOSITORY, archive_entries, check, parse_history
+from machine import Machine, Outcome, check_equal
 
 WINE = REPOSITORY / "scripts/wine.sh"
+HISTORIES = REPOSITORY / "scripts/comparison/histories.txt"
 SOFTWARE = "HKEY_LOCAL_MACHINE\\SOFTWARE\\"
 PRODUCTS = "Microsoft\\Windows\\CurrentVersion\\Installer\\UserData\\S-1-5-18\\Products"
 TOOL_KEYS = [SOFTWARE + "ZEK", SOFTWARE + "ODBC\\ODBCINST.INI", SOFTWARE + PRODUCTS]
+REPORT = ["-report", "{files}/out.zip"]
+INSTALLER_FILES = ("setup.log", "sub/setup.log", "setup.rsp", "setup.trc", "ORXInstallEvent.Log",
+                   "予定表.log", "表/予定表.log")
 
 
-class Side:
-    """A program with its common application data folder, and a folder for an installer's files."""
+class Side(Machine):
+    """A program in a folder, with its common application data folder and one for an installer's
+    files. The beginning is that of a path in the folder, as the program's system spells it."""
 
-    def __init__(self, command, separator, encoding, root, root_name, files, files_name):
-        self.command = command
+    def __init__(self, program, folder, beginning, encoding):
+        super().__init__(*program, root=folder / "ProgramData")
+        self.files = folder / "files"
+        self.files_name = f"{beginning}files"
+        self.root_name = f"{beginning}ProgramData"
+        self.separator = beginning[-1]
         self.encoding = encoding
-        self.environment = dict(os.environ)
-        self.separator = separator
-        self.root_name, self.files_name = root_name, files_name
-        self.files = files
-        self.maker = root / "ZEK"
-        self.history = root / HISTORY
+        self.options |= {"cwd": self.files, "stdout": subprocess.PIPE, "stderr": subprocess.STDOUT}
 
     def reset(self):
         for folder in (self.history, self.files):
             shutil.rmtree(folder, ignore_errors=True)
+        self.history.parent.mkdir(parents=True, exist_ok=True)
         self.files.mkdir(parents=True)
 
-    def start(self, arguments):
+    def popen(self, words, **options):
         beginning = self.files_name + self.separator
-        return subprocess.Popen(
-            self.command + [word.replace("{files}/", beginning) for word in arguments],
-            env=self.environment, cwd=self.files, stdin=subprocess.DEVNULL,
-            stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
+        return super().popen([word.replace("{files}/", beginning) for word in words], **options)
 
-    def run(self, arguments):
-        process = self.start(arguments)
-        output = process.communicate()[0]
-        return f"{arguments}\nresult {process.returncode}: {self.plain(output)}"
+    def say(self, words):
+        """A run's exit code and output in a text."""
+        code, output = self.run(*words, timeout=120)
+        return f"{words}\nexit code {code}: {self.plain(output)}"
 
     def plain(self, data):
         """Text without what differs: the code page, the two folders, line ends, and times."""
@@ -80,19 +83,14 @@ class Side:
     def archive(self):
         """Every entry, sorted: their order is the system's, but each comes after its folder."""
         path = self.files / "out.zip"
-        if not path.exists():
-            return
-        with zipfile.ZipFile(path) as archive:
-            entries = {}
-            for info in archive.infolist():
-                # The names have no mark for their code page, so that they come decoded as cp437.
-                name = info.filename.encode("cp437").decode(self.encoding)
-                assert self.separator == "/" or "/" not in name, name
-                name = name.replace("\\", "/")
-                assert "/" not in name or name.rsplit("/", 1)[0] in entries, name
-                kind = "folder" if info.external_attr & 0x10 else "file"
-                entries[name] = (f"{kind}, read-only {info.external_attr & 1}:\n"
-                                 + self.contents(name, archive.read(info)))
+        entries = {}
+        for name, info, data in archive_entries(path, self.encoding) if path.exists() else ():
+            check(self.separator == "/" or "/" not in name, f"separator of {name}")
+            name = name.replace("\\", "/")
+            check("/" not in name or name.rsplit("/", 1)[0] in entries, f"{name} before its folder")
+            kind = "folder" if info.external_attr & 0x10 else "file"
+            entries[name] = (f"{kind}, read-only {info.external_attr & 1}:\n"
+                             + self.contents(name, data))
         yield from (f"archive: {name}, {entries[name]}" for name in sorted(entries))
 
 
@@ -103,76 +101,16 @@ def history_lines(text):
     return re.sub(r"(?m)^([^=\n]*=)[ \t]*(.*?)[ \t]*$", r"\1\2", lines)
 
 
-MACHINE_LABELS = re.compile(
-    "(Computer Name       |OS                  |Type                |Service Pack        |"
-    "Number of processors|CPU                 |Logged on User|Processes):")
-MACHINE_TABLES = ("Group Name ", "Group    ", "Process ID ", "Service Name ")
-
-
 def without_machine(report):
     """A report without the values and table rows that show the machine."""
-    lines = []
-    rules_to_rows = 0  # 1: the next rule is above rows; 2: among rows
-    for line in report.split("\n"):
-        is_rule = line.startswith("-----")
-        if rules_to_rows == 2 and not is_rule:
-            continue
-        rules_to_rows = 2 if rules_to_rows == 1 and is_rule else 0
-        if line.startswith(MACHINE_TABLES):
-            rules_to_rows = 1
-        label = MACHINE_LABELS.match(line)
-        lines.append(label[0] if label else line)
-    return "\n".join(lines)
+    report = re.sub(r"(?m)^((?=.{20}:)(?:Computer Name|OS|Type|Service Pack|Number of processors|"
+                    r"CPU) *:|Logged on User:|Processes:).*", r"\1", report)
+    # The rows are between the rule below the head of a table and the next rule.
+    return re.sub(r"(?m)^((?:Group Name|Group   |Process ID|Service Name) .*\n-----.*\n)"
+                  r"(?:(?!-----).*\n)*", r"\1", report)
 
 
 # --- The registry ---
-
-
-def limits_export():
-    """All kinds of values, and texts and names at the limits. In the order of the names, as the
-    registry keeps keys; Wine keeps values so too, Windows in the order of their writing. No key's
-    whole path is longer than 260 characters: Wine opens none by the narrow calls, Windows does."""
-    kinds = [
-        ("a text", '"plain"'), ("b empty", '""'), ("c quoted", '"\\"a\\" \\\\ b"'),
-        ("d number", "dword:0000002a"), ("e zero", "dword:00000000"),
-        ("f top bit", "dword:ffffffff"), ("g expand", "hex(2):25,00,61,00,25,00,00,00"),
-        ("h multi", "hex(7):61,00,00,00,62,00,00,00,00,00"), ("i binary", "hex:01,02,03"),
-        ("j quad", "hex(b):01,00,00,00,00,00,00,00"),
-        ("k two texts", "hex(1):61,00,00,00,62,00,00,00"),
-        ("l 99 bytes", '"%s"' % ("x" * 99)), ("m 100 bytes", '"%s"' % ("x" * 100)),
-        ("n" * 29, '"fills its field"'), ("o" * 255, '"longest name"'),
-        ("p" * 256, '"ends the list"'), ("q", '"after the end"'),
-    ]
-    copies = SOFTWARE + "ZEK\\ORX\\InstalledCopies\\"
-    version = [("Last Modified Date", '"20260102"'), ("Modification", "dword:00000003"),
-               ("ProductCode", '"{%s}"' % ("C" * 44)), ("Release", "dword:00000005"),
-               ("Service Level", '"Service Level 2"'), ("Version", "dword:00000009")]
-    keys = [
-        (SOFTWARE + PRODUCTS + "\\0A\\InstallProperties",
-         [("DisplayName", '"%s"' % ("N" * 70)), ("DisplayVersion", '"1.2.3"'),
-          ("InstallDate", '"20260101"'), ("InstallLocation", '"C:\\\\ZEK\\\\"'),
-          ("Language", "dword:00000409"), ("Publisher", '"The ZEK makers"')]),
-        (SOFTWARE + PRODUCTS + "\\0B\\InstallProperties", [("Publisher", '"zek"')]),
-        (SOFTWARE + PRODUCTS + "\\0C", []),
-        (SOFTWARE + "ODBC\\ODBCINST.INI\\An ZEK ORX driver", kinds),
-        (SOFTWARE + "ODBC\\ODBCINST.INI\\ODBC Drivers",
-         [("An ZEK ORX driver", '"Installed"'), ("Other ZEK orx", '"Installed"'),
-          ("ZEK ORX without a key", "dword:00000001")]),
-        (SOFTWARE + "ZEK\\ORX\\ORX Old\\CurrentVersion", version),
-        (copies + "C1\\ADM_PROFILES\\ADM1", kinds[:2]),
-        (copies + "C1\\CurrentVersion", version),
-        (copies + "C1\\GLOBAL_PROFILE", kinds),
-        (copies + "C1\\ORX " + "k" * 190 + "\\CurrentVersion", version),
-        (copies + "C1\\ORX Server\\CurrentVersion", version),
-        (copies + "C1\\ORXNone\\CurrentVersion", version),
-        (copies + "C1\\PROFILES\\" + "i" * 200, kinds),
-        (copies + "C1\\PROFILES\\ORX1", []),
-        (copies + "no product", []),
-    ]
-    text = "Windows Registry Editor Version 5.00\n"
-    for key, values in keys:
-        text += "\n[%s]\n" % key + "".join('"%s"=%s\n' % value for value in values)
-    return text.replace("\n", "\r\n").encode("utf-16")
 
 
 def regedit(side, option, name, *arguments):
@@ -202,72 +140,34 @@ def export_registry(side, path):
 
 # --- The histories ---
 
-LONG = "".join(chr(ord("a") + i % 26) for i in range(300))
-WHOLE_EVENT = [
-    ["-start", "42", "-Product", "ORX Server Build 1907", "-Version", "9.5", "-ServiceLevel", "3",
-     "-Type", "GUI", "-Action", "Install", "-Path", "C:\\ZEK\\ORX95", "-Command", "setup.exe /gui"],
-    ["-logmessage", "42", "-message", "Copying files"],
-    ["-logmessage", "42", "-message", ""],
-    ["-end", "42", "-CopyName", "C1", "-Result", "Successful"],
-]
-REPORT = [["-report", "{files}/out.zip"]]
-SCENARIOS = {
-    "a whole event": WHOLE_EVENT + REPORT,
-    "no event": [[], ["-help"], ["-report"], ["-x"], ["-start"], ["-start", ""]] + REPORT,
-    "no history": REPORT,
-    "repeated starts and ends": [
-        ["-start", "1", "-Product", "first"], ["-start", "1", "-Type", "second"],
-        ["-end", "1", "-CopyName", "C"], ["-end", "1", "-CopyName", "C"], ["-start", "1"],
-        ["-logmessage", "1", "-message", "again"], ["-end", "1", "-CopyName", "C"],
-        ["-start", "HISTORY"], ["-start", "2"], ["-end", "2", "-CopyName", "D"]] + REPORT,
-    "no start": [
-        ["-logmessage", "1", "-message", "lost"], ["-end", "2", "-Result", "r"],
-        ["-end", "3", "-CopyName", "C", "-Action", "a", "-l", "{files}/none.log"]] + REPORT,
-    "quotation marks and blanks": [
-        ["-start", "an event", "-Product", '"quoted"', "-Type", "'single'", "-Path", '"half',
-         "-Command", ' "C:\\a b\\setup.exe" "/x" ', "-Version", "  two  blanks  ",
-         "-ServiceLevel", '""', "-Action", "a=b;c [x]"],
-        ["-logmessage", "an event", "-message", ' "quoted" and \'single\' '],
-        ["-start", "lines", "-Type", "one\ntwo", "-Path", "x\n[History]\nCount=99"],
-        ["-start", "a;b=c", "-Action", "'"], ["-start", "[x]", "-Action", '"'],
-        ["-end", "an event", "-CopyName", "a copy", "-Result", "\"it's\""]] + REPORT,
-    "long values": [
-        ["-start", "1", "-Product", LONG, "-Type", '"' + LONG + '"', "-Command", LONG * 20],
-        ["-logmessage", "1", "-message", LONG * 20],
-        ["-end", "1", "-CopyName", "C" * 60, "-Result", LONG, "-l", LONG]] + REPORT,
-    "names that lead out": [
-        ["-start", ".."], ["-start", "../x"], ["-start", "{files}/x"], ["-start", "none/x"],
-        ["-start", "1"], ["-end", "1", "-CopyName", ".."], ["-end", "1", "-CopyName", "{files}/x"],
-        ["-end", "1", "-CopyName", "."]],
-    "collected files": [
-        ["-start", "1", "-l", "{files}/setup.log", "-t", "{files}/sub/setup.log",
-         "-u", "setup.rsp"],
-        ["-end", "1", "-CopyName", "C"],
-        ["-start", "2", "-l", "{files}/none.log", "-t", "{files}/setup.trc"],
-        ["-end", "2"],
-        ["-start", "3", "-l", "{files}/setup.log"],
-        ["-start", "4"],
-        ["-end", "4", "-CopyName", "C", "-l", "{files}/ORXInstallEvent.Log"]] + REPORT + REPORT,
-}
 
-# In code page 932 the second byte of 表 is that of a backslash.
-JAPANESE = [
-    ["-start", "1", "-Product", "製品表", "-l", "{files}/予定表.log"],
-    ["-end", "1", "-CopyName", "試験表", "-Result", "成功表"],
-    ["-start", "表", "-t", "{files}/表/予定表.log"], ["-end", "表", "-CopyName", "C"]] + REPORT
+def read_histories():
+    """The runs of each history by its name; a run is a list of words."""
+    histories = {}
+    for line in HISTORIES.read_text("utf-8").replace("\\\n", "").splitlines():
+        if line.startswith("## "):
+            histories[line[3:]] = []
+        elif line.startswith("$"):
+            words = shlex.split(line[1:])
+            histories[list(histories)[-1]].append([filled(word) for word in words])
+    return histories
 
 
-def outcome(side, outputs):
+def filled(word):
+    word = word.replace("{newline}", "\n")
+    return re.sub(r"\{(\d+)-letters\}", lambda m: (string.ascii_lowercase * 240)[:int(m[1])], word)
+
+
+def outcome_of(side, outputs):
     return "\n".join([*outputs, *side.tree(), *side.archive()])
 
 
-def run_steps(side, steps):
+def run_history(side, runs):
     side.reset()
-    for name in ("setup.log", "sub/setup.log", "setup.rsp", "setup.trc", "ORXInstallEvent.Log",
-                 "予定表.log", "表/予定表.log"):
+    for name in INSTALLER_FILES:
         (side.files / name).parent.mkdir(exist_ok=True)
         (side.files / name).write_text(f"the installer's file of {len(name)} letters")
-    return outcome(side, [side.run(step) for step in steps])
+    return outcome_of(side, [side.say(words) for words in runs])
 
 
 def run_section_names(side):
@@ -275,11 +175,10 @@ def run_section_names(side):
     texts = []
     for last in (227, 228, 229, 900):
         side.reset()
-        side.history.mkdir(parents=True)
+        side.history.mkdir()
         names = ["History", *(letter * 999 for letter in "abcdefghij"), "z" * (last + 2), "after"]
-        (side.history / "History.ini").write_text(
-            "".join(f"[{name}]\nAction={len(name)}\n" for name in names))
-        texts.append(outcome(side, [side.run(REPORT[0])]))
+        side.ini.write_text("".join(f"[{name}]\nAction={len(name)}\n" for name in names))
+        texts.append(outcome_of(side, [side.say(REPORT)]))
     return "\n".join(texts)
 
 
@@ -289,7 +188,7 @@ def run_overlapping(side):
     results = []
     for call in (lambda i: ["-start", str(i), "-Product", f"P{i}"],
                  lambda i: ["-logmessage", "0", "-message", f"message {i} " * 1000]):
-        processes = [side.start(call(i)) for i in range(12)]
+        processes = [side.popen(call(i)) for i in range(12)]
         results += [str((process.communicate()[0], process.returncode)) for process in processes]
     separators = {"History.ini": "\n[", "0/ORXInstallEvent.Log": "\n"}
     for item in side.tree():
@@ -302,7 +201,7 @@ def run_links(side):
     """A link instead of the history folder, then of the maker's: nothing is written through it."""
     texts = []
     target = side.files / "elsewhere"
-    for linked in (side.history, side.maker):
+    for linked in (side.history, side.history.parent):
         side.reset()
         (target / "ORXHistory").mkdir(parents=True)
         kept = linked.with_suffix(".kept")
@@ -310,7 +209,7 @@ def run_links(side):
             linked.rename(kept)
         linked.symlink_to(target)
         try:
-            texts += [side.run(step) for step in WHOLE_EVENT[:1] + REPORT]
+            texts += [side.say(words) for words in (["-start", "42"], REPORT)]
         finally:
             linked.unlink()
             if kept.exists():
@@ -321,115 +220,103 @@ def run_links(side):
 
 
 def run_killed(side):
-    """Starts that are killed at all of their moments leave whole sections, and no run waits."""
+    """Starts that are killed at all of their moments leave complete sections, and no run waits."""
     side.reset()
     began = time.monotonic()
-    side.run(["-start", "whole"])
+    side.say(["-start", "complete"])
     lasts = time.monotonic() - began
     count = 16
     for i in range(count):
-        process = side.start(["-start", str(i)])
+        process = side.popen(["-start", str(i)])
         time.sleep(lasts * i / count)
         process.kill()
         process.communicate()
-    side.start(["-start", "last"]).communicate(timeout=60)
-    text = side.plain((side.history / "History.ini").read_bytes())
-    sections = parse_history((history_lines(text) + "\n").encode(), has_complete_events=True)
+    side.run("-start", "last", timeout=60)
+    text = history_lines(side.plain(side.ini.read_bytes())) + "\n"
+    sections = parse_history(text.encode(), has_complete_events=True)
     check(sections["History"]["Count"] == str(len(sections) - 1), f"count of {list(sections)}")
     check(not list(side.history.glob(".*")), "litter")
-    return "whole"
+    return "complete"
 
 
-def read_archive(side, readers):
-    """What both builds of the reader say of the side's archive, each in a text."""
-    def read(reader, *arguments):
-        process = subprocess.run(
-            reader + ["--from", "out.zip", *arguments], cwd=side.files, stdin=subprocess.DEVNULL,
-            stdout=subprocess.PIPE, stderr=subprocess.DEVNULL, check=False)
-        output = process.stdout.decode("utf-8").replace("\r\n", "\n")
-        return process.returncode, output
-
-    _, lines = read(readers[1], "list", "--json")
-    events = dict.fromkeys(json.loads(line)["event"] for line in lines.splitlines())
-    calls = [["list", "--json"], ["list"], ["check", "--json"], ["find", "--json", "e"],
-             *(["show", "--json", "--", event] for event in events)]
-    return ["\n".join("{}\nresult {}: {}".format(call, *read(reader, *call)) for call in calls)
-            for reader in readers]
-
-
-def same_texts(name, texts):
-    texts = [text.split("\n") for text in texts]
-    difference = list(difflib.unified_diff(*texts, "Windows", "Linux", lineterm="", n=2))
-    print(f"{name:40} {'differs' if difference else 'same'} ({len(texts[0])} lines)")
-    print("\n".join(difference[:60]), end="\n" if difference else "")
-    return not difference
+# --- The comparison ---
 
 
 class Comparison:
-    """The two sides, and whether all that was compared is the same."""
-
     def __init__(self, windows_program, linux_program, scratch):
         drive = Path(os.environ["WINEPREFIX"]).absolute() / "drive_c"
-        root, files = scratch / "root", scratch / "files"
-        self.windows = Side([WINE, windows_program], "\\", "cp1252", drive / "ProgramData",
-                            "C:\\ProgramData", drive / "files", "C:\\files")
-        self.linux = Side([linux_program], "/", "utf-8", root, str(root), files, str(files))
-        self.linux.environment["ORX_COMMON_APPDATA"] = str(root)
-        self.sides = {"Windows": self.windows, "Linux": self.linux}
-        self.readers = [[WINE, windows_program.with_name("orxhistory.exe")],
-                        [linux_program.with_name("orxhistory")]]
-        self.export = self.linux.maker / "Registry.reg"
-        self.is_same = True
-        self.linux.maker.mkdir(parents=True, exist_ok=True)
-        for side in self.sides.values():
+        self.windows = Side([WINE, windows_program], drive, "C:\\", "cp1252")
+        self.linux = Side([linux_program], scratch, f"{scratch}/", "utf-8")
+        self.readers = [Machine(WINE, windows_program.with_name("orxhistory.exe"), root=scratch),
+                        Machine(linux_program.with_name("orxhistory"), root=scratch)]
+        self.outcome = Outcome()
+        for side in (self.windows, self.linux):
             side.reset()
 
     def compare(self, name, run, *arguments):
-        texts = [run(side, *arguments) for side in self.sides.values()]
-        self.is_same = same_texts(name, texts) and self.is_same
+        self.compare_calls(name, run, [(side, *arguments) for side in (self.windows, self.linux)])
 
     def compare_readers(self):
-        """Both builds of the reader over the archives that the last scenario has left."""
-        for system, side in self.sides.items():
-            if (side.files / "out.zip").exists():
-                texts = read_archive(side, self.readers)
-                self.is_same = same_texts(f"  read, archive of {system}", texts) and self.is_same
+        """Both builds of the reader over the archives that the last history has left."""
+        for system, side in (("Windows", self.windows), ("Linux", self.linux)):
+            self.compare_calls(f"  read, archive of {system}", read_archive,
+                               [(reader, side.files) for reader in self.readers])
 
-    def use_sample_machine(self):
-        """An export in UTF-8 is nothing that Windows knows; in the registry's own order it comes
-        back."""
-        sample = (REPOSITORY / "scripts/sample-machine/Registry.reg").read_text("utf-8")
-        self.export.write_text(sample, "utf-16", newline="\r\n")
-        load_registry(self.windows, self.export)
-        export_registry(self.windows, self.export)
+    def compare_calls(self, name, run, calls):
+        def check_same():
+            windows, linux = (run(*arguments) for arguments in calls)
+            check_equal(windows, linux, "Windows differs from Linux")
+            lines = linux.count("\n") + 1
+            print(f"{name:40} same ({lines} lines)", flush=True)
+        self.outcome.attempt(name, check_same)
 
-    def use_limits(self):
-        self.export.write_bytes(limits_export())
-        load_registry(self.windows, self.export)
+    def load(self, name):
+        """Loads an export of UTF-8, which Windows does not know; returns the loaded file."""
+        export = self.linux.history.parent / "Registry.reg"
+        text = (REPOSITORY / "scripts" / name).read_text("utf-8")
+        export.write_text(text, "utf-16", newline="\r\n")
+        load_registry(self.windows, export)
+        return export
 
-    def compare_japanese(self):
-        self.windows.environment["ORX_LOCALE"] = "ja_JP.UTF-8"
-        self.windows.encoding = "cp932"
-        self.compare("second bytes like separators", run_steps, JAPANESE)
-        del self.windows.environment["ORX_LOCALE"]
-        self.windows.encoding = "cp1252"
+
+def read_archive(reader, folder):
+    """What a reader prints for the archive in the folder."""
+    def read(*words):
+        code, output = reader.run("--from", "out.zip", *words, cwd=folder, timeout=120)
+        return f"{words}\n" + output.decode().replace("\r\n", "\n") + f"exit code {code}"
+    listed = read("list", "--json")
+    events = dict.fromkeys(json.loads(line)["event"] for line in listed.split("\n")
+                           if line.startswith("{"))
+    return "\n".join([listed, read("list"), read("check", "--json"), read("find", "--json", "e"),
+                      *(read("show", "--json", "--", event) for event in events)])
 
 
 def main():
     comparison = Comparison(*(Path(word).absolute() for word in sys.argv[1:]))
-    comparison.use_sample_machine()
-    comparison.compare("the sample machine", run_steps, WHOLE_EVENT)
+    histories = read_histories()
+    japanese = histories.pop("second bytes like separators")
+    export_registry(comparison.windows, comparison.load("sample-machine/Registry.reg"))
+    comparison.compare("the sample machine", run_history, histories["a complete event"])
     comparison.compare_readers()
-    comparison.use_limits()
-    for name, steps in SCENARIOS.items():
-        comparison.compare(name, run_steps, steps)
+    # All kinds of values, and texts and names at the limits. In the order of the names, as the
+    # registry keeps keys; Wine keeps values so too, Windows in the order of their writing. No path
+    # of a key is longer than 260 characters: Wine opens none by the narrow calls, Windows does.
+    comparison.load("comparison/Limits.reg")
+    for name, runs in histories.items():
+        comparison.compare(name, run_history, runs)
     comparison.compare_readers()
-    comparison.compare_japanese()
+    # In code page 932 the second byte of 表 is that of a backslash.
+    comparison.windows.encoding = "cp932"
+    comparison.windows.variables["ORX_LOCALE"] = "ja_JP.UTF-8"
+    comparison.compare("second bytes like separators", run_history, japanese)
+    comparison.windows.encoding = "cp1252"
+    del comparison.windows.variables["ORX_LOCALE"]
     for name, run in (("links instead of the folders", run_links),
                       ("section names at the limit", run_section_names),
                       ("overlapping starts", run_overlapping), ("killed starts", run_killed)):
         comparison.compare(name, run)
-    return 0 if comparison.is_same else 1
+    print(comparison.outcome.summary())
+    return 1 if comparison.outcome.faults else 0
 
 
 if __name__ == "__main__":

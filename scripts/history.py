@@ -7,6 +7,7 @@ from pathlib import Path
 
 REPOSITORY = Path(__file__).resolve().parents[1]
 PROGRAM = REPOSITORY / "build/release/ORXInstallEventLog"
+READER = PROGRAM.with_name("orxhistory")
 HISTORY = Path("ZEK", "ORXHistory")  # below the common application data folder
 LOG = "ORXInstallEvent.Log"
 

@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 """Runs the commands of docs/reader.md, "Many machines", over the archives of many machines.
 
-    many_machines.py [MACHINES]
+    many_machines.py MACHINES
 
 The recorder records two histories: an install that goes well and an upgrade, which goes well too or
 fails after it has changed a value. Each machine has a copy of one of them in its archive, with a
@@ -12,41 +12,32 @@ import os
 import re
 import subprocess
 import sys
-import tempfile
 import time
 import zipfile
-from pathlib import Path
 
 import history
+from machine import Machine, check_equal, contents
 
-READER = history.PROGRAM.with_name("orxhistory")
 COPY = "HKEY_LOCAL_MACHINE\\SOFTWARE\\ZEK\\ORX\\InstalledCopies\\Prod"
 
 
-def registry(port):
-    return (f'Windows Registry Editor Version 5.00\n\n[{COPY}\\GLOBAL_PROFILE]\n'
-            f'"Port"="{port}"\n')
+def write_registry(machine, port):
+    machine.history.parent.mkdir(parents=True, exist_ok=True)
+    (machine.history.parent / "Registry.reg").write_text(
+        f'Windows Registry Editor Version 5.00\n\n[{COPY}\\GLOBAL_PROFILE]\n"Port"="{port}"\n')
 
 
-def record(root, fails):
+def record(fails):
     """The files of a history, by their paths in an archive."""
-    environment = dict(os.environ, ORX_COMMON_APPDATA=str(root))
-    export = root / "ZEK" / "Registry.reg"
-    export.parent.mkdir(parents=True)
-
-    def run(*arguments):
-        subprocess.run([history.PROGRAM, *arguments], env=environment, check=True)
-
-    export.write_text(registry(50000))
-    run("-start", "install", "-Action", "Install", "-Version", "9.3")
-    run("-end", "install", "-CopyName", "Prod", "-Result", "0")
-    run("-start", "upgrade", "-Action", "Upgrade", "-Version", "9.4")
-    if fails:
-        export.write_text(registry(50010))
-    run("-end", "upgrade", "-CopyName", "Prod", "-Result", "1603" if fails else "0")
-    folder = root / history.HISTORY
-    files = {str(path.relative_to(folder)): path.read_text()
-             for path in folder.rglob("*") if path.is_file()}
+    with Machine(history.PROGRAM) as machine:
+        write_registry(machine, 50000)
+        machine.must("-start", "install", "-Action", "Install", "-Version", "9.3")
+        machine.must("-end", "install", "-CopyName", "Prod", "-Result", "0")
+        machine.must("-start", "upgrade", "-Action", "Upgrade", "-Version", "9.4")
+        if fails:
+            write_registry(machine, 50010)
+        machine.must("-end", "upgrade", "-CopyName", "Prod", "-Result", "1603" if fails else "0")
+        files = {name: data.decode() for name, data in contents(machine.history).items() if data}
     # The upgrade is an hour after the install.
     install, upgrade = files["History.ini"].split("[upgrade]")
     files["History.ini"] = at_hour(10, install) + "[upgrade]" + at_hour(11, upgrade)
@@ -67,40 +58,37 @@ def write_archive(path, files, computer):
                                           rf"\g<1>{computer}", text))
 
 
-def shell_blocks():
+def documented_commands():
     text = (history.REPOSITORY / "docs" / "reader.md").read_text()
     return re.findall(r"```sh\n(.*?)```", text.split("## Many machines")[1], re.S)
 
 
+def outputs_of(commands, folder):
+    """Their outputs in the folder, with the time that they take."""
+    environment = dict(os.environ, PATH=f"{history.PROGRAM.parent}:{os.environ['PATH']}")
+    for command in commands:
+        began = time.monotonic()
+        yield subprocess.run(["bash", "-euc", command], cwd=folder, env=environment, check=True,
+                             capture_output=True, text=True).stdout
+        print(f"{time.monotonic() - began:6.2f} s  {command.strip().splitlines()[-1]}")
+
+
 def main():
-    machines = int(sys.argv[1]) if len(sys.argv) > 1 else 100
-    with tempfile.TemporaryDirectory() as scratch:
-        folder = Path(scratch)
-        (folder / "archives").mkdir()
-        histories = [record(folder / name, fails=name == "failed") for name in ("well", "failed")]
-        failed = []
-        well = []
-        for number in range(machines):
-            computer = f"machine{number:04}"
-            fails = number % 3 == 0
-            (failed if fails else well).append(computer)
-            write_archive(folder / "archives" / f"{number}.zip", histories[fails], computer)
-        environment = dict(os.environ, PATH=f"{READER.parent}:{os.environ['PATH']}")
-        outputs = []
-        for block in shell_blocks():
-            began = time.monotonic()
-            outputs.append(subprocess.run(["bash", "-euc", block], cwd=folder, env=environment,
-                                          check=True, capture_output=True, text=True).stdout)
-            print(f"{time.monotonic() - began:6.2f} s  {block.strip().splitlines()[-1]}")
-        check = history.check
-        check(len(outputs) == 5, f"{len(outputs)} blocks of commands")
-        check(outputs[2] == "".join(f"{name}|2026-11-14T11:00:00\n" for name in failed),
-              f"failed machines: {outputs[2]}")
-        check(outputs[3] == "".join(f"{name}|Prod\n" for name in well),
-              f"machines with the version: {outputs[3]}")
-        check(f'profile|["Prod"]|Port|changed|{len(failed)}\n' in outputs[4],
-              f"changes: {outputs[4]}")
-    print(f"{machines} machines: the answers are right")
+    names = [f"machine{number:04}" for number in range(int(sys.argv[1]))]
+    failed, well = names[::3], [name for number, name in enumerate(names) if number % 3]
+    histories = {True: record(fails=True), False: record(fails=False)}
+    with Machine() as machine:
+        archives = machine.scratch / "archives"
+        archives.mkdir()
+        for name in names:
+            write_archive(archives / f"{name}.zip", histories[name in failed], name)
+        _, _, failures, versions, changes = outputs_of(documented_commands(), machine.scratch)
+    check_equal(failures, "".join(f"{name}|2026-11-14T11:00:00\n" for name in failed),
+                "failed machines")
+    check_equal(versions, "".join(f"{name}|Prod\n" for name in well), "machines with the version")
+    history.check(f'profile|["Prod"]|Port|changed|{len(failed)}\n' in changes,
+                  f"changes: {changes}")
+    print(f"{len(names)} machines: the answers are right")
 
 
 if __name__ == "__main__":

@@ -14,6 +14,7 @@ from machine import Machine, Skipped, check_equal, contents
 
 MARKER = b"what is outside stays outside"
 NOBODY = 65534
+AS_NOBODY = {"user": NOBODY, "group": NOBODY, "extra_groups": []}  # options of a run
 
 # The runs of an event's life.
 RUNS = (("-start", "7"), ("-logmessage", "7", "-message", "text"), ("-end", "7"),
@@ -38,13 +39,6 @@ def injecting(call, fault, *options):
     --seccomp-bpf, with which strace injects no signal."""
     return ("strace", "-f", "-qq", "-o", "/dev/null", "-e", f"trace={call}", "-e",
             f"inject={call}:{fault}", *options)
-
-
-def as_nobody():
-    """For preexec_fn: the run is another user's."""
-    os.setgroups([])
-    os.setgid(NOBODY)
-    os.setuid(NOBODY)
 
 
 def require_root():

@@ -12,7 +12,6 @@ import itertools
 import os
 import random
 import re
-import resource
 import shutil
 import signal
 import typing
@@ -182,20 +181,13 @@ class Bench(Target):
 
     def disturb(self, point, words):
         """Makes the run with the point's fault; returns its exit code and output."""
-        if point.call == "size":
-            return self.limit_size(point.number, words)
         fault = "signal=SIGKILL" if point.fault == "kill" else f"error={point.fault}"
-        return self.run(*words, before=injecting(point.call, f"{fault}:when={point.number}"))
-
-    def limit_size(self, size, words):
-        """No file grows beyond the size: the write up to it is done, and the next one fails. The
-        signal that the system sends then ends every program that does not expect it."""
-        def set_limit():
-            resource.setrlimit(resource.RLIMIT_CORE, (0, 0))
-            resource.setrlimit(resource.RLIMIT_FSIZE, (size, size))
-            signal.signal(signal.SIGXFSZ, signal.SIG_DFL)
-        # Python ignores this signal; restore_signals would overrule set_limit.
-        return self.run(*words, preexec_fn=set_limit, restore_signals=False)
+        before = injecting(point.call, f"{fault}:when={point.number}")
+        if point.call == "size":
+            # The write up to the size is done, and the next one fails. The signal that the system
+            # sends then ends every program that does not expect it.
+            before = ("prlimit", "--core=0", f"--fsize={point.number}")
+        return self.run(*words, before=before)
 
     def check_point(self, point):
         scenario = self.scenarios[point.run]

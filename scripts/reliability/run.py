@@ -16,17 +16,10 @@ To add an attack, write a short function in one of the files of attacks/:
         machine.archive.mkdir()
         machine.report(code=3)
 
-It gets a temporary machine of its own (harness.Target): `run`, `must`, `start`, `record` and
-`report` run the program, `sections` and `packed` read the history and the archive strictly.
-`check(holds, message)` states a promise. The machine is removed whatever happens, after what was
-given to `machine.callback`; that nothing outside the history has changed is checked after every
-attack. Several rows of one attack are written as a table:
-
-    @attack("Summary.txt", "History.ini")
-    def archive_in_place_of(machine, name):
-
-An attack that begins with `require_root()` is skipped for other users. A new file in attacks/ is
-found by itself.
+The machine (harness.Target) is its own and temporary; `check(holds, message)` states a promise.
+After every attack nothing outside the history may have changed. Several rows of one attack are
+written as a table, `@attack("Summary.txt", "History.ini")`. A new file in attacks/ is found by
+itself.
 """
 
 import argparse

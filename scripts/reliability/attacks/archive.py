@@ -71,7 +71,7 @@ def archive_in_place_of(machine, name):
 @attack()
 def archive_is_its_owners_alone(machine):
     machine.record("7")
-    machine.report(preexec_fn=lambda: os.umask(0))
+    machine.report(umask=0)
     check(stat.S_IMODE(machine.archive.stat().st_mode) == 0o600, "others can read it")
 
 
@@ -83,13 +83,9 @@ def record_much(machine, megabytes):
 
 def start_archive(machine, archive):
     """Starts a report and returns its process when it has written a part of the archive."""
-    before = os.listdir(archive.parent)
-
     def is_being_written():
-        names = [name for name in os.listdir(archive.parent)
-                 if name not in before or name == archive.name]
-        with contextlib.suppress(FileNotFoundError):
-            return any((archive.parent / name).stat().st_size > 1 << 20 for name in names)
+        with contextlib.suppress(FileNotFoundError):  # the temporary file gets its name
+            return any(file.stat().st_size > 1 << 20 for file in archive.parent.iterdir())
     process = machine.start("-report", str(archive))
     wait_for(is_being_written, "writes no archive")
     return process

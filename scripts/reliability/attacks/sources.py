@@ -10,7 +10,7 @@ import time
 from pathlib import Path
 
 import history
-from harness import NOBODY, as_nobody, attack, require_root
+from harness import AS_NOBODY, NOBODY, attack, require_root
 from history import check
 from machine import Skipped
 
@@ -30,10 +30,6 @@ def event_report(machine, **options):
     return (machine.history / "7" / history.LOG).read_bytes()
 
 
-def limit_memory():
-    resource.setrlimit(resource.RLIMIT_AS, (800 << 20, 800 << 20))
-
-
 @attack(("levels of a heading", lambda: "".join(
             f"[HKEY_LOCAL_MACHINE\\SOFTWARE\\ZEK\\{i}" + "\\k" * 500_000 + "]\n"
             for i in range(10))),
@@ -47,7 +43,7 @@ def hostile_registry_export(machine, make):
     """It costs a small multiple of its size in memory and little time, and the good lines count."""
     write_export(machine, make() + GOOD)
     began = resource.getrusage(resource.RUSAGE_CHILDREN).ru_utime
-    report = event_report(machine, preexec_fn=limit_memory)
+    report = event_report(machine, before=("prlimit", f"--as={800 << 20}"))
     seconds = resource.getrusage(resource.RUSAGE_CHILDREN).ru_utime - began
     check(seconds < 2, f"{seconds:.1f} s of CPU time")
     check(b"Seen:" in report, "the last key is missing")
@@ -107,8 +103,8 @@ def interrupted_name_service_for_an_owners_groups(machine):
     os.chown(machine.source, 0, 100)
     machine.source.chmod(0o640)
     machine.watch()
-    machine.must("-start", "7", "-l", str(machine.source), preexec_fn=as_nobody)
-    machine.must("-end", "7", preexec_fn=as_nobody)
+    machine.must("-start", "7", "-l", str(machine.source), **AS_NOBODY)
+    machine.must("-end", "7", **AS_NOBODY)
     machine.report(variables=machine.with_functions(INTERRUPTED_NAME_SERVICE))
     check("7/setup.log" in machine.packed(), "not collected")
 

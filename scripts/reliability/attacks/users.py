@@ -5,7 +5,7 @@ import shutil
 import stat
 
 import history
-from harness import MARKER, NOBODY, RUNS, as_nobody, attack, digest, require_root
+from harness import AS_NOBODY, MARKER, NOBODY, RUNS, attack, digest, require_root
 from history import check
 
 
@@ -37,8 +37,8 @@ def planted_section(machine):
     for path in (secret, own):
         path.chmod(0o600)
     machine.watch()
-    machine.must("-start", "7", "-l", str(secret), "-t", str(own), preexec_fn=as_nobody)
-    machine.must("-end", "7", preexec_fn=as_nobody)
+    machine.must("-start", "7", "-l", str(secret), "-t", str(own), **AS_NOBODY)
+    machine.must("-end", "7", **AS_NOBODY)
     machine.report()
     check(MARKER not in b"".join(machine.packed().values()), "packed what its owner may not read")
     check("7/own.log" in machine.packed(), "a file of his own is missing")
@@ -51,13 +51,13 @@ def foreign_history(machine):
     os.chown(machine.history, NOBODY, NOBODY)
     os.chmod(machine.archives, 0o777)
     machine.watch()
-    machine.must("-start", "first", preexec_fn=as_nobody)
+    machine.must("-start", "first", **AS_NOBODY)
     os.chmod(machine.ini, 0o640)
     for words in RUNS:
         machine.run_any(words)
     status = machine.ini.stat()
     check((status.st_uid, stat.S_IMODE(status.st_mode)) == (NOBODY, 0o640), "owner or mode")
-    machine.must("-end", "first", preexec_fn=as_nobody)
+    machine.must("-end", "first", **AS_NOBODY)
     check(machine.sections()["first"]["Complete_Flag"] == "TRUE", "owner shut out")
     machine.check_outside()
 
@@ -73,13 +73,13 @@ def read_only_history(machine):
     machine.archive.unlink()
     inside = {path: digest(path) for path in machine.history.rglob("*")}
     for words in (*RUNS, ("-start", "new"), ("-end", "open", "-CopyName", "C9")):
-        machine.run_any(words, preexec_fn=as_nobody)
+        machine.run_any(words, **AS_NOBODY)
     check(machine.archive.exists(), "no archive")
     check(inside == {path: digest(path) for path in machine.history.rglob("*")}, "changed")
     os.chmod(machine.history, 0o700)
     for words in RUNS:
-        machine.run_any(words, preexec_fn=as_nobody)
+        machine.run_any(words, **AS_NOBODY)
     shutil.rmtree(machine.root / "ZEK")
     machine.watch()
-    machine.must("-start", "new", code=1, preexec_fn=as_nobody)
+    machine.must("-start", "new", code=1, **AS_NOBODY)
     check(not (machine.root / "ZEK").exists(), "made a folder")
