@@ -21,7 +21,7 @@ struct CServiceInfo {
 // cannot be listed.
 class CServicesList : public Info {
  public:
-  // Returns 0, or the system's code for the step that failed. Waits at most two seconds on Linux.
+  // Returns 0, or the system's code for the step that failed. Waits at most two seconds.
   int32_t Collect() override;
 
   int32_t Print() override;

@@ -1,19 +1,120 @@
-// The program as an installer runs it, while other programs hold files. It replaces the machine's
-// history, so these tests run only if a variable is set.
+// The program as an installer runs it, and files that other programs, such as a scanner, keep open.
 
+#include <chrono>
 #include <cstdlib>
+#include <functional>
+#include <future>
 #include <thread>
+#include <utility>
 
 #include "app/install_history.h"
+#include "eventlog/logger.h"
 #include "history/locations.h"
-#include "platform/profile_file.h"
+#include "platform/exclusive_file.h"
+#include "platform/files.h"
+#include "platform/windows/file_handle.h"
+#include "platform/windows/folder_lock.h"
 #include "tests/platform/contract.h"
-#include "tests/windows/holder.h"
 
 namespace {
 
 using namespace std::chrono_literals;
 
+// Another program: it keeps what it has acquired until the object ends or the time has passed.
+class Holder {
+ public:
+  Holder(const std::function<UniqueHandle()>& acquire, std::chrono::steady_clock::duration time)
+      : Thread([this, acquire, time] {
+          const UniqueHandle held = acquire();
+          Acquired.set_value(held != nullptr);
+          Ended.get_future().wait_for(time);
+        }) {
+    EXPECT_TRUE(Acquired.get_future().get());
+  }
+  // It has a file open for reading.
+  Holder(const std::string& path, DWORD share, std::chrono::steady_clock::duration time)
+      : Holder([&] { return OpenExisting(path, GENERIC_READ, share); }, time) {}
+  ~Holder() {
+    Ended.set_value();
+    Thread.join();
+  }
+  Holder(const Holder&) = delete;
+  Holder& operator=(const Holder&) = delete;
+
+ private:
+  std::promise<bool> Acquired;
+  std::promise<void> Ended;
+  std::thread Thread;
+};
+
+using ProfileOnWindows = ProfileFile;
+
+TEST_F(ProfileOnWindows, WaitsForAProgramThatHoldsTheFileBriefly) {
+  for (const bool isWritten : {false, true}) {
+    const Holder holder(Ini, /*share=*/0, 150ms);
+    EXPECT_EQ(isWritten ? WriteProfileValue(Ini, "T", "Key", "more") : Value() == "old", true);
+  }
+  EXPECT_EQ(Value(), "old");
+  EXPECT_EQ(ReadProfileValue(Ini, "T", "Key", "none", 256), "more");
+}
+
+TEST_F(ProfileOnWindows, IsUnchangedIfAProgramNeverSharesIt) {
+  const ProfileGuard guard(Ini);
+  {
+    const Holder holder(Ini, /*share=*/0, 10s);
+    EXPECT_EQ(Value(), "none");
+  }
+  EXPECT_FALSE(WriteProfileValue(Ini, "S", "Key", "new"));
+  { const ProfileGuard inner(Ini); }
+  EXPECT_EQ(FileText(Ini), "[S]\nKey=old\n");
+}
+
+TEST_F(ProfileOnWindows, IsWrittenInPlaceIfItCannotBeReplaced) {
+  const Holder holder(Ini, FILE_SHARE_READ | FILE_SHARE_WRITE, 10s);
+  for (const std::string& value : {std::string(3000, 'v'), std::string("short")}) {
+    EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", value));
+    EXPECT_EQ(ReadProfileValue(Ini, "S", "Key", "none", 4000), value);
+  }
+  EXPECT_EQ(FileText(Ini), "[S]\r\nKey=short\r\n");
+  EXPECT_EQ(Tree(), "a.ini\n");
+}
+
+TEST_F(ProfileOnWindows, WaitsForALockOnlyOnce) {
+  const auto lock = [this] {
+    UniqueHandle mutex = OpenFolderMutex(Root + kPathSeparator);
+    ::WaitForSingleObject(mutex.get(), INFINITE);
+    return mutex;
+  };
+  const Holder holder(lock, 10s);
+  ExpectOneWaitForTheLock(Ini);
+  LimitProfileLockTime(10s);
+}
+
+using HeldFile = Platform;
+
+TEST_F(HeldFile, IsWaitedFor) {
+  const std::string file = Make("file", "text");
+  const auto appendToLog = [&file] {
+    CLogger& log = CLogger::GetInstance();
+    log.Open(file, std::ios::app);
+    log << ", more" << std::flush;
+    log.Close();
+    return FileText(file) == "text, more";
+  };
+  const std::pair<DWORD, std::function<bool()>> cases[] = {
+      {FILE_SHARE_READ, [&] { return ExclusiveFile(file).IsOpen(); }},
+      {0, [&] { return CopyToNewFile(file, In("copy"), /*trusted=*/Root); }},
+      {FILE_SHARE_READ, appendToLog},
+  };
+  for (const auto& [share, access] : cases) {
+    const Holder holder(file, share, 100ms);
+    EXPECT_TRUE(access());
+  }
+  const Holder holder(file, FILE_SHARE_READ, 10s);
+  EXPECT_FALSE(ExclusiveFile(file).IsOpen());
+}
+
+// They replace the machine's history, so they run only if a variable is set.
 class Run : public Platform {
  protected:
   void SetUp() override {

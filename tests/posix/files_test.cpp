@@ -1,28 +1,48 @@
-#include "platform/profile_file.h"
-
 #include <fcntl.h>
 #include <sys/file.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/xattr.h>
+#include <unistd.h>
 
-#include <chrono>
 #include <csignal>
 #include <thread>
 
+#include "platform/exclusive_file.h"
+#include "platform/files.h"
+#include "platform/folder_listing.h"
 #include "platform/posix/descriptor.h"
+#include "platform/shared_file.h"
 #include "tests/platform/contract.h"
 
 namespace {
 
 using namespace std::chrono_literals;
 
-class ProfileOnPosix : public Platform {
- protected:
-  std::string Value() const { return ReadProfileValue(Ini, "S", "Key", "none", 256); }
+using SpecialFiles = Platform;
 
-  const std::string Ini = Make("a.ini", "[S]\nKey=old\n");
-};
+TEST_F(SpecialFiles, AreNeitherListedNorOpenedNorWaitedFor) {
+  ::mkfifo(In("pipe").c_str(), 0600);
+  ::mknod(In("socket").c_str(), S_IFSOCK | 0600, 0);
+  fs::create_symlink(Make("file", "text"), In("link"));
+  Make("folder/");
+  std::string names;
+  for (const FolderEntry& entry : ListFolder(Root)) {
+    names += entry.Name + ' ';
+  }
+  EXPECT_EQ(names, ". .. file folder ");
+  ::alarm(10);  // ends a test that waits for the other side of the pipe
+  for (const std::string& path : {In("pipe"), In("socket")}) {
+    ASSERT_TRUE(fs::exists(path));
+    EXPECT_FALSE(ExclusiveFile(path).IsOpen()) << path;
+    EXPECT_FALSE(SharedFile(path, LinkPolicy::kFollow).IsOpen()) << path;
+    EXPECT_FALSE(CopyToNewFile(path, In("copy"), /*trusted=*/Root)) << path;
+    EXPECT_EQ(ReadProfileValue(path, "S", "Key", "none", 256), "none") << path;
+  }
+  ::alarm(0);
+}
+
+using ProfileOnPosix = ProfileFile;
 
 TEST_F(ProfileOnPosix, IsReadAgainIfOnlyItsChangeTimeDiffers) {
   EXPECT_EQ(Value(), "old");
@@ -58,36 +78,34 @@ constexpr char accessList[] =
     "\4\0\0\0\xFF\xFF\xFF\xFF"
     "\x10\0\6\0\xFF\xFF\xFF\xFF"
     "\x20\0\0\0\xFF\xFF\xFF\xFF";
+constexpr size_t listSize = sizeof accessList - 1;
 constexpr const char* listName = "system.posix_acl_access";
 
 TEST_F(ProfileOnPosix, KeepsOwnerPermissionsAndAccessList) {
+  const auto listAfterAWrite = [this](const std::string& value) {
+    EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", value));
+    char list[100] = {};
+    const ssize_t size = ::getxattr(Ini.c_str(), listName, list, sizeof list);
+    return std::string(list, size < 0 ? 0 : static_cast<size_t>(size));
+  };
   const uid_t owner = ::getuid() == 0 ? 65534 : ::getuid();
   for (const mode_t mode : {0600U, 0640U, 0604U, 04755U}) {
     ASSERT_EQ(::chown(Ini.c_str(), owner, /*group=*/::getgid()), 0);
     ASSERT_EQ(::chmod(Ini.c_str(), mode), 0);
-    EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", std::to_string(mode)));
+    EXPECT_EQ(listAfterAWrite(std::to_string(mode)), "");
     struct stat status = {};
     ASSERT_EQ(::stat(Ini.c_str(), &status), 0);
     EXPECT_EQ(status.st_mode & 07777, mode);
     EXPECT_EQ(status.st_uid, owner);
-    EXPECT_LT(::getxattr(Ini.c_str(), listName, /*value=*/nullptr, /*size=*/0), 0);
   }
-  const std::string_view list(accessList, sizeof accessList - 1);
-  const auto listOf = [](const std::string& path) {
-    char buffer[100] = {};
-    const ssize_t size = ::getxattr(path.c_str(), listName, buffer, sizeof buffer);
-    return std::string(buffer, size < 0 ? 0 : static_cast<size_t>(size));
-  };
   // The folder's default list must not be added, and the file's own list must be kept.
-  if (::setxattr(Root.c_str(), "system.posix_acl_default", list.data(), list.size(), 0) != 0) {
+  if (::setxattr(Root.c_str(), "system.posix_acl_default", accessList, listSize, 0) != 0) {
     GTEST_SKIP() << "a file system without access control lists";
   }
   ASSERT_EQ(::chmod(Ini.c_str(), 0660), 0);
-  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "no list"));
-  EXPECT_EQ(listOf(Ini), "");
-  ASSERT_EQ(::setxattr(Ini.c_str(), listName, list.data(), list.size(), /*flags=*/0), 0);
-  EXPECT_TRUE(WriteProfileValue(Ini, "S", "Key", "with a list"));
-  EXPECT_EQ(listOf(Ini), list);
+  EXPECT_EQ(listAfterAWrite("no list"), "");
+  ASSERT_EQ(::setxattr(Ini.c_str(), listName, accessList, listSize, /*flags=*/0), 0);
+  EXPECT_EQ(listAfterAWrite("with a list"), std::string(accessList, listSize));
 }
 
 TEST_F(ProfileOnPosix, WaitsForALockOnlyOnce) {
