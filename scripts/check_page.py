@@ -28,7 +28,7 @@ HOSTILE = [
 
 CHROMIUM = ["chromium", "--headless", "--no-sandbox", "--disable-gpu", "--disable-quic",
             "--no-first-run", "--disable-background-networking", "--disable-component-update",
-            "--disable-sync", "--hide-scrollbars"]
+            "--disable-sync"]
 
 
 class Page(html.parser.HTMLParser):

@@ -1,16 +1,6 @@
-#!/usr/bin/env python3
-"""Makes a history of many ended events, to try and to measure programs on.
+"""A history of many ended events, to try and to measure programs on."""
 
-    make_history.py ROOT EVENTS [--copies N] [--log-bytes N] [--collect] [--name-length N]
-
-ROOT becomes the common application data folder; it must not hold a history yet. With --collect each
-event also names three files of the installer, below ROOT/installer, that the first report collects.
-The same arguments make the same files.
-"""
-
-import argparse
 import random
-from pathlib import Path
 
 import history
 
@@ -28,15 +18,17 @@ def make_log(generator, size):
     return "\n".join(lines) + "\n"
 
 
-def make_history(root, events, copies=20, log_bytes=8000, collect=False, name_length=4):
-    root = Path(root)
+def make_history(root, events, log_bytes=8000, collect=False):
+    """The root becomes the common application data folder; it must not have a history yet. With
+    `collect` each event names three files of the installer that the first report collects. The same
+    arguments make the same files. Returns the root."""
     folder = root / history.HISTORY
     folder.mkdir(parents=True, exist_ok=True)
     generator = random.Random(1)
     sections = {"History": {"Count": str(events)}}
     for number in range(events):
-        name = str(number).zfill(name_length)
-        copy = f"Copy{number % copies}"
+        name = f"{number:04}"
+        copy = f"Copy{number % 20}"
         log = folder / copy / name / history.LOG
         log.parent.mkdir(parents=True)
         log.write_text(make_log(generator, log_bytes))
@@ -54,18 +46,3 @@ def make_history(root, events, copies=20, log_bytes=8000, collect=False, name_le
             Result="Success")
     (folder / "History.ini").write_text(history.format_history(sections), newline="\n")
     return root
-
-
-def main():
-    parser = argparse.ArgumentParser(description=__doc__)
-    parser.add_argument("root")
-    parser.add_argument("events", type=int)
-    parser.add_argument("--copies", type=int, default=20)
-    parser.add_argument("--log-bytes", type=int, default=8000)
-    parser.add_argument("--name-length", type=int, default=4)
-    parser.add_argument("--collect", action="store_true")
-    make_history(**vars(parser.parse_args()))
-
-
-if __name__ == "__main__":
-    main()

@@ -1,11 +1,6 @@
-#!/usr/bin/env python3
-"""Writes a registry export of a given size, laid out as a machine's own: key by key down the tree.
-
-    make_registry_export.py MEGABYTES utf-8|utf-16 FILE
-"""
+"""A registry export of a given size, laid out as a machine's own: key by key down the tree."""
 
 import random
-import sys
 
 MICROSOFT = "SOFTWARE\\Microsoft\\Windows\\CurrentVersion"
 USER_DATA = f"{MICROSOFT}\\Installer\\UserData\\S-1-5-18"
@@ -78,7 +73,3 @@ def make_registry_export(megabytes, encoding, name):
                 left -= put("".join(component(generator, root) for _ in range(100)))
             for text in others(generator) if others else ():
                 put(text)
-
-
-if __name__ == "__main__":
-    make_registry_export(int(sys.argv[1]), sys.argv[2], sys.argv[3])

@@ -3,8 +3,8 @@ run killed at a random moment, then on a file system without locks. Meanwhile a 
 history file. At the end everything that finished must be there, complete and once.
 """
 
+import itertools
 import random
-import threading
 import time
 
 import history
@@ -26,92 +26,86 @@ class Crowd:
         self.machine = machine
         self.until = time.monotonic() + seconds
         self.killed_share = killed_share
-        self.codes, self.reports = [], []
-        self.parsed = 0
+        self.numbers = itertools.count()
+        self.codes, self.reports, self.parsed = [], [], []
         self.begun, self.started, self.ending = set(SHARED), set(SHARED), set()
         self.copies = {}  # event: copy, of the finished ends
         self.messages = {}  # event: messages of the finished runs
         self.cut = set()  # messages of the killed ones
 
-    def before(self, chance):
+    def before(self):
         """The words before a run: none, or a command that kills it."""
-        if chance.random() >= self.killed_share:
+        if random.random() >= self.killed_share:
             return ()
-        return ("timeout", "--signal=KILL", f"{chance.uniform(0.001, 0.08):.4f}")
+        return ("timeout", "--signal=KILL", f"{random.uniform(0.001, 0.08):.4f}")
 
-    def run(self, chance, *words):
+    def run(self, *words):
         """True for a run that finished."""
-        before = self.before(chance)
+        before = self.before()
         code, output = self.machine.run(*words, before=before, timeout=60)
         self.codes.append(code)
         check(code == 0 or before, f"exit code {code}: {words} {output}")
         return code == 0
 
-    def send(self, chance, event, text):
-        if self.run(chance, "-logmessage", event, "-message", f"^{text}$"):
+    def send(self, event, text):
+        if self.run("-logmessage", event, "-message", f"^{text}$"):
             self.messages.setdefault(event, []).append(text)
         else:
             self.cut.add(text)
 
-    def live(self, chance, worker, number):
+    def live(self):
         """One event from its start to its end."""
-        event = f"{worker}-{number}"
+        event = f"event{next(self.numbers)}"
         self.begun.add(event)
-        if not self.run(chance, "-start", event, "-Product", f"P{event}"):
+        if not self.run("-start", event, "-Product", f"P{event}"):
             return
         self.started.add(event)
-        self.send(chance, event, f"{event} first")
-        length = chance.choice((10, 100, 5000, 60000))
-        self.send(chance, SHARED[number % len(SHARED)], f"{event} {'x' * length}")
-        self.send(chance, event, f"{event} second")
-        copy = f"C{chance.randrange(COPIES)}"
+        self.send(event, f"{event} first")
+        length = random.choice((10, 100, 5000, 60000))
+        self.send(random.choice(SHARED), f"{event} {'x' * length}")
+        self.send(event, f"{event} second")
+        copy = f"C{random.randrange(COPIES)}"
         self.ending.add(event)
-        if self.run(chance, "-end", event, "-CopyName", copy, "-Result", f"R{event}"):
+        if self.run("-end", event, "-CopyName", copy, "-Result", f"R{event}"):
             self.copies[event] = copy
-        if number % 10 == worker % 10:
-            self.report(chance, worker)
+        if random.random() < 0.1:
+            self.report(self.machine.scratch / f"{event}.zip")
 
-    def report(self, chance, worker):
-        archive = self.machine.scratch / f"{worker}.zip"
-        if self.run(chance, "-report", str(archive)):
+    def report(self, archive):
+        if self.run("-report", str(archive)):
             entries = history.read_archive(archive)
             history.parse_history(entries["History.ini"], has_complete_events=True)
+            archive.unlink()
             self.reports.append(archive)
 
-    def message_during_start(self, number):
+    def message_during_start(self):
         """A run appends a message while the start still writes the log."""
-        event = f"early{number}"
+        event = f"early{next(self.numbers)}"
         log = self.machine.history / event / history.LOG
-        start = threading.Thread(target=self.machine.run, args=("-start", event))
-        start.start()
+        start = self.machine.start("-start", event, "-Product", f"P{event}")
         wait_for(log.exists, "no log")
         self.machine.must("-logmessage", event, "-message", "^early$")
-        start.join()
+        check(start.wait(20) == 0, "exit code of a start")
         self.begun.add(event)
         self.started.add(event)
         self.messages[event] = ["early"]
 
-    def work(self, outcome, worker):
-        chance = random.Random(worker)
-        number = 0
-        while time.monotonic() < self.until:
-            outcome.attempt(f"overlap, worker {worker}", lambda: self.live(chance, worker, number))
-            number += 1
+    def read(self):
+        self.parsed.append(history.parse_history(self.machine.ini.read_bytes(),
+                                                 self.has_complete_events)["History"])
+        time.sleep(0.01)
 
-    def read(self, outcome):
+    def repeat(self, outcome, name, action):
         while time.monotonic() < self.until:
-            outcome.attempt("overlap, reader", lambda: history.parse_history(
-                self.machine.ini.read_bytes(), self.has_complete_events))
-            self.parsed += 1
-            time.sleep(0.01)
+            outcome.attempt(f"overlap, {name}", action)
 
     def go(self, outcome):
         for event in SHARED:
-            self.machine.must("-start", event)
-        for number in range(10):
-            outcome.attempt("overlap, early message", lambda: self.message_during_start(number))
-        in_threads([(self.work, outcome, worker) for worker in range(WORKERS)]
-                   + [(self.read, outcome)])
+            self.machine.must("-start", event, "-Product", f"P{event}")
+        for _ in range(10):
+            outcome.attempt("overlap, early message", self.message_during_start)
+        in_threads([(self.repeat, outcome, "worker", self.live)] * WORKERS
+                   + [(self.repeat, outcome, "reader", self.read)])
         self.judge(outcome)
 
     def judge(self, outcome):
@@ -128,12 +122,13 @@ class Crowd:
         count = int(sections["History"]["Count"])
         check(len(self.started) <= count <= len(self.begun),
               f"count {count}, finished {len(self.started)}, begun {len(self.begun)}")
+        check(self.killed_share or not list(self.machine.history.rglob(".*")), "litter")
 
     def check_event(self, keys, event):
         check(keys, "lost section")
         check(keys["Complete_Flag"] == "TRUE" or event not in self.copies, "lost end")
         check(keys["Complete_Flag"] == "FALSE" or event in self.ending, "end without a run")
-        check(keys["Product"] == f"P{event}" or "-" not in event, "lost product")
+        check(keys["Product"] == f"P{event}", "lost product")
 
     def check_log(self, keys, event):
         log = self.machine.log_of(event, keys["Copy_Name"] or "none")
@@ -169,17 +164,17 @@ class UnlockedCrowd(Crowd):
 
     has_complete_events = False
 
-    def before(self, chance):
+    def before(self):
         # The delay, in microseconds, leaves a new file empty for so long.
         return injecting("flock", "error=ENOLCK", "-e", "trace=flock,fchmod",
                          "-e", "inject=fchmod:delay_enter=3000")
 
-    def live(self, chance, worker, number):
-        event = f"{worker}-{number}"
-        self.run(chance, "-start", event)
-        self.run(chance, "-end", event, "-CopyName", "C")
+    def live(self):
+        event = f"event{next(self.numbers)}"
+        self.run("-start", event)
+        self.run("-end", event, "-CopyName", "C")
 
-    def message_during_start(self, number):
+    def message_during_start(self):
         pass
 
     def judge(self, outcome):
@@ -195,5 +190,5 @@ def attack_together(program, outcome, seconds, _):
             crowd.go(outcome)
         killed = len(crowd.codes) - crowd.codes.count(0)
         print(f"overlap, {name}: {len(crowd.codes)} runs, {killed} of them killed, "
-              f"{len(crowd.reports)} archives and {crowd.parsed} histories read meanwhile",
+              f"{len(crowd.reports)} archives and {len(crowd.parsed)} histories read meanwhile",
               flush=True)
