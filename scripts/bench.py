@@ -1,5 +1,5 @@
 #!/usr/bin/env python3
-"""Measures whole processes side by side, and compares the ratios with their limits.
+"""Measures complete processes side by side, and compares the ratios with their limits.
 
 The commands of one comparison take turns (A B A B ...), so that a change of the machine's speed
 affects all of them. CPU time, of program and system together, decides; elapsed time is printed too.

@@ -1,5 +1,5 @@
 #!/bin/sh
-# Measures whole runs of the program beside what one would otherwise use; see docs/performance.md.
+# Measures complete runs of the program and of other tools; see docs/performance.md.
 # usage: bench.sh [--short] [WORK...]
 set -eu
 cd "$(dirname "$0")/.."

@@ -1,5 +1,5 @@
 #!/usr/bin/env python3
-"""Opens the page of a hostile history in a headless Chromium and looks at what it made of it.
+"""Opens the page of a hostile history in a headless Chromium and checks what it shows.
 
 Every event must be there, as text; no script may have run and nothing may have been fetched.
 """

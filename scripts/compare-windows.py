@@ -55,12 +55,12 @@ class Side(Machine):
         beginning = self.files_name + self.separator
         return super().popen([word.replace("{files}/", beginning) for word in words], **options)
 
-    def say(self, words):
+    def output_of(self, words):
         """A run's exit code and output in a text."""
         code, output = self.run(*words, timeout=120)
-        return f"{words}\nexit code {code}: {self.plain(output)}"
+        return f"{words}\nexit code {code}: {self.comparable(output)}"
 
-    def plain(self, data):
+    def comparable(self, data):
         """Text without what differs: the code page, the two folders, line ends, and times."""
         text = data.decode(self.encoding, "replace").replace("\r\n", "\n")
         text = text.replace(self.root_name, "{root}").replace(self.files_name, "{files}")
@@ -69,10 +69,10 @@ class Side(Machine):
 
     def contents(self, name, data):
         if name.endswith("History.ini"):
-            return history_lines(self.plain(data))
+            return history_lines(self.comparable(data))
         if name.endswith("ORXInstallEvent.Log"):
-            return without_machine(self.plain(data))
-        return self.plain(data)
+            return without_machine(self.comparable(data))
+        return self.comparable(data)
 
     def tree(self):
         for path in sorted(self.history.rglob("*")):
@@ -167,7 +167,7 @@ def run_history(side, runs):
     for name in INSTALLER_FILES:
         (side.files / name).parent.mkdir(exist_ok=True)
         (side.files / name).write_text(f"the installer's file of {len(name)} letters")
-    return outcome_of(side, [side.say(words) for words in runs])
+    return outcome_of(side, [side.output_of(words) for words in runs])
 
 
 def run_section_names(side):
@@ -178,7 +178,7 @@ def run_section_names(side):
         side.history.mkdir()
         names = ["History", *(letter * 999 for letter in "abcdefghij"), "z" * (last + 2), "after"]
         side.ini.write_text("".join(f"[{name}]\nAction={len(name)}\n" for name in names))
-        texts.append(outcome_of(side, [side.say(REPORT)]))
+        texts.append(outcome_of(side, [side.output_of(REPORT)]))
     return "\n".join(texts)
 
 
@@ -209,7 +209,7 @@ def run_links(side):
             linked.rename(kept)
         linked.symlink_to(target)
         try:
-            texts += [side.say(words) for words in (["-start", "42"], REPORT)]
+            texts += [side.output_of(words) for words in (["-start", "42"], REPORT)]
         finally:
             linked.unlink()
             if kept.exists():
@@ -223,7 +223,7 @@ def run_killed(side):
     """Starts that are killed at all of their moments leave complete sections, and no run waits."""
     side.reset()
     began = time.monotonic()
-    side.say(["-start", "complete"])
+    side.output_of(["-start", "complete"])
     lasts = time.monotonic() - began
     count = 16
     for i in range(count):
@@ -232,10 +232,10 @@ def run_killed(side):
         process.kill()
         process.communicate()
     side.run("-start", "last", timeout=60)
-    text = history_lines(side.plain(side.ini.read_bytes())) + "\n"
+    text = history_lines(side.comparable(side.ini.read_bytes())) + "\n"
     sections = parse_history(text.encode(), has_complete_events=True)
     check(sections["History"]["Count"] == str(len(sections) - 1), f"count of {list(sections)}")
-    check(not list(side.history.glob(".*")), "litter")
+    check(not list(side.history.glob(".*")), "leftover files")
     return "complete"
 
 
@@ -316,7 +316,7 @@ def main():
                       ("overlapping starts", run_overlapping), ("killed starts", run_killed)):
         comparison.compare(name, run)
     print(comparison.outcome.summary())
-    return 1 if comparison.outcome.faults else 0
+    return 1 if comparison.outcome.failures else 0
 
 
 if __name__ == "__main__":

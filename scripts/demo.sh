@@ -1,6 +1,6 @@
 #!/bin/sh
-# Installs what a fresh Debian machine lacks, builds, and records, packs and reads a whole event in a
-# scratch folder.
+# Installs what a fresh Debian machine lacks, builds, and records, packs and reads a complete event
+# in a temporary folder.
 set -eu
 cd "$(dirname "$0")/.."
 

@@ -17,17 +17,17 @@ EVENT_KEYS = tuple(re.findall(
 TIME = re.compile(r"\d{8} \d\d:\d\d:\d\d")
 
 
-class Fault(Exception):
+class Failure(Exception):
     """A promise that does not hold."""
 
 
 def check(holds, message):
     if not holds:
-        raise Fault(message)
+        raise Failure(message)
 
 
 def event(identity, log="", **keys):
-    """An event's keys as a start leaves them, with those given in place of the usual values."""
+    """An event's keys as a start leaves them, with some other values."""
     values = dict.fromkeys(EVENT_KEYS, "")
     return values | {"Event_ID": identity, "Copy_Name": "(Unknown)", "Complete_Flag": "FALSE",
                      "Event_Log_File": log} | keys
@@ -39,9 +39,9 @@ def format_history(sections):
 
 
 def parse_history(data, has_complete_events=False):
-    """The sections of a history file as the program writes it, in file order. A Fault: a line that
-    is neither section nor key, a repeated name, a cut last line and, on request, an event without
-    all keys of a start."""
+    """The sections of a history file as the program writes it, in file order. Failures are a line
+    that is neither section nor key, a repeated name, a cut last line and, on request, an event
+    without all keys of a start."""
     check(data.endswith(b"\n"), "the history does not end with a line end")
     sections = {}
     keys = None
@@ -87,7 +87,7 @@ def archive_entries(path, encoding="utf-8"):
             return [(info.filename.encode("cp437").decode(encoding, "surrogateescape"), info,
                      archive.read(info)) for info in archive.infolist()]
     except (zipfile.BadZipFile, OSError, ValueError, EOFError, zlib.error) as error:
-        raise Fault(f"no valid archive: {error}") from error
+        raise Failure(f"no valid archive: {error}") from error
 
 
 def read_archive(path, has_blank_names=False):
@@ -97,5 +97,5 @@ def read_archive(path, has_blank_names=False):
     entries = {name: data for name, _, data in packed}
     check(has_blank_names or len(entries) == len(packed), "an entry twice")
     for name in entries:
-        check(not any(part.startswith(".") for part in name.split("/")), f"litter: {name}")
+        check(not re.search(r"(^|/)\.", name), f"temporary file packed: {name}")
     return entries

@@ -12,7 +12,7 @@ import traceback
 from pathlib import Path
 
 import history
-from history import Fault, check
+from history import Failure, check
 
 
 class Skipped(Exception):
@@ -53,14 +53,14 @@ class Machine(contextlib.ExitStack):
         return process
 
     def run(self, *words, timeout=20, **options):
-        """The exit code and the standard output of a run. One that needs longer is a Fault."""
+        """The exit code and the standard output of a run. One that needs longer is a Failure."""
         options = {"stdout": subprocess.PIPE, **options}
         with self.popen(words, start_new_session=True, **options) as process:
             try:
                 output, _ = process.communicate(timeout=timeout)
             except subprocess.TimeoutExpired as error:
                 os.killpg(process.pid, signal.SIGKILL)
-                raise Fault(f"hangs: {shown(words)}") from error
+                raise Failure(f"hangs: {shown(words)}") from error
         return process.returncode, output
 
     def must(self, *words, code=0, **options):
@@ -84,9 +84,9 @@ def contents(folder, pattern="*"):
 
 
 def check_equal(found, expected, message):
-    """Compares texts or dictionaries of texts. The Fault has the lines that differ."""
+    """Compares texts or dictionaries of texts. The Failure has the lines that differ."""
     if found != expected:
-        raise Fault(f"{message}: {difference(found, expected)}")
+        raise Failure(f"{message}: {difference(found, expected)}")
 
 
 def difference(found, expected):
@@ -107,7 +107,7 @@ class Outcome:
     def __init__(self):
         self.attempts = 0
         self.skipped = 0
-        self.faults = 0
+        self.failures = 0
         self.began = time.monotonic()
 
     def attempt(self, name, action):
@@ -118,19 +118,19 @@ class Outcome:
         except Skipped as reason:
             self.skipped += 1
             print(f"skipped {name}: {reason}", flush=True)
-        except Fault as fault:
-            self.note(name, fault)
+        except Failure as failure:
+            self.note(name, failure)
         except Exception as error:  # a case that ends otherwise is no reason to end the others
             last = traceback.extract_tb(error.__traceback__)[-1]
             self.note(name, f"{type(error).__name__}: {error} "
                       f"({Path(last.filename).name}, line {last.lineno})")
         return None
 
-    def note(self, name, fault):
-        self.faults += 1
-        if self.faults <= 50:
-            print(f"FAULT {name}: {str(fault)[:2000]}", flush=True)
+    def note(self, name, failure):
+        self.failures += 1
+        if self.failures <= 50:
+            print(f"FAILED {name}: {str(failure)[:2000]}", flush=True)
 
     def summary(self):
-        return (f"{self.attempts - self.skipped - self.faults} held, {self.skipped} skipped, "
-                f"{self.faults} broken, {time.monotonic() - self.began:.0f} s")
+        return (f"{self.attempts - self.skipped - self.failures} held, {self.skipped} skipped, "
+                f"{self.failures} broken, {time.monotonic() - self.began:.0f} s")

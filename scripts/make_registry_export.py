@@ -48,7 +48,7 @@ def copies(_):
                   *(f'"ORXPARAMETER{parameter}"="value"' for parameter in range(60)))
 
 
-# In the order of the tree: a key with components, its share of the whole in per cent, and the keys
+# In the order of the tree: a key with components, its share of the export in per cent, and the keys
 # after it.
 TREE = (("SOFTWARE\\Classes\\CLSID", 22, None),
         ("SOFTWARE\\Classes\\Interface", 10, None),

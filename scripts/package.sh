@@ -1,6 +1,6 @@
 #!/bin/sh
 # Builds the packages in build/packages and tries them: the one for Debian in a new minimal system,
-# the one for Windows under Wine. In each a whole event is recorded, packed and read.
+# the one for Windows under Wine. In each a complete event is recorded, packed and read.
 set -eu
 cd "$(dirname "$0")/.."
 packages=$PWD/build/packages

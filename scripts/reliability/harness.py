@@ -94,8 +94,8 @@ class Target(Machine):
     def report(self, **options):
         return self.must("-report", str(self.archive), **options)
 
-    def run_any(self, words, has_own_marker=False, **options):
-        """A run of any kind, and what must hold whatever it meets."""
+    def run_checked(self, words, has_own_marker=False, **options):
+        """A run of any kind, and what must hold in every state of the history."""
         if words == ("-report",):
             words = ("-report", str(self.archive))
         elif words[0] == "-start":
@@ -129,7 +129,7 @@ class Target(Machine):
 
     # What is outside.
 
-    def beside(self):
+    def outside_state(self):
         mine = (self.history, self.archives)
         return {str(path): digest(path) for top in (self.root, self.outside, self.source)
                 for path in [top, *sorted(top.rglob("*"))]
@@ -137,10 +137,10 @@ class Target(Machine):
 
     def watch(self):
         """From now on, what is outside the history must stay as it is."""
-        self.before = self.beside()
+        self.before = self.outside_state()
 
     def check_outside(self):
-        after = self.beside()
+        after = self.outside_state()
         changed = [name for name in {*self.before, *after}
                    if self.before.get(name) != after.get(name)]
         check(not changed, f"changed outside: {changed}")

@@ -22,13 +22,14 @@ from history import check
 from machine import check_equal, contents, difference
 
 # By their names on all processors. A call that only reads is of interest where it fails.
-WRITING = {"open", "openat", "creat", "write", "writev", "pwrite64", "pwritev", "rename",
-           "renameat", "renameat2", "mkdir", "mkdirat", "rmdir", "unlink", "unlinkat", "link",
-           "linkat", "symlink", "symlinkat", "fsync", "fdatasync", "fchmod", "chmod", "fchmodat",
-           "fchown", "chown", "fchownat", "truncate", "ftruncate", "fallocate", "sendfile",
-           "copy_file_range", "utimensat", "flock", "exit_group"}
-READING = {"open", "openat", "read", "pread64", "lseek", "stat", "lstat", "fstat", "newfstatat",
-           "statx", "access", "faccessat", "faccessat2", "getdents64"}
+WRITING = {"creat", "write", "writev", "pwrite64", "pwritev", "rename", "renameat", "renameat2",
+           "mkdir", "mkdirat", "rmdir", "unlink", "unlinkat", "link", "linkat", "symlink",
+           "symlinkat", "fsync", "fdatasync", "fchmod", "chmod", "fchmodat", "fchown", "chown",
+           "fchownat", "truncate", "ftruncate", "fallocate", "sendfile", "copy_file_range",
+           "utimensat", "flock", "exit_group"}
+OPENING = {"open", "openat"}
+READING = {"read", "pread64", "lseek", "stat", "lstat", "fstat", "newfstatat", "statx", "access",
+           "faccessat", "faccessat2", "getdents64"}
 
 OLDER_ARCHIVE = b"an older archive"
 
@@ -75,7 +76,7 @@ class Scenario(typing.NamedTuple):
                 for chosen in itertools.combinations(pairs, count)]
 
 
-class Bench(Target):
+class ScenarioMachine(Target):
     """A machine with the histories that the runs start from."""
 
     def __init__(self, program):
@@ -90,7 +91,7 @@ class Bench(Target):
         for run, scenario in self.scenarios.items():
             self.begin(scenario)
             self.must(*scenario.words)
-            self.undisturbed[run] = self.picture()
+            self.undisturbed[run] = self.snapshot()
 
     def make_histories(self):
         self.history.rmdir()
@@ -164,14 +165,13 @@ class Bench(Target):
 
     def points(self, run):
         for call, number, text in self.trace_calls(run):
-            creates = "O_CREAT" in text or "O_TRUNC" in text
-            writes = call in WRITING and (creates or call not in READING)
-            is_ours = str(self.scratch) in text and call != "exit_group"
             if call == "lseek" and "/archives/" in text:
                 continue  # minizip does not check it, as it cannot fail on a regular file
-            faults = [*(["kill"] if writes else []),
-                      *(["EIO", "EINTR"] if is_ours and (writes or call in READING) else []),
-                      *(["ENOSPC"] if is_ours and writes else [])]
+            writes = call in WRITING or call in OPENING and ("O_CREAT" in text or "O_TRUNC" in text)
+            faults = ["kill"] if writes else []
+            if str(self.scratch) in text and call != "exit_group":
+                faults += ["EIO", "EINTR"] if writes or call in OPENING | READING else []
+                faults += ["ENOSPC"] if writes else []
             for fault in faults:
                 yield Point(run, call, number, fault, text)
         file = self.scratch / self.scenarios[run].base / history.HISTORY / "History.ini"
@@ -205,7 +205,7 @@ class Bench(Target):
         if not self.is_older_archive():
             self.packed()
         if point.fault == "EINTR" and point.is_repeated():
-            check_equal(self.picture(), self.undisturbed[point.run], "lost")
+            check_equal(self.snapshot(), self.undisturbed[point.run], "lost")
         self.check_next_runs(point.run, scenario, new)
 
     def check_code(self, point, code, output):
@@ -215,7 +215,7 @@ class Bench(Target):
             check(code in (0, 3), f"exit code {code}")
             check(code == 3 or b"is created successfully" in output, f"printed {output}")
             check((code == 3) == self.is_older_archive(), f"exit code {code}, other archive")
-            check(os.listdir(self.archives) == [self.archive.name], "litter")
+            check(os.listdir(self.archives) == [self.archive.name], "leftover files")
         else:
             is_set_up = b"Initialiation Failed:" not in output
             check(code == (0 if is_set_up else 1), f"exit code {code}, printed {output}")
@@ -244,18 +244,18 @@ class Bench(Target):
             log = self.history / scenario.event / history.LOG
             check(log.read_bytes().endswith(b" Starts  \n" + 94 * b"*" + b"\n"), "next log broken")
         check(not (self.history / ".History.tmp").exists() or run in ("logmessage", "report"),
-              "litter")
+              "leftover files")
         self.check_report()
 
-    def picture(self):
+    def snapshot(self):
         """The history and the archive, without what differs from run to run."""
         files = contents(self.history)
         if not self.is_older_archive():
             files |= {f"archive: {name}": data for name, data in self.packed().items()}
-        return {name: settled(data) for name, data in files.items()}
+        return {name: comparable(data) for name, data in files.items()}
 
 
-def settled(data):
+def comparable(data):
     """The text without time stamps and without users and processes: these come from libraries and
     from the entire machine."""
     text = history.TIME.sub("TIME", data.decode(errors="surrogateescape"))
@@ -271,11 +271,12 @@ def in_order(points):
 
 def attack_calls(program, outcome, seconds, only):
     with contextlib.ExitStack() as machines:
-        benches = [machines.enter_context(Bench(program)) for _ in range(os.cpu_count() or 1)]
-        points = [point for run in benches[0].scenarios for point in benches[0].points(run)
+        workers = [machines.enter_context(ScenarioMachine(program))
+                   for _ in range(os.cpu_count() or 1)]
+        points = [point for run in workers[0].scenarios for point in workers[0].points(run)
                   if only in point.name()]
-        done = sample(outcome, [(point.name(), lambda bench, p=point: bench.check_point(p))
-                                for point in in_order(points)], seconds, benches)
+        done = sample(outcome, [(point.name(), lambda worker, p=point: worker.check_point(p))
+                                for point in in_order(points)], seconds, workers)
     faults = collections.Counter(name.rpartition(", ")[2] for name in done)
     print(f"kill: {len(done)} of {len(points)} faults",
           *(f"{fault} {count}" for fault, count in faults.items()), sep=", ")

@@ -16,8 +16,8 @@ SHARED = [f"shared{number}" for number in range(4)]
 COPIES = 5
 
 
-class Crowd:
-    """The workers of one round and what they know to be finished. Lists and sets are only added to,
+class Round:
+    """The runs of one round, and what is known to be finished. Lists and sets are only added to,
     one element at a time, which needs no lock."""
 
     has_complete_events = True
@@ -31,7 +31,7 @@ class Crowd:
         self.begun, self.started, self.ending = set(SHARED), set(SHARED), set()
         self.copies = {}  # event: copy, of the finished ends
         self.messages = {}  # event: messages of the finished runs
-        self.cut = set()  # messages of the killed ones
+        self.killed_messages = set()
 
     def before(self):
         """The words before a run: none, or a command that kills it."""
@@ -51,9 +51,9 @@ class Crowd:
         if self.run("-logmessage", event, "-message", f"^{text}$"):
             self.messages.setdefault(event, []).append(text)
         else:
-            self.cut.add(text)
+            self.killed_messages.add(text)
 
-    def live(self):
+    def record_event(self):
         """One event from its start to its end."""
         event = f"event{next(self.numbers)}"
         self.begun.add(event)
@@ -99,16 +99,16 @@ class Crowd:
         while time.monotonic() < self.until:
             outcome.attempt(f"overlap, {name}", action)
 
-    def go(self, outcome):
+    def run_all(self, outcome):
         for event in SHARED:
             self.machine.must("-start", event, "-Product", f"P{event}")
         for _ in range(10):
             outcome.attempt("overlap, early message", self.message_during_start)
-        in_threads([(self.repeat, outcome, "worker", self.live)] * WORKERS
+        in_threads([(self.repeat, outcome, "worker", self.record_event)] * WORKERS
                    + [(self.repeat, outcome, "reader", self.read)])
-        self.judge(outcome)
+        self.check_results(outcome)
 
-    def judge(self, outcome):
+    def check_results(self, outcome):
         sections = outcome.attempt("overlap, history", self.machine.sections) or {}
         outcome.attempt("overlap, count", lambda: self.check_count(sections))
         for event in self.started:
@@ -122,7 +122,7 @@ class Crowd:
         count = int(sections["History"]["Count"])
         check(len(self.started) <= count <= len(self.begun),
               f"count {count}, finished {len(self.started)}, begun {len(self.begun)}")
-        check(self.killed_share or not list(self.machine.history.rglob(".*")), "litter")
+        check(self.killed_share or not list(self.machine.history.rglob(".*")), "leftover files")
 
     def check_event(self, keys, event):
         check(keys, "lost section")
@@ -138,7 +138,7 @@ class Crowd:
             check("( End )" in lines[-1], "log does not end")
         found = [message for line in lines for message in self.messages_of(line)]
         check(len(found) == len(set(found)), "a message twice")
-        finished = [message for message in found if message not in self.cut]
+        finished = [message for message in found if message not in self.killed_messages]
         sent = self.messages.get(event, [])
         check(sorted(finished) == sorted(sent), "messages lost or torn")
         check(event in SHARED or finished == sent, "order")
@@ -150,16 +150,17 @@ class Crowd:
         check(not before or not parts, "text before a message")
         messages = [parts.pop()[:-1]] if parts and line.endswith("$") else []
         for part in parts:
-            check(any(f"{message}$".startswith(part) for message in self.cut), "torn message")
+            check(any(f"{message}$".startswith(part) for message in self.killed_messages),
+                  "torn message")
         return messages
 
     def check_last_report(self):
         self.machine.check_report(timeout=120)
         self.machine.must("-start", "after")
-        check(not list(self.machine.history.rglob(".*")), "litter")
+        check(not list(self.machine.history.rglob(".*")), "leftover files")
 
 
-class UnlockedCrowd(Crowd):
+class UnlockedRound(Round):
     """Runs may undo each other's changes here: only what each leaves must be complete."""
 
     has_complete_events = False
@@ -169,7 +170,7 @@ class UnlockedCrowd(Crowd):
         return injecting("flock", "error=ENOLCK", "-e", "trace=flock,fchmod",
                          "-e", "inject=fchmod:delay_enter=3000")
 
-    def live(self):
+    def record_event(self):
         event = f"event{next(self.numbers)}"
         self.run("-start", event)
         self.run("-end", event, "-CopyName", "C")
@@ -177,18 +178,18 @@ class UnlockedCrowd(Crowd):
     def message_during_start(self):
         pass
 
-    def judge(self, outcome):
+    def check_results(self, outcome):
         outcome.attempt("overlap, history", self.machine.sections)
 
 
 def attack_together(program, outcome, seconds, _):
     for name, share, kind, options in (
-            ("undisturbed", 0.5, Crowd, {}), ("killed", 0.35, Crowd, {"killed_share": 1 / 3}),
-            ("without locks", 0.15, UnlockedCrowd, {})):
+            ("undisturbed", 0.5, Round, {}), ("killed", 0.35, Round, {"killed_share": 1 / 3}),
+            ("without locks", 0.15, UnlockedRound, {})):
         with Target(program) as machine:
-            crowd = kind(machine, seconds * share, **options)
-            crowd.go(outcome)
-        killed = len(crowd.codes) - crowd.codes.count(0)
-        print(f"overlap, {name}: {len(crowd.codes)} runs, {killed} of them killed, "
-              f"{len(crowd.reports)} archives and {len(crowd.parsed)} histories read meanwhile",
+            runs = kind(machine, seconds * share, **options)
+            runs.run_all(outcome)
+        killed = len(runs.codes) - runs.codes.count(0)
+        print(f"overlap, {name}: {len(runs.codes)} runs, {killed} of them killed, "
+              f"{len(runs.reports)} archives and {len(runs.parsed)} histories read meanwhile",
               flush=True)

@@ -45,7 +45,7 @@ def check_planted(program, path, kind, stage):
             if number == stage:
                 plant(machine, machine.history / path, kind)
             # Until it is replaced, a hard link's text, the marker, is the history's own.
-            machine.run_any(words, has_own_marker=kind == "hard link")
+            machine.run_checked(words, has_own_marker=kind == "hard link")
 
 
 def plant(machine, path, kind):

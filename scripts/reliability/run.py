@@ -70,7 +70,7 @@ def main():
         only = options.only if ":" in options.only else ""
         outcome.attempt(name, lambda: attack_family(options.program, outcome, seconds, only))
     print(outcome.summary())
-    sys.exit(1 if outcome.faults else 0)
+    sys.exit(1 if outcome.failures else 0)
 
 
 if __name__ == "__main__":

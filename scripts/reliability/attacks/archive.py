@@ -18,15 +18,15 @@ def failure_line(path):
     return f" Failed to create file '{path}'\n".encode()
 
 
-def check_no_litter(machine):
-    check(os.listdir(machine.archives) == [machine.archive.name], "litter")
+def check_no_leftovers(machine):
+    check(os.listdir(machine.archives) == [machine.archive.name], "leftover files")
 
 
 @attack()
 def archive_in_the_history(machine):
     """It contains neither itself nor the older one, under any name."""
     for words in RUNS:
-        machine.run_any(words)
+        machine.run_checked(words)
     inside = machine.history / "C1" / "history.zip"
     for name in ("C1/history.zip", "C1/history.zip", "C1/../C1/history.zip"):
         machine.must("-report", str(machine.history / name))
@@ -49,7 +49,7 @@ def archive_name_taken_by(machine, kind):
     check(output == failure_line(machine.archive), f"prints {output}")
     after = machine.archive.lstat()
     check((after.st_ino, after.st_mode) == (before.st_ino, before.st_mode), "replaced")
-    check_no_litter(machine)
+    check_no_leftovers(machine)
 
 
 @attack("History.ini", "C1/../History.ini", "C1/7/ORXInstallEvent.Log", "open/ORXInstallEvent.Log",
@@ -115,7 +115,7 @@ def reports_to_one_name(machine):
     for process in processes:
         check(process.wait(20) == 0, "exit code of a report")
         check("big" in machine.packed(), "incomplete")
-    check_no_litter(machine)
+    check_no_leftovers(machine)
 
 
 @attack(("at once", 64 << 10), ("near the end", 4 << 20))
@@ -126,7 +126,7 @@ def archive_over_the_file_size_limit(machine, limit):
     check(output == f"The file '{machine.archive}' is created successfully\n".encode(),
           f"prints {output}")
     check(machine.archive.read_bytes() == OLDER, "older archive lost")
-    check_no_litter(machine)
+    check_no_leftovers(machine)
 
 
 @attack(*((f"{left} bytes", left) for left in (0, 4 << 10, 64 << 10, 1 << 20)))
@@ -140,7 +140,7 @@ def archive_on_a_full_disk(machine, left):
     machine.report(code=3)
     check(machine.archive.read_bytes() == OLDER, "older archive lost")
     filler.unlink()
-    check_no_litter(machine)
+    check_no_leftovers(machine)
 
 
 # Before a temporary file is opened again to write to it or to flush it, somebody replaces it by a

@@ -26,8 +26,8 @@ def hostile_names(machine):
                       ("-end", name, "-CopyName", f"copy{number}", "-Result", LONG),
                       ("-start", f"event{number}"),
                       ("-end", f"event{number}", "-CopyName", name)):
-            machine.run_any(words)
-    machine.run_any(("-report",))
+            machine.run_checked(words)
+    machine.run_checked(("-report",))
     machine.must("-start", "last")
     check(machine.count() == 2 * len(names) + 1, "count")
     sections = machine.sections()
@@ -50,5 +50,5 @@ def hostile_history(machine):
                  f"[in {name}]\nCopy_Name={name}\nLog_File_Name={machine.source}\n"
                  f"[folder {name}]\nCopy_Name={name}/folder\nTrace_File={machine.source}\n")
     machine.ini.write_text(text)
-    machine.run_any(("-report",))
+    machine.run_checked(("-report",))
     check(machine.archive.exists(), "no archive")

@@ -54,7 +54,7 @@ def foreign_history(machine):
     machine.must("-start", "first", **AS_NOBODY)
     os.chmod(machine.ini, 0o640)
     for words in RUNS:
-        machine.run_any(words)
+        machine.run_checked(words)
     status = machine.ini.stat()
     check((status.st_uid, stat.S_IMODE(status.st_mode)) == (NOBODY, 0o640), "owner or mode")
     machine.must("-end", "first", **AS_NOBODY)
@@ -67,18 +67,18 @@ def read_only_history(machine):
     """A user who may only read: nothing changes, and no installer is stopped."""
     require_root()
     for words in RUNS:
-        machine.run_any(words)
+        machine.run_checked(words)
     machine.must("-start", "open")
     os.chmod(machine.archives, 0o777)
     machine.archive.unlink()
     inside = {path: digest(path) for path in machine.history.rglob("*")}
     for words in (*RUNS, ("-start", "new"), ("-end", "open", "-CopyName", "C9")):
-        machine.run_any(words, **AS_NOBODY)
+        machine.run_checked(words, **AS_NOBODY)
     check(machine.archive.exists(), "no archive")
     check(inside == {path: digest(path) for path in machine.history.rglob("*")}, "changed")
     os.chmod(machine.history, 0o700)
     for words in RUNS:
-        machine.run_any(words, **AS_NOBODY)
+        machine.run_checked(words, **AS_NOBODY)
     shutil.rmtree(machine.root / "ZEK")
     machine.watch()
     machine.must("-start", "new", code=1, **AS_NOBODY)
