@@ -1,7 +1,6 @@
 // The program as an installer runs it, and files that other programs, such as a scanner, keep open.
 
 #include <chrono>
-#include <cstdlib>
 #include <functional>
 #include <future>
 #include <thread>
@@ -124,12 +123,29 @@ class Run : public Platform {
     fs::remove_all(GetHistoryDir());
   }
 
-  // The program's result; its output goes to the file "output". The command interpreter removes the
-  // outer quotation marks.
+  // The program's exit code, -1 if it does not start; its output goes to the file "output". Started
+  // without a command interpreter, which fails now and then on a busy machine.
   int Call(const std::string& arguments, const std::string& program = ORX_PROGRAM) const {
-    const std::string native = fs::path(program).make_preferred().string();
-    return std::system(
-        ("\"\"" + native + "\" " + arguments + " >\"" + In("output") + "\"\"").c_str());
+    SECURITY_ATTRIBUTES inherited = {sizeof inherited, nullptr, TRUE};
+    const UniqueHandle output =
+        OwnIfValid(::CreateFileA(In("output").c_str(), GENERIC_WRITE, kShareAll, &inherited,
+                                 CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
+    STARTUPINFOA startup = {};
+    startup.cb = sizeof startup;
+    startup.dwFlags = STARTF_USESTDHANDLES;
+    startup.hStdOutput = output.get();
+    PROCESS_INFORMATION process = {};
+    std::string line = '"' + fs::path(program).make_preferred().string() + "\" " + arguments;
+    if (::CreateProcessA(nullptr, line.data(), nullptr, nullptr, TRUE, 0, nullptr, nullptr,
+                         &startup, &process) == FALSE) {
+      return -1;
+    }
+    const UniqueHandle thread(process.hThread);
+    const UniqueHandle owner(process.hProcess);
+    DWORD exitCode = 0;
+    ::WaitForSingleObject(process.hProcess, INFINITE);
+    ::GetExitCodeProcess(process.hProcess, &exitCode);
+    return static_cast<int>(exitCode);
   }
 
   static std::string InHistory(const std::string& name) { return JoinPath(GetHistoryDir(), name); }
