@@ -25,7 +25,7 @@ std::string_view WithoutQuotes(std::string_view value) {
 
 std::string_view CleanValue(std::string_view raw) { return WithoutQuotes(TrimBlanks(raw)); }
 
-// The offset after the end of the line that contains the given offset.
+// The offset after the end of the line that contains this offset.
 size_t NextLine(std::string_view text, size_t offset) {
   return std::min(text.find('\n', offset), text.size() - 1) + 1;
 }

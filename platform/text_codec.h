@@ -24,6 +24,6 @@ class TextCodec {
   std::shared_ptr<State> Shared;
 };
 
-// Text from the system itself (an argument, a file name given by the user) as UTF-8.
+// Text from the system itself (an argument, the name of a file) as UTF-8.
 // Windows: from the code page of the process. POSIX: the text as it is.
 std::string SystemTextToUtf8(std::string_view text);
