@@ -51,14 +51,14 @@ class Side(Machine):
         self.history.parent.mkdir(parents=True, exist_ok=True)
         self.files.mkdir(parents=True)
 
-    def popen(self, words, **options):
+    def popen(self, arguments, **options):
         beginning = self.files_name + self.separator
-        return super().popen([word.replace("{files}/", beginning) for word in words], **options)
+        return super().popen([word.replace("{files}/", beginning) for word in arguments], **options)
 
-    def output_of(self, words):
+    def output_of(self, arguments):
         """A run's exit code and output in a text."""
-        code, output = self.run(*words, timeout=120)
-        return f"{words}\nexit code {code}: {self.comparable(output)}"
+        code, output = self.run(*arguments, timeout=120)
+        return f"{arguments}\nexit code {code}: {self.comparable(output)}"
 
     def comparable(self, data):
         """Text without what differs: the code page, the two folders, line ends, and times."""
@@ -119,37 +119,33 @@ def regedit(side, option, name, *arguments):
     subprocess.run([WINE, "regedit", option, path, *arguments], check=True)
 
 
-def load_registry(side, export):
-    """Replaces the tool's keys by those of the export."""
-    (side.files / "remove.reg").write_text(
-        "REGEDIT4\n" + "".join(f"\n[-{key}]\n" for key in TOOL_KEYS), encoding="ascii")
-    shutil.copy(export, side.files / "add.reg")
-    for name in ("remove.reg", "add.reg"):
-        regedit(side, "/S", name)
+def write_export(path, text):
+    """In the encoding that Windows knows."""
+    path.write_text(text, "utf-16", newline="\r\n")
 
 
-def export_registry(side, path):
-    """Writes the tool's keys as the registry orders them."""
+def export_registry(side):
+    """The tool's keys as the registry orders them."""
     text = ""
     for key in TOOL_KEYS:
         regedit(side, "/E", "part.reg", key)
-        header, keys = (side.files / "part.reg").read_bytes().decode("utf-16").split("\r\n", 1)
-        text = (text or header + "\r\n") + keys + "\r\n"
-    path.write_bytes(text.encode("utf-16"))
+        header, keys = (side.files / "part.reg").read_text("utf-16").split("\n", 1)
+        text = (text or f"{header}\n") + f"{keys}\n"
+    return text
 
 
 # --- The histories ---
 
 
 def read_histories():
-    """The runs of each history by its name; a run is a list of words."""
+    """The runs of each history by its name; a run is a list of arguments."""
     histories = {}
     for line in HISTORIES.read_text("utf-8").replace("\\\n", "").splitlines():
         if line.startswith("## "):
             histories[line[3:]] = []
         elif line.startswith("$"):
-            words = shlex.split(line[1:])
-            histories[list(histories)[-1]].append([filled(word) for word in words])
+            arguments = shlex.split(line[1:])
+            histories[list(histories)[-1]].append([filled(word) for word in arguments])
     return histories
 
 
@@ -167,7 +163,7 @@ def run_history(side, runs):
     for name in INSTALLER_FILES:
         (side.files / name).parent.mkdir(exist_ok=True)
         (side.files / name).write_text(f"the installer's file of {len(name)} letters")
-    return outcome_of(side, [side.output_of(words) for words in runs])
+    return outcome_of(side, [side.output_of(arguments) for arguments in runs])
 
 
 def run_section_names(side):
@@ -209,7 +205,7 @@ def run_links(side):
             linked.rename(kept)
         linked.symlink_to(target)
         try:
-            texts += [side.output_of(words) for words in (["-start", "42"], REPORT)]
+            texts += [side.output_of(arguments) for arguments in (["-start", "42"], REPORT)]
         finally:
             linked.unlink()
             if kept.exists():
@@ -249,6 +245,7 @@ class Comparison:
         self.linux = Side([linux_program], scratch, f"{scratch}/", "utf-8")
         self.readers = [Machine(WINE, windows_program.with_name("orxhistory.exe"), root=scratch),
                         Machine(linux_program.with_name("orxhistory"), root=scratch)]
+        self.export = self.linux.history.parent / "Registry.reg"
         self.outcome = Outcome()
         for side in (self.windows, self.linux):
             side.reset()
@@ -271,19 +268,19 @@ class Comparison:
         self.outcome.attempt(name, check_same)
 
     def load(self, name):
-        """Loads an export of UTF-8, which Windows does not know; returns the loaded file."""
-        export = self.linux.history.parent / "Registry.reg"
-        text = (REPOSITORY / "scripts" / name).read_text("utf-8")
-        export.write_text(text, "utf-16", newline="\r\n")
-        load_registry(self.windows, export)
-        return export
+        """Replaces the tool's keys on both systems by those of an export."""
+        header, keys = (REPOSITORY / "scripts" / name).read_text("utf-8").split("\n", 1)
+        write_export(self.export, f"{header}\n{keys}")
+        removed = "".join(f"\n[-{key}]\n" for key in TOOL_KEYS)
+        write_export(self.windows.files / "load.reg", f"{header}\n{removed}{keys}")
+        regedit(self.windows, "/S", "load.reg")
 
 
 def read_archive(reader, folder):
     """What a reader prints for the archive in the folder."""
-    def read(*words):
-        code, output = reader.run("--from", "out.zip", *words, cwd=folder, timeout=120)
-        return f"{words}\n" + output.decode().replace("\r\n", "\n") + f"exit code {code}"
+    def read(*arguments):
+        code, output = reader.run("--from", "out.zip", *arguments, cwd=folder, timeout=120)
+        return f"{arguments}\n" + output.decode().replace("\r\n", "\n") + f"exit code {code}"
     listed = read("list", "--json")
     events = dict.fromkeys(json.loads(line)["event"] for line in listed.split("\n")
                            if line.startswith("{"))
@@ -295,7 +292,8 @@ def main():
     comparison = Comparison(*(Path(word).absolute() for word in sys.argv[1:]))
     histories = read_histories()
     japanese = histories.pop("second bytes like separators")
-    export_registry(comparison.windows, comparison.load("sample-machine/Registry.reg"))
+    comparison.load("sample-machine/Registry.reg")
+    write_export(comparison.export, export_registry(comparison.windows))
     comparison.compare("the sample machine", run_history, histories["a complete event"])
     comparison.compare_readers()
     # All kinds of values, and texts and names at the limits. In the order of the names, as the

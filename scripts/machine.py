@@ -39,42 +39,42 @@ class Machine(contextlib.ExitStack):
         self.options = {"stdin": subprocess.DEVNULL, "stdout": subprocess.DEVNULL,
                         "stderr": subprocess.DEVNULL, "cwd": "/"}
 
-    def popen(self, words, before=(), variables=None, **options):
-        """A process of the program, after the words in `before`."""
+    def popen(self, arguments, before=(), variables=None, **options):
+        """A process of the program, after the command in `before`."""
         return subprocess.Popen(
-            [os.fsencode(word) for word in (*before, *self.program, *words)],
+            [os.fsencode(word) for word in (*before, *self.program, *arguments)],
             env={**os.environ, **self.variables, **(variables or {})}, **self.options | options)
 
-    def start(self, *words, **options):
+    def start(self, *arguments, **options):
         """A run in the background, killed at the machine's end."""
-        process = self.popen(words, **options)
+        process = self.popen(arguments, **options)
         self.callback(process.wait)
         self.callback(process.kill)
         return process
 
-    def run(self, *words, timeout=20, **options):
+    def run(self, *arguments, timeout=20, **options):
         """The exit code and the standard output of a run. One that needs longer is a Failure."""
         options = {"stdout": subprocess.PIPE, **options}
-        with self.popen(words, start_new_session=True, **options) as process:
+        with self.popen(arguments, start_new_session=True, **options) as process:
             try:
                 output, _ = process.communicate(timeout=timeout)
             except subprocess.TimeoutExpired as error:
                 os.killpg(process.pid, signal.SIGKILL)
-                raise Failure(f"hangs: {shown(words)}") from error
+                raise Failure(f"hangs: {shown(arguments)}") from error
         return process.returncode, output
 
-    def must(self, *words, code=0, **options):
+    def must(self, *arguments, code=0, **options):
         """The standard output of a run that must have that exit code."""
-        found, output = self.run(*words, **options)
-        check(found == code, f"exit code {found} instead of {code}: {shown(words)}")
+        found, output = self.run(*arguments, **options)
+        check(found == code, f"exit code {found} instead of {code}: {shown(arguments)}")
         return output
 
     def sections(self):
         return history.parse_history(self.ini.read_bytes())
 
 
-def shown(words):
-    return " ".join(repr(word) if len(word) < 80 else repr(word[:77]) + "..." for word in words)
+def shown(arguments):
+    return " ".join(repr(word) if len(word) < 80 else repr(word[:77]) + "..." for word in arguments)
 
 
 def contents(folder, pattern="*"):

@@ -10,7 +10,7 @@ import time
 
 import history
 from history import check
-from machine import Machine, Skipped, check_equal, contents
+from machine import Machine, Skipped, check_equal, contents, shown
 
 MARKER = b"what is outside stays outside"
 NOBODY = 65534
@@ -35,7 +35,7 @@ def digest(path):
 
 
 def injecting(call, fault, *options):
-    """Words before a run in which that system call has the fault, as strace spells it. Without
+    """The command before a run in which that system call fails so, as strace spells it. Without
     --seccomp-bpf, with which strace injects no signal."""
     return ("strace", "-f", "-qq", "-o", "/dev/null", "-e", f"trace={call}", "-e",
             f"inject={call}:{fault}", *options)
@@ -94,14 +94,12 @@ class Target(Machine):
     def report(self, **options):
         return self.must("-report", str(self.archive), **options)
 
-    def run_checked(self, words, has_own_marker=False, **options):
+    def run_checked(self, *arguments, has_own_marker=False, **options):
         """A run of any kind, and what must hold in every state of the history."""
-        if words == ("-report",):
-            words = ("-report", str(self.archive))
-        elif words[0] == "-start":
-            words = (*words, "-l", str(self.source))
-        code, _ = self.run(*words, **options)
-        check(code in ((0, 3) if words[0] == "-report" else (0,)), f"exit code {code}: {words}")
+        more = {"-report": (str(self.archive),), "-start": ("-l", str(self.source))}
+        code, _ = self.run(*arguments, *more.get(arguments[0], ()), **options)
+        check(code == 0 or code == 3 and arguments == ("-report",),
+              f"exit code {code}: {shown(arguments)}")
         self.check_outside()
         if self.archive.exists() and not has_own_marker:
             for name, data in history.read_archive(self.archive, has_blank_names=True).items():

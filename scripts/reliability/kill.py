@@ -56,11 +56,11 @@ class Point(typing.NamedTuple):
 
 
 class Scenario(typing.NamedTuple):
-    """One kind of run: the history that it starts from, its words, the event that is its own, and
-    its replacements of the history file in their order. A replacement is a list of pairs: a section
-    and the keys that are set in it, all or none."""
+    """One kind of run: the history that it starts from, its arguments, the event that is its own,
+    and its replacements of the history file in their order. A replacement is a list of pairs: a
+    section and the keys that are set in it, all or none."""
     base: str
-    words: tuple
+    arguments: tuple
     event: str | None
     replacements: list
 
@@ -90,7 +90,7 @@ class ScenarioMachine(Target):
         self.undisturbed = {}
         for run, scenario in self.scenarios.items():
             self.begin(scenario)
-            self.must(*scenario.words)
+            self.must(*scenario.arguments)
             self.undisturbed[run] = self.snapshot()
 
     def make_histories(self):
@@ -151,7 +151,7 @@ class ScenarioMachine(Target):
         on. strace counts the calls of each process on their own."""
         trace = self.scratch / "trace"
         self.begin(self.scenarios[run])
-        self.must(*self.scenarios[run].words,
+        self.must(*self.scenarios[run].arguments,
                   before=("strace", "-f", "-y", "-s", "0", "-o", str(trace)))
         calls = re.findall(r"(?m)^(\d+)\s+((\w+)\(.*)", trace.read_text(errors="replace"))
         numbers = collections.Counter()
@@ -179,7 +179,7 @@ class ScenarioMachine(Target):
         for size in sorted({0, 1, 17, *range(100, length + 1500, 150)}):
             yield Point(run, "size", size, "EFBIG")
 
-    def disturb(self, point, words):
+    def disturb(self, point, arguments):
         """Makes the run with the point's fault; returns its exit code and output."""
         fault = "signal=SIGKILL" if point.fault == "kill" else f"error={point.fault}"
         before = injecting(point.call, f"{fault}:when={point.number}")
@@ -187,13 +187,13 @@ class ScenarioMachine(Target):
             # The write up to the size is done, and the next one fails. The signal that the system
             # sends then ends every program that does not expect it.
             before = ("prlimit", "--core=0", f"--fsize={point.number}")
-        return self.run(*words, before=before)
+        return self.run(*arguments, before=before)
 
     def check_point(self, point):
         scenario = self.scenarios[point.run]
         self.begin(scenario)
         old = self.state()
-        self.check_code(point, *self.disturb(point, scenario.words))
+        self.check_code(point, *self.disturb(point, scenario.arguments))
         new = self.state()
         allowed = scenario.killed_states if point.fault == "kill" else scenario.failed_states
         check(new in allowed(old), f"history {difference(new, old)}")
@@ -232,7 +232,7 @@ class ScenarioMachine(Target):
             check(file.read_bytes() == (self.files / file.name).read_bytes(), f"part of {file}")
 
     def check_next_runs(self, run, scenario, old):
-        self.must(*scenario.words)
+        self.must(*scenario.arguments)
         new = self.state()
         allowed = scenario.killed_states(old)[-1:]
         if run == "end":  # a folder that was moved before the key was set is not moved again

@@ -34,17 +34,17 @@ class Round:
         self.killed_messages = set()
 
     def before(self):
-        """The words before a run: none, or a command that kills it."""
+        """The command before a run: none, or one that kills it."""
         if random.random() >= self.killed_share:
             return ()
         return ("timeout", "--signal=KILL", f"{random.uniform(0.001, 0.08):.4f}")
 
-    def run(self, *words):
+    def run(self, *arguments):
         """True for a run that finished."""
         before = self.before()
-        code, output = self.machine.run(*words, before=before, timeout=60)
+        code, output = self.machine.run(*arguments, before=before, timeout=60)
         self.codes.append(code)
-        check(code == 0 or before, f"exit code {code}: {words} {output}")
+        check(code == 0 or before, f"exit code {code}: {arguments} {output}")
         return code == 0
 
     def send(self, event, text):

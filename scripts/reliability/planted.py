@@ -41,11 +41,11 @@ REPLACED = ("History.ini", ".History.tmp")
 
 def check_planted(program, path, kind, stage):
     with Target(program) as machine:
-        for number, words in enumerate(RUNS):
+        for number, arguments in enumerate(RUNS):
             if number == stage:
                 plant(machine, machine.history / path, kind)
             # Until it is replaced, a hard link's text, the marker, is the history's own.
-            machine.run_checked(words, has_own_marker=kind == "hard link")
+            machine.run_checked(*arguments, has_own_marker=kind == "hard link")
 
 
 def plant(machine, path, kind):

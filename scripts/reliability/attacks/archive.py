@@ -25,8 +25,8 @@ def check_no_leftovers(machine):
 @attack()
 def archive_in_the_history(machine):
     """It contains neither itself nor the older one, under any name."""
-    for words in RUNS:
-        machine.run_checked(words)
+    for arguments in RUNS:
+        machine.run_checked(*arguments)
     inside = machine.history / "C1" / "history.zip"
     for name in ("C1/history.zip", "C1/history.zip", "C1/../C1/history.zip"):
         machine.must("-report", str(machine.history / name))

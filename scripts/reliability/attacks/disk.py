@@ -19,9 +19,10 @@ def full_disk(machine):
         status = os.statvfs(machine.root)
         filler.write_bytes(bytes(max(status.f_bavail * status.f_bsize - left, 0)))
         old = machine.sections()
-        for words in (("-start", f"new{left}"), ("-logmessage", "7", "-message", "m" * 9000),
-                      ("-report", str(archive)), ("-end", "7"), ("-report", str(machine.archive))):
-            check(machine.run(*words)[0] in (0, 3), f"exit code: {words}")
+        for arguments in (
+                ("-start", f"new{left}"), ("-logmessage", "7", "-message", "m" * 9000),
+                ("-report", str(archive)), ("-end", "7"), ("-report", str(machine.archive))):
+            check(machine.run(*arguments)[0] in (0, 3), f"exit code: {arguments}")
             new = machine.sections()
             check(set(old) <= set(new), "lost a section")
             old = new

@@ -48,7 +48,7 @@ def lock_that_is_never_freed(machine):
     machine.callback(os.close, holder)
     fcntl.flock(holder, fcntl.LOCK_EX)
     began = time.monotonic()
-    runs = [machine.start(*words) for words in (("-start", "8"), ("-unknown",))]
+    runs = [machine.start(*arguments) for arguments in (("-start", "8"), ("-unknown",))]
     codes = [run.wait(timeout=20) for run in runs]
     check(codes == [0, 2], f"exit codes {codes}")
     check(time.monotonic() - began < 15, "waits again")
@@ -57,10 +57,10 @@ def lock_that_is_never_freed(machine):
 
 @attack(("first start", "-start", "7"), ("start", "-start", "8"), ("restart", "-start", "8"),
         ("end", "-end", "8"))
-def one_replacement(machine, *words):
-    if words != ("-start", "7"):
+def one_replacement(machine, *arguments):
+    if arguments != ("-start", "7"):
         machine.record("8")
     trace = machine.scratch / "trace"
-    machine.must(*words, before=("strace", "-f", "-o", trace, "-e", "trace=/^rename"))
+    machine.must(*arguments, before=("strace", "-f", "-o", trace, "-e", "trace=/^rename"))
     count = trace.read_text().count('History.ini"')
     check(count == 1, f"{count} replacements")

@@ -21,13 +21,13 @@ def hostile_names(machine):
     os.symlink(machine.outside / "folder", machine.history / "linked")
     names = (*HOSTILE, "linked", "linked/new", str(machine.outside), str(machine.outside / "new"))
     for number, name in enumerate(names):
-        for words in (("-start", name, "-Path", PATH, "-Command", LONG),
-                      ("-logmessage", name, "-message", LONG),
-                      ("-end", name, "-CopyName", f"copy{number}", "-Result", LONG),
-                      ("-start", f"event{number}"),
-                      ("-end", f"event{number}", "-CopyName", name)):
-            machine.run_checked(words)
-    machine.run_checked(("-report",))
+        event = f"event{number}"
+        machine.run_checked("-start", name, "-Path", PATH, "-Command", LONG)
+        machine.run_checked("-logmessage", name, "-message", LONG)
+        machine.run_checked("-end", name, "-CopyName", f"copy{number}", "-Result", LONG)
+        machine.run_checked("-start", event)
+        machine.run_checked("-end", event, "-CopyName", name)
+    machine.run_checked("-report")
     machine.must("-start", "last")
     check(machine.count() == 2 * len(names) + 1, "count")
     sections = machine.sections()
@@ -50,5 +50,5 @@ def hostile_history(machine):
                  f"[in {name}]\nCopy_Name={name}\nLog_File_Name={machine.source}\n"
                  f"[folder {name}]\nCopy_Name={name}/folder\nTrace_File={machine.source}\n")
     machine.ini.write_text(text)
-    machine.run_checked(("-report",))
+    machine.run_checked("-report")
     check(machine.archive.exists(), "no archive")

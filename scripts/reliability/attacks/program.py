@@ -33,9 +33,9 @@ def closed_descriptors(machine, closing):
     trace = machine.scratch / "trace"
     caller = ("strace", "-f", "-o", trace, "-e", "trace=openat", "sh", "-c",
               f'exec "$@" {closing}', "sh")
-    for words in (("-start", "7", "-l", str(machine.source)), ("-start", "../x"),
-                  ("-report", str(machine.archive))):
-        machine.must(*words, before=caller)
+    for arguments in (("-start", "7", "-l", str(machine.source)), ("-start", "../x"),
+                      ("-report", str(machine.archive))):
+        machine.must(*arguments, before=caller)
         taken = [line for line in trace.read_text().splitlines()
                  if str(machine.root) in line and line.endswith((" = 0", " = 1", " = 2"))]
         check(not taken, f"opened as a standard stream: {taken[:1]}")
@@ -43,10 +43,10 @@ def closed_descriptors(machine, closing):
 
 
 @attack(("start", "-start", "../x"), ("report", "-report", "{archive}"), ("help", "-help"))
-def closed_pipe_on_standard_output(machine, *words):
+def closed_pipe_on_standard_output(machine, *arguments):
     """The work is done, and the exit code says so."""
     reader, writer = os.pipe()
     os.close(reader)
     machine.callback(os.close, writer)
     machine.must("-start", "6")
-    machine.must(*(word.format(archive=machine.archive) for word in words), stdout=writer)
+    machine.must(*(word.format(archive=machine.archive) for word in arguments), stdout=writer)

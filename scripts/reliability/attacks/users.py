@@ -19,8 +19,8 @@ def linked_folder(machine, name):
     shutil.rmtree(link)
     link.symlink_to(elsewhere)
     machine.watch()
-    for words in RUNS[:-1]:
-        machine.must(*words, code=1)
+    for arguments in RUNS[:-1]:
+        machine.must(*arguments, code=1)
     machine.report(code=3)
     found = sorted(path.name for path in elsewhere.rglob("*"))
     check(found == ["ORXHistory", "file"], f"made through the link: {found}")
@@ -53,8 +53,8 @@ def foreign_history(machine):
     machine.watch()
     machine.must("-start", "first", **AS_NOBODY)
     os.chmod(machine.ini, 0o640)
-    for words in RUNS:
-        machine.run_checked(words)
+    for arguments in RUNS:
+        machine.run_checked(*arguments)
     status = machine.ini.stat()
     check((status.st_uid, stat.S_IMODE(status.st_mode)) == (NOBODY, 0o640), "owner or mode")
     machine.must("-end", "first", **AS_NOBODY)
@@ -66,19 +66,19 @@ def foreign_history(machine):
 def read_only_history(machine):
     """A user who may only read: nothing changes, and no installer is stopped."""
     require_root()
-    for words in RUNS:
-        machine.run_checked(words)
+    for arguments in RUNS:
+        machine.run_checked(*arguments)
     machine.must("-start", "open")
     os.chmod(machine.archives, 0o777)
     machine.archive.unlink()
     inside = {path: digest(path) for path in machine.history.rglob("*")}
-    for words in (*RUNS, ("-start", "new"), ("-end", "open", "-CopyName", "C9")):
-        machine.run_checked(words, **AS_NOBODY)
+    for arguments in (*RUNS, ("-start", "new"), ("-end", "open", "-CopyName", "C9")):
+        machine.run_checked(*arguments, **AS_NOBODY)
     check(machine.archive.exists(), "no archive")
     check(inside == {path: digest(path) for path in machine.history.rglob("*")}, "changed")
     os.chmod(machine.history, 0o700)
-    for words in RUNS:
-        machine.run_checked(words, **AS_NOBODY)
+    for arguments in RUNS:
+        machine.run_checked(*arguments, **AS_NOBODY)
     shutil.rmtree(machine.root / "ZEK")
     machine.watch()
     machine.must("-start", "new", code=1, **AS_NOBODY)
