@@ -47,8 +47,8 @@ bool MoveFolder(const std::string& source, const std::string& target);
 // for, up to 0.2 seconds. POSIX: sendfile, fchmod, futimens.
 //
 // The source is opened with the rights of the owner of the file "trusted", where they are less than
-// those of this process: whoever can write a path into the trusted file cannot have a file copied
-// that he may not read. POSIX: setfsuid, setfsgid and setgroups, if the process is root's. Windows:
+// those of this process: a path that is written into the trusted file leads to no file that its
+// owner may not read. POSIX: setfsuid, setfsgid and setgroups, if the process is root's. Windows:
 // not done; there the access list that the trusted file inherits must keep others from writing it.
 bool CopyToNewFile(const std::string& source, const std::string& target,
                    const std::string& trusted);

@@ -30,7 +30,7 @@ static mode_t WithoutGroup(mode_t mode) { return (mode & ~070U) | (mode & 070 & 
 
 void CopyAccess(const Descriptor& source, const struct stat& status, const Descriptor& target) {
   // The owner first, as a change of it can clear bits of the mode. Only root may change the owner,
-  // but an owner may set any group that he is in.
+  // but an owner may set every group that the owner is in.
   constexpr auto sameUser = static_cast<uid_t>(-1);
   const bool keepsGroup =
       SetOwner(target, status.st_uid, status.st_gid) || SetOwner(target, sameUser, status.st_gid);
