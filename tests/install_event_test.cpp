@@ -22,18 +22,9 @@ namespace {
 
 using Words = std::vector<std::string>;
 
-// What a command line, split at its blanks, says: kind, identity, -l, -u, -Type, -message.
-std::string Parsed(const std::string& commandLine) {
-  std::istringstream words(commandLine);
-  ProgramArguments arguments({std::istream_iterator<std::string>(words), {}});
-  const CInstallEvent event(arguments.Count(), arguments.Vector());
-  EXPECT_EQ(event.Valid, !event.Mode.empty()) << commandLine;
-  return event.Mode + ',' + event.EventID + ',' + event.LogFile + ',' + event.ResponseFile + ',' +
-         event.Type + ',' + event.Message;
-}
-
 TEST(InstallEvent, TakesOptionsFromTheCommandLine) {
   const ScratchHistory scratch;
+  // A command line, split at its blanks, and its kind, identity, -l, -u, -Type and -message.
   const std::pair<const char*, const char*> cases[] = {
       {"", ",,,,,"},
       {"-end", ",,,,,"},
@@ -44,7 +35,13 @@ TEST(InstallEvent, TakesOptionsFromTheCommandLine) {
       {"x -end 7 -u one -U two", "-end,7,,two,,"},
   };
   for (const auto& [commandLine, parsed] : cases) {
-    EXPECT_EQ(Parsed(commandLine), parsed);
+    std::istringstream words(commandLine);
+    ProgramArguments arguments({std::istream_iterator<std::string>(words), {}});
+    const CInstallEvent event(arguments.Count(), arguments.Vector());
+    EXPECT_EQ(event.Valid, !event.Mode.empty()) << commandLine;
+    EXPECT_EQ(event.Mode + ',' + event.EventID + ',' + event.LogFile + ',' + event.ResponseFile +
+                  ',' + event.Type + ',' + event.Message,
+              parsed);
   }
   EXPECT_EQ(scratch.Tree(), "");
 }
