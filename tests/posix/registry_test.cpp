@@ -127,6 +127,11 @@ TEST(Registry, IgnoresABackslashAtTheEndOfAPath) {
   }
 }
 
+TEST(Registry, HasNothingBelowAKeyThatIsRemovedLater) {
+  const std::string text = hive + "A\\B\\C]\n\"a\"=\"b\"\n[-HKEY_LOCAL_MACHINE\\A]\n";
+  EXPECT_EQ(Parsed(text).Read("A\\B\\C", "a", 9).Type, 0U);
+}
+
 // With a careless parser each of these takes minutes or overflows the stack.
 TEST(Registry, ReadsHugeLinesInLinearTime) {
   constexpr size_t many = 50000;

@@ -76,8 +76,9 @@ TEST_F(Run, ReturnsExitResults) {
   }
 }
 
-TEST_F(Run, RecordsLocalTimes) {
-  EXPECT_EQ(Shell("export TZ=Far-13; before=$(date '+%Y%m%d %H:%M'); $ORX -start 7;"
+TEST_F(Run, RecordsLocalTimesAndAbsolutePaths) {
+  EXPECT_EQ(Shell("export TZ=Far-13 ORX_COMMON_APPDATA=.; before=$(date '+%Y%m%d %H:%M');"
+                  "$ORX -start 7; grep -q \"Event_Log_File=$PWD/\" ZEK/ORXHistory/History.ini;"
                   "grep -e \"Start_Time=$before\" -e \"Start_Time=$(date '+%Y%m%d %H:%M')\""
                   " ZEK/ORXHistory/History.ini"),
             0);
