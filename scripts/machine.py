@@ -84,7 +84,8 @@ def contents(folder, pattern="*"):
 
 
 def check_equal(found, expected, message):
-    """Compares texts or dictionaries of texts. The Failure has the lines that differ."""
+    """Compares texts or dictionaries of texts. The Failure has the lines that differ: those found
+    with a "-", those expected with a "+"."""
     if found != expected:
         raise Failure(f"{message}: {difference(found, expected)}")
 
@@ -97,8 +98,8 @@ def difference(found, expected):
                          if found.get(name) != expected.get(name))
     lines = [(text.decode(errors="replace") if isinstance(text, bytes) else text or "").split("\n")
              for text in (found, expected)]
-    changed = difflib.unified_diff(*lines, "found", "expected", lineterm="", n=1)
-    return "\n".join(line[:300] for line in itertools.islice(changed, 60))
+    changed = difflib.unified_diff(*lines, lineterm="", n=1)
+    return "\n".join(line[:300] for line in itertools.islice(changed, 2, 60))  # without file names
 
 
 class Outcome:
