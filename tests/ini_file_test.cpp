@@ -35,14 +35,16 @@ TEST(IniFile, ListsSectionsAsFarAsTheyFit) {
   const CIniFile file(scratch.In("a.ini"));
   EXPECT_TRUE(file.GetSectionNames().empty());
   // 10 names of 1000 bytes with their ends, and one that ends at, before or after the limit.
-  for (const size_t last : {227, 228, 229, 900}) {
+  const std::pair<size_t, const char*> cases[] = {
+      {227, "[after]\n"}, {228, "[after]\n"}, {229, "[after]\n"}, {229, ""}, {900, ""}};
+  for (const auto& [last, after] : cases) {
     std::vector<std::string> names;
     std::string text;
     for (char c = 'a'; c <= 'k'; ++c) {
       names.emplace_back(c < 'k' ? 1000 : last, c);
       text += '[' + names.back() + "]\n";
     }
-    scratch.Make("a.ini", text + "[after]\n");
+    scratch.Make("a.ini", text + after);
     names.back().resize(std::min<size_t>(last, 228));
     EXPECT_EQ(file.GetSectionNames(), names);
   }
