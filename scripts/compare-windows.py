@@ -223,10 +223,11 @@ def run_killed(side):
     lasts = time.monotonic() - began
     count = 16
     for i in range(count):
-        process = side.popen(["-start", str(i)])
+        # Without a pipe: a server of Wine that it has started keeps the pipe open.
+        process = side.popen(["-start", str(i)], stdout=subprocess.DEVNULL)
         time.sleep(lasts * i / count)
         process.kill()
-        process.communicate()
+        process.wait()
     side.run("-start", "last", timeout=60)
     text = history_lines(side.comparable(side.ini.read_bytes())) + "\n"
     sections = parse_history(text.encode(), has_complete_events=True)
