@@ -4,17 +4,14 @@
 
 #include <functional>
 
-#include "reader/check.h"
 #include "reader/limits.h"
-#include "tests/reader/history_of.h"
-#include "tests/support/file_text.h"
+#include "tests/reader/history_text.h"
 #include "tests/support/scratch_history.h"
 
 namespace {
 
-const std::string time = "20261114 22:00:03";
-const std::string ini =
-    "[42]\nStart_Time=" + time + "\nEnd_Time=" + time + "\nCopy_Name=C1\nResult=0\n";
+const std::string ini = "[42]\nStart_Time=" + std::string(startTime) + "\nEnd_Time=" + endTime +
+                        "\nCopy_Name=C1\nResult=0\n";
 
 std::string Repeated(size_t count, const std::string& text) {
   std::string all;
@@ -26,8 +23,7 @@ std::string Repeated(size_t count, const std::string& text) {
 
 // The golden report with something inserted before each occurrence of a text.
 std::string ReportWith(const std::string& inserted, const std::string& before) {
-  return Replaced(Replaced(Golden("ORXInstallEvent.Log"), "<time>", time), before,
-                  inserted + before);
+  return Replaced(GoldenReport(), before, inserted + before);
 }
 
 std::string Sections(size_t count) {
@@ -36,6 +32,12 @@ std::string Sections(size_t count) {
     sections += '[' + std::to_string(i) + "]\nResult=0\n";
   }
   return sections;
+}
+
+// The list of section names has the names with their ends, and one more end.
+std::string LongName(size_t bytes) {
+  return "[History]\nCount=0\n[" + std::string(bytes - sizeof "History" - 2, 'n') +
+         "]\nEnd_Time=x\n";
 }
 
 struct LimitCase {
@@ -48,9 +50,11 @@ struct LimitCase {
 };
 
 std::string SameFile(size_t) { return ini; }
-std::string SameReport(size_t) { return ReportWith("", time); }
+std::string SameReport(size_t) { return GoldenReport(); }
 
 const LimitCase limitCases[] = {
+    {"warning names-limit : ", 8192, 1, 2, LongName, SameReport},
+    {"error names-limit : ", 10240, 1, 2, LongName, SameReport},
     {"more than 8 MiB", kMostBytesOfHistoryFile, 1, 1,
      [](size_t size) { return ini + std::string(size - ini.size(), 'x'); }, SameReport},
     {"more than 500,000 lines", kMostLinesOfHistoryFile, 1, 1,
@@ -66,7 +70,7 @@ const LimitCase limitCases[] = {
      [](size_t runs) {
        const std::string whole = SameReport(0);
        const std::string open = whole.substr(0, whole.find("Copying files\n"));
-       return Repeated(runs, Replaced(open, time, "20200101 22:00:03")) + whole;
+       return Repeated(runs, Replaced(open, startTime, "20200101 22:00:03")) + whole;
      }},
     {"cannot be compared", kMostRows - 10, 10, 1, SameFile,
      [](size_t rows) {
@@ -74,29 +78,21 @@ const LimitCase limitCases[] = {
      }},
 };
 
-std::string FindingsOf(const LimitCase& limit, size_t size, size_t& events) {
+HistoryOf HistoryWith(const LimitCase& limit, size_t size) {
   const ScratchHistory scratch;
   scratch.Make("ZEK/ORXHistory/History.ini", limit.HistoryFile(size));
   scratch.Make("ZEK/ORXHistory/C1/42/ORXInstallEvent.Log", limit.Report(size));
-  const HistoryOf history(scratch.In("ZEK/ORXHistory"));
-  events = history.Result.Events.size();
-  std::string texts;
-  for (const FindingList& list : {history.From->Findings, CheckHistory(history.Result)}) {
-    for (const Finding& finding : list) {
-      texts += finding.Code == "damaged" ? finding.Text + '\n' : "";
-    }
-  }
-  return texts;
+  return HistoryOf(scratch.In("ZEK/ORXHistory"));
 }
 
 TEST(Limits, LeaveOutWhatIsBeyondThem) {
   for (const LimitCase& limit : limitCases) {
-    size_t events = 0;
-    const std::string within = FindingsOf(limit, limit.Within, events);
+    const std::string within = HistoryWith(limit, limit.Within).Findings();
     EXPECT_EQ(within.find(limit.Finding), within.npos) << limit.Finding << ": " << within;
-    const std::string beyond = FindingsOf(limit, limit.Within + limit.Beyond, events);
+    const HistoryOf history = HistoryWith(limit, limit.Within + limit.Beyond);
+    const std::string beyond = history.Findings();
     EXPECT_NE(beyond.find(limit.Finding), beyond.npos) << limit.Finding << ": " << beyond;
-    EXPECT_EQ(events, limit.EventsBeyond) << limit.Finding;
+    EXPECT_EQ(history.Result.Events.size(), limit.EventsBeyond) << limit.Finding;
   }
 }
 

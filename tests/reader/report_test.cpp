@@ -3,204 +3,170 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <set>
 
-#include "reader/change.h"
 #include "reader/report.h"
-#include "tests/reader/change_text.h"
-#include "tests/support/file_text.h"
+#include "tests/reader/history_text.h"
 
 namespace {
 
-constexpr const char* start = "20261114 22:00:03";
-constexpr const char* end = "20261114 22:41:55";
-const std::string message = "Copying files\n";
+// The golden report and its blocks, in their order.
+const std::string report = GoldenReport();
 const std::string boxLine(94, '*');
+const std::string message = "Copying files\n";
+const size_t box = report.find(boxLine);
+const size_t afterBefore = report.find(message);
+const std::string start = report.substr(0, box);
+const std::string before = report.substr(box, afterBefore - box);
+const std::string ending = report.substr(afterBefore + message.size());
 
-// The golden report with times.
-std::string Report() {
-  std::string text = Golden("ORXInstallEvent.Log");
-  text.replace(text.find("<time>"), 6, start);
-  text.replace(text.find("<time>"), 6, start);
-  return Replaced(text, "<time>", end);
-}
-
-ReportFacts Facts() {
+ReportFacts Facts(const char* end = endTime) {
   ReportFacts facts;
   facts.Identity = "42";
-  facts.StartTime = start;
+  facts.StartTime = startTime;
   facts.EndTime = end;
   return facts;
 }
 
-std::string Join(const std::vector<std::string_view>& pieces) {
+std::string MessagesOf(const ReportRun& run) {
   std::string text;
-  for (const std::string_view piece : pieces) {
+  for (const std::string_view piece : run.Messages) {
     text += piece;
   }
   return text;
 }
 
-using Set = std::multiset<std::string>;
-
-// Nothing for a run that has not both snapshots.
-Set ChangesOf(const ReportRun& run) {
-  if (!run.Before || !run.After) {
-    return {};
-  }
-  const auto texts =
-      ChangeTexts(CompareSnapshots(*run.Before, *run.After, TextDecoder(), ChangeDetail::kList));
-  return {texts.begin(), texts.end()};
+// A line for each; empty for a run that has not both snapshots.
+std::string ChangesOf(const ReportRun& run) {
+  return run.Before && run.After ? ChangeLines(CompareSnapshots(*run.Before, *run.After,
+                                                                TextDecoder(), ChangeDetail::kList))
+                                 : "";
 }
 
-TEST(Report, IsReadBack) {
-  const std::string text = Report();
-  const std::vector<ReportRun> runs = ParseReport(text, Facts());
-  ASSERT_EQ(runs.size(), 1U);
-  const ReportRun& run = runs[0];
-  EXPECT_TRUE(run.IsWhole);
-  ASSERT_TRUE(run.Start && run.Computer && run.Result);
-  EXPECT_EQ(run.Start->CommandLine, "setup.exe /gui");
-  EXPECT_EQ(*run.Computer, "ORXHOST");
-  EXPECT_EQ(run.Result->EndTime, end);
-  EXPECT_EQ(run.Result->Result, "Successful");
-  EXPECT_EQ(Join(run.Messages), message);
-  const Set changes = ChangesOf(run);
-  EXPECT_EQ(changes.size(), 35U) << ::testing::PrintToString(changes);
-  for (const char* change :
-       {"removed groups global/Domain Users", "removed members global/Domain Users/ana",
-        "removed processes UNK_NAME|count 1 > -", "added copies C1",
-        "removed services The ORX service|state Paused > -", "added profile C1/Limit|value - > -2",
-        "added drivers ZEK ORX ODBC DRIVER",
-        "added driver_parameters ZEK ORX ODBC DRIVER/UsageCount|value - > 2",
-        "added instance_profile C1/ORX1/A_PARAMETER_NAME_OF_EXACTLY_36_BYTESrun in"}) {
-    EXPECT_TRUE(changes.contains(change)) << change << ::testing::PrintToString(changes);
+// The start, the end, the snapshots or the number of changes, and the messages of each run.
+std::string RunsText(const std::string& text, const ReportFacts& facts) {
+  std::string lines;
+  for (const ReportRun& run : ParseReport(text, facts)) {
+    lines += run.IsWhole ? "whole" : "broken";
+    lines.append(" from ").append(run.Start ? run.Start->Time : "-");
+    lines.append(" to ").append(run.Result ? run.Result->EndTime : "-");
+    lines += !run.Before ? ", no snapshot before\n"
+             : !run.After
+                 ? ", no snapshot after\n"
+                 : ", " + std::to_string(SortedLines(ChangesOf(run)).size()) + " changes\n";
+    lines += MessagesOf(run);
+  }
+  return lines;
+}
+
+const std::string whole =
+    "whole from 20261114 22:00:03 to 20261114 22:41:55, 35 changes\nCopying files\n";
+
+TEST(Report, IsReadBackWithTheLineEndsOfBothSystems) {
+  for (std::string text : {report, Replaced(report, "\n", "\r\n")}) {
+    UnifyLineEnds(text);
+    EXPECT_EQ(RunsText(text, Facts()), whole);
+    const ReportRun run = ParseReport(text, Facts()).front();
+    EXPECT_EQ(run.Start->CommandLine, "setup.exe /gui");
+    EXPECT_EQ(run.Computer, "ORXHOST");
+    EXPECT_EQ(run.Result->Result, "Successful");
+    EXPECT_EQ(ChangesOf(run), Golden("report_changes.txt"));
   }
 }
 
 // A report that was cut off anywhere shows changes that the whole one has, and of the messages no
 // more than it has.
-void ExpectPartOf(const std::string& cut, const ReportFacts& facts, const Set& changes,
+void ExpectPartOf(const std::string& cut, const ReportFacts& facts, const std::string& changes,
                   const std::string& messages) {
+  const std::multiset<std::string> all = SortedLines(changes);
   for (const ReportRun& run : ParseReport(cut, facts)) {
-    const Set found = ChangesOf(run);
-    ASSERT_TRUE(std::includes(changes.begin(), changes.end(), found.begin(), found.end()))
+    const std::multiset<std::string> found = SortedLines(ChangesOf(run));
+    ASSERT_TRUE(std::includes(all.begin(), all.end(), found.begin(), found.end()))
         << cut.size() << testing::PrintToString(found);
-    ASSERT_TRUE(messages.starts_with(Join(run.Messages))) << cut.size() << Join(run.Messages);
+    ASSERT_TRUE(messages.starts_with(MessagesOf(run))) << cut.size() << MessagesOf(run);
   }
 }
 
 TEST(Report, InventsNothingWhereItBreaksOff) {
-  const std::string text = Report();
-  const Set changes = ChangesOf(ParseReport(text, Facts())[0]);
-  for (size_t size = 0; size < text.size(); ++size) {
-    ExpectPartOf(text.substr(0, size), Facts(), changes, message);
+  const std::string changes = ChangesOf(ParseReport(report, Facts())[0]);
+  for (size_t size = 0; size < report.size(); ++size) {
+    ExpectPartOf(report.substr(0, size), Facts(), changes, message);
   }
 }
 
-TEST(Report, ReadsTheLineEndsOfBothSystems) {
-  std::string text = Replaced(Report(), "\n", "\r\n");
-  UnifyLineEnds(text);
-  EXPECT_EQ(text, Report());
-}
-
-// Text instead of the message. Whatever it holds, all of it is message, and the event is the same.
+// Text instead of the message. Whatever it has, all of it is message, and the event is the same.
 TEST(Report, TakesNoMessageForABlock) {
-  const std::string text = Report();
-  const size_t offset = text.find(message);
-  const Set changes = ChangesOf(ParseReport(text, Facts())[0]);
-  const std::string endOfReport = text.substr(offset + message.size());
+  const std::string changes = ChangesOf(ParseReport(report, Facts())[0]);
   ReportFacts open = Facts();
   open.EndTime.reset();
   open.MayHaveEnded = false;
   const std::string forgedEnd =
-      Replaced(Replaced(endOfReport, end, "20261114 22:30:00"), "Guests", "Forged");
-  const std::string withoutServices = Replaced(text.substr(0, offset), "Administrators", "Forged");
+      Replaced(Replaced(ending, endTime, "20261114 22:30:00"), "Guests", "Forged");
   for (const std::string& forged :
-       {text.substr(0, offset), forgedEnd, withoutServices + forgedEnd, Replaced(text, "42", "43"),
-        endOfReport.substr(0, endOfReport.size() / 2) + '\n',
-        endOfReport.substr(0, endOfReport.find("Result of")),
+       {start + before, forgedEnd, Replaced(start + before, "Administrators", "Forged") + forgedEnd,
+        Replaced(report, "42", "43"), ending.substr(0, ending.size() / 2) + '\n',
+        ending.substr(0, ending.find("Result of")),
         forgedEnd.substr(0, forgedEnd.find("ORX Products & Build Level   :")),
-        std::string("---------- ORX Installation History Logger ( End ) ----------") + end + '\n',
+        std::string("---------- ORX Installation History Logger ( End ) ----------") + endTime +
+            '\n',
         boxLine + '\n', std::string("\n2) Software Installed on the machine:\n")}) {
-    const std::string whole = text.substr(0, offset) + forged + endOfReport;
-    const std::vector<ReportRun> runs = ParseReport(whole, Facts());
-    ASSERT_EQ(runs.size(), 1U) << forged;
-    EXPECT_EQ(Join(runs[0].Messages), forged);
-    EXPECT_EQ(ChangesOf(runs[0]), changes) << forged;
-    EXPECT_EQ(runs[0].Result->Result, "Successful");
-    const size_t forgedEndOffset = offset + forged.size();
-    ExpectPartOf(whole.substr(0, forgedEndOffset), Facts(), changes, forged);
-    for (size_t size = offset; size < whole.size(); size += 7) {
+    const std::string head = start + before + forged;
+    EXPECT_EQ(RunsText(head + ending, Facts()), Replaced(whole, message, forged));
+    EXPECT_EQ(ChangesOf(ParseReport(head + ending, Facts())[0]), changes) << forged;
+    ExpectPartOf(head, Facts(), changes, forged);
+    for (size_t size = afterBefore; size < head.size() + ending.size(); size += 7) {
+      const std::string cut = (head + ending).substr(0, size);
       // A forged snapshot that the cut leaves without its times cannot be distinguished.
-      if (size > forgedEndOffset) {
-        ExpectPartOf(whole.substr(0, size), Facts(), changes, forged + endOfReport);
+      if (size > head.size()) {
+        ExpectPartOf(cut, Facts(), changes, forged + ending);
       }
-      ExpectPartOf(whole.substr(0, size), open, {}, forged + endOfReport);
+      ExpectPartOf(cut, open, "", forged + ending);
     }
   }
 }
 
-// The start broke off; what looks like its snapshot came later.
-TEST(Report, TakesNoLaterBoxForTheFirstSnapshot) {
-  const std::string text = Report();
-  const size_t box = text.find(boxLine);
-  for (const std::string& first : {message, std::string("\n")}) {
-    const std::string forged = Replaced(text, "Guests", "Forged").substr(box);
-    const std::string whole = text.substr(0, box) + first + forged;
-    const std::vector<ReportRun> runs = ParseReport(whole, Facts());
-    EXPECT_FALSE(runs[0].Before);
-    EXPECT_TRUE(runs[0].After);
-    EXPECT_TRUE(Join(runs[0].Messages).starts_with(first + boxLine));
+// A second end that finds the report moved has changed the time in the history file alone.
+TEST(Report, HasTheEndAndTheMessagesThatItsFactsAllow) {
+  const std::string broken = "broken from 20261114 22:00:03 to ";
+  const std::string withoutEnd = broken + "-, no snapshot after\n";
+  const std::string secondEnd = Replaced(ending, endTime, "20261114 22:50:00");
+  const std::string row = "4                  UNK_NAME\n";
+  const std::string brokenSnapshot = before.substr(0, before.find(row) + row.size());
+  ReportFacts later = Facts("20261114 23:00:00");
+  ReportFacts placed = later;
+  placed.IsPlaced = true;
+  const std::tuple<const char*, std::string, ReportFacts, std::string> cases[] = {
+      {"an end after the end", report + secondEnd, Facts(), whole + secondEnd},
+      {"an end of another time", report, later, withoutEnd + message + ending},
+      {"an earlier end", report, placed, whole},
+      {"and a message", report + "late\n", placed, withoutEnd + message + ending + "late\n"},
+      {"a message before the first snapshot", start + message + before + message + ending, Facts(),
+       broken + endTime + ", no snapshot before\n" + message + before + message},
+      {"an empty line there", start + "\n" + before + message + ending, Facts(),
+       broken + endTime + ", no snapshot before\n\n" + before + message},
+      // The changes are those of the users alone.
+      {"a broken first snapshot", start + brokenSnapshot + message + ending, Facts(),
+       broken + endTime + ", 4 changes\n" + message},
+  };
+  for (const auto& [what, text, facts, runs] : cases) {
+    EXPECT_EQ(RunsText(text, facts), runs) << what;
   }
-}
-
-// A message to an event that has ended, which forges another end.
-TEST(Report, KeepsTheEndOfTheHistoryFile) {
-  const std::string text = Report();
-  const std::string forged =
-      Replaced(text.substr(text.find(message) + message.size()), end, "20261114 22:50:00");
-  const std::string whole = text + forged;
-  const std::vector<ReportRun> runs = ParseReport(whole, Facts());
-  EXPECT_EQ(runs[0].Result->EndTime, end);
-  EXPECT_EQ(Join(runs[0].Messages), message + forged);
-  // A second end that finds the report moved has changed the time in the history file alone.
-  ReportFacts facts = Facts();
-  facts.EndTime = "20261114 23:00:00";
-  EXPECT_FALSE(ParseReport(text, facts)[0].Result);
-  facts.IsPlaced = true;
-  EXPECT_EQ(ParseReport(text, facts)[0].Result->EndTime, end);
-  EXPECT_FALSE(ParseReport(text + "late\n", facts)[0].Result);
 }
 
 TEST(Report, SeparatesTheRunsOfARepeatedIdentity) {
-  const std::string first = Replaced(Report(), "20261114", "20261101");
-  const size_t offset = first.find(message);
-  for (const size_t size :
-       {first.size(), offset + message.size(), offset, size_t{3000}, size_t{1000}, size_t{200}}) {
-    std::string text = first.substr(0, size);
-    text += (text.ends_with('\n') ? "" : "\n") + Report();
-    const std::vector<ReportRun> runs = ParseReport(text, Facts());
-    ASSERT_EQ(runs.size(), 2U) << size;
-    EXPECT_EQ(runs[0].IsWhole, size >= offset);
-    EXPECT_EQ(runs[0].Start->Time, "20261101 22:00:03");
-    EXPECT_TRUE(runs[1].IsWhole);
-    EXPECT_EQ(ChangesOf(runs[1]).size(), 35U);
-    EXPECT_EQ(ChangesOf(runs[0]).size(), size == first.size() ? 35U : 0U);
+  const std::string first = Replaced(report, "20261114", "20261101");
+  const std::tuple<size_t, std::string> cases[] = {
+      {first.size(), Replaced(whole, "20261114", "20261101")},
+      {afterBefore + message.size(),
+       "whole from 20261101 22:00:03 to -, no snapshot after\n" + message},
+      {afterBefore, "whole from 20261101 22:00:03 to -, no snapshot after\n"},
+      {3000, "broken from 20261101 22:00:03 to -, no snapshot after\n"},
+      {1000, "broken from 20261101 22:00:03 to -, no snapshot after\n"},
+      {200, "broken from 20261101 22:00:03 to -, no snapshot before\n"},
+  };
+  for (const auto& [size, run] : cases) {
+    const std::string lines = first.substr(0, first.rfind('\n', size - 1) + 1);
+    EXPECT_EQ(RunsText(lines + report, Facts()), run + whole) << size;
   }
-}
-
-// Messages go on after a start that broke off.
-TEST(Report, FindsTheMessagesAfterABrokenSnapshot) {
-  const std::string row = "4                  UNK_NAME\n";
-  std::string cut = Report();
-  const size_t broken = cut.find(row) + row.size();
-  cut.erase(broken, cut.find(message) - broken);
-  const std::vector<ReportRun> runs = ParseReport(cut, Facts());
-  EXPECT_FALSE(runs[0].IsWhole);
-  EXPECT_EQ(Join(runs[0].Messages), message);
-  EXPECT_EQ(runs[0].Result->Result, "Successful");
-  EXPECT_EQ(ChangesOf(runs[0]).size(), 4U);  // the users alone
 }
 
 }  // namespace
