@@ -101,25 +101,27 @@ TEST(Report, TakesNoMessageForABlock) {
   open.MayHaveEnded = false;
   const std::string forgedEnd =
       Replaced(Replaced(ending, endTime, "20261114 22:30:00"), "Guests", "Forged");
+  const std::string forgedReport = Replaced(start + before, "Administrators", "Forged") + forgedEnd;
   for (const std::string& forged :
-       {start + before, forgedEnd, Replaced(start + before, "Administrators", "Forged") + forgedEnd,
-        Replaced(report, "42", "43"), ending.substr(0, ending.size() / 2) + '\n',
-        ending.substr(0, ending.find("Result of")),
+       {start + before, forgedEnd, forgedReport, Replaced(report, "42", "43"),
+        ending.substr(0, ending.size() / 2) + '\n', ending.substr(0, ending.find("Result of")),
         forgedEnd.substr(0, forgedEnd.find("ORX Products & Build Level   :")),
         std::string("---------- ORX Installation History Logger ( End ) ----------") + endTime +
             '\n',
         boxLine + '\n', std::string("\n2) Software Installed on the machine:\n")}) {
-    const std::string head = start + before + forged;
-    EXPECT_EQ(RunsText(head + ending, Facts()), Replaced(whole, message, forged));
-    EXPECT_EQ(ChangesOf(ParseReport(head + ending, Facts())[0]), changes) << forged;
-    ExpectPartOf(head, Facts(), changes, forged);
-    for (size_t size = afterBefore; size < head.size() + ending.size(); size += 7) {
-      const std::string cut = (head + ending).substr(0, size);
+    const size_t forgedEndOffset = afterBefore + forged.size();
+    const std::string rest = forged + ending;
+    const std::string text = report.substr(0, afterBefore) + rest;
+    EXPECT_EQ(RunsText(text, Facts()), Replaced(whole, message, forged));
+    EXPECT_EQ(ChangesOf(ParseReport(text, Facts())[0]), changes) << forged;
+    ExpectPartOf(text.substr(0, forgedEndOffset), Facts(), changes, forged);
+    for (size_t size = afterBefore; size < text.size(); size += 7) {
+      const std::string cut = text.substr(0, size);
       // A forged snapshot that the cut leaves without its times cannot be distinguished.
-      if (size > head.size()) {
-        ExpectPartOf(cut, Facts(), changes, forged + ending);
+      if (size > forgedEndOffset) {
+        ExpectPartOf(cut, Facts(), changes, rest);
       }
-      ExpectPartOf(cut, open, "", forged + ending);
+      ExpectPartOf(cut, open, "", rest);
     }
   }
 }
