@@ -76,6 +76,8 @@ TEST(Page, KeepsEventsOfOneNameApartAndUnchangedFromNotKnown) {
   history.Events[0].Messages = std::string(5000, 'm') + '\n';
   history.Events[0].HasBefore = history.Events[0].HasAfter = true;
   history.Events[0].Differences.Compared.fill(true);
+  // A change that a limit leaves out of the list.
+  history.Events[0].Differences.Differs[static_cast<size_t>(Section::kUser)] = true;
   FindingList findings;
   findings.Add({FindingLevel::kNote, "damaged", "<7>", "cut"});
   std::ostringstream written;
@@ -83,7 +85,7 @@ TEST(Page, KeepsEventsOfOneNameApartAndUnchangedFromNotKnown) {
   const std::string page = written.str();
   EXPECT_EQ(Count(page, "<div id=\"event-1\">"), 1U);
   EXPECT_EQ(Count(page, "href=\"#event-2\""), 1U);
-  EXPECT_EQ(Count(page, "Unchanged: user"), 1U);
+  EXPECT_EQ(Count(page, "Unchanged: groups"), 1U);
   EXPECT_EQ(Count(page, "Not known, as a snapshot is missing or not whole: user"), 1U);
   EXPECT_EQ(Count(page, "event <bdi>&lt;7&gt;</bdi>: <bdi>cut</bdi>"), 1U);
   EXPECT_EQ(page.find("<7>"), page.npos);

@@ -70,6 +70,9 @@ TEST(Report, IsReadBackWithTheLineEndsOfBothSystems) {
     EXPECT_EQ(run.Computer, "ORXHOST");
     EXPECT_EQ(run.Result->Result, "Successful");
     EXPECT_EQ(ChangesOf(run), Golden("report_changes.txt"));
+    const Changes counted =
+        CompareSnapshots(*run.Before, *run.After, TextDecoder(), ChangeDetail::kCounts);
+    EXPECT_TRUE(counted.List.empty() && counted.Differs[static_cast<size_t>(Section::kServices)]);
   }
 }
 
