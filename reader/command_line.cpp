@@ -67,7 +67,7 @@ void DefineCommandLine(CLI::App& app, const std::string& version, CommandLine& l
                  "Of text that is not UTF-8, Windows-1252 by default; CP932 and so on")
       ->type_name("NAME");
   app.footer(
-      "Exit results: 0 done; 1 check found an error or a warning, find found nothing;\n"
+      "Exit codes: 0 done; 1 check found an error or a warning, find found nothing;\n"
       "2 a history cannot be read, an event is not there, or the call is wrong.");
   for (const CommandText& text : kCommands) {
     AddCommand(app, text, line);

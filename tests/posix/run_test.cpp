@@ -59,7 +59,7 @@ class Run : public testing::Test, protected ScratchFolder {
   const std::string History = In("ZEK/ORXHistory/");
 };
 
-TEST_F(Run, ReturnsExitResults) {
+TEST_F(Run, ReturnsExitCodes) {
   const std::string usage = "ORXInstallEvent";
   // The arguments, the result and how the output begins. What prints touches no history.
   const std::tuple<const char*, int, std::string> cases[] = {
