@@ -5,6 +5,7 @@ history file. At the end everything that finished must be there, complete and on
 
 import itertools
 import random
+import re
 import time
 
 import history
@@ -16,28 +17,36 @@ SHARED = [f"shared{number}" for number in range(4)]
 COPIES = 5
 
 
+def sometimes_killing():
+    """For every third run the command that kills it."""
+    if random.random() < 2 / 3:
+        return ()
+    return ("timeout", "--signal=KILL", f"{random.uniform(0.001, 0.08):.4f}")
+
+
+def without_locks():
+    # The delay, in microseconds, leaves a new file empty for so long.
+    return injecting("flock", "error=ENOLCK", "-e", "trace=flock,fchmod",
+                     "-e", "inject=fchmod:delay_enter=3000")
+
+
 class Round:
     """The runs of one round, and what is known to be finished. Lists and sets are only added to,
-    one element at a time, which needs no lock."""
+    one element at a time, which needs no lock. Without locks runs may undo each other's changes:
+    only what each leaves must be complete."""
 
-    has_complete_events = True
-
-    def __init__(self, machine, seconds, killed_share=0):
+    def __init__(self, machine, outcome, seconds, before, has_locks):
         self.machine = machine
+        self.outcome = outcome
         self.until = time.monotonic() + seconds
-        self.killed_share = killed_share
+        self.before = before  # returns the command before a run
+        self.has_locks = has_locks
         self.numbers = itertools.count()
         self.codes, self.reports, self.parsed = [], [], []
         self.begun, self.started, self.ending = set(SHARED), set(SHARED), set()
         self.copies = {}  # event: copy, of the finished ends
         self.messages = {}  # event: messages of the finished runs
         self.killed_messages = set()
-
-    def before(self):
-        """The command before a run: none, or one that kills it."""
-        if random.random() >= self.killed_share:
-            return ()
-        return ("timeout", "--signal=KILL", f"{random.uniform(0.001, 0.08):.4f}")
 
     def run(self, *arguments):
         """True for a run that finished."""
@@ -74,7 +83,7 @@ class Round:
     def report(self, archive):
         if self.run("-report", str(archive)):
             entries = history.read_archive(archive)
-            history.parse_history(entries["History.ini"], has_complete_events=True)
+            history.parse_history(entries["History.ini"], self.has_locks)
             archive.unlink()
             self.reports.append(archive)
 
@@ -91,67 +100,66 @@ class Round:
         self.messages[event] = ["early"]
 
     def read(self):
-        self.parsed.append(history.parse_history(self.machine.ini.read_bytes(),
-                                                 self.has_complete_events)["History"])
+        data = self.machine.ini.read_bytes()
+        self.parsed.append(history.parse_history(data, self.has_locks)["History"])
         time.sleep(0.01)
 
-    def repeat(self, outcome, name, action):
+    def repeat(self, name, action):
         while time.monotonic() < self.until:
-            outcome.attempt(f"overlap, {name}", action)
+            self.outcome.attempt(f"overlap, {name}", action)
 
-    def run_all(self, outcome):
+    def run_all(self):
         for event in SHARED:
             self.machine.must("-start", event, "-Product", f"P{event}")
         for _ in range(10):
-            outcome.attempt("overlap, early message", self.message_during_start)
-        in_threads([(self.repeat, outcome, "worker", self.record_event)] * WORKERS
-                   + [(self.repeat, outcome, "reader", self.read)])
-        self.check_results(outcome)
-
-    def check_results(self, outcome):
-        sections = outcome.attempt("overlap, history", self.machine.sections) or {}
-        outcome.attempt("overlap, count", lambda: self.check_count(sections))
-        for event in self.started:
-            for check_part in self.check_event, self.check_log:
-                outcome.attempt(f"overlap, event {event}",
-                                lambda: check_part(sections.get(event), event))
-        outcome.attempt("overlap, last report", self.check_last_report)
+            self.outcome.attempt("overlap, early message", self.message_during_start)
+        in_threads([(self.repeat, "worker", self.record_event)] * WORKERS
+                   + [(self.repeat, "reader", self.read)])
+        sections = self.outcome.attempt("overlap, history", self.machine.sections) or {}
+        if self.has_locks:
+            self.outcome.attempt("overlap, count", lambda: self.check_count(sections))
+            for event in self.started:
+                self.outcome.attempt(f"overlap, event {event}",
+                                     lambda: self.check_event(sections.get(event), event))
+            self.outcome.attempt("overlap, last report", self.check_last_report)
 
     def check_count(self, sections):
         check(self.started <= set(sections) - {"History"} <= self.begun, "sections")
         count = int(sections["History"]["Count"])
         check(len(self.started) <= count <= len(self.begun),
               f"count {count}, finished {len(self.started)}, begun {len(self.begun)}")
-        check(self.killed_share or not list(self.machine.history.rglob(".*")), "leftover files")
 
     def check_event(self, keys, event):
         check(keys, "lost section")
         check(keys["Complete_Flag"] == "TRUE" or event not in self.copies, "lost end")
         check(keys["Complete_Flag"] == "FALSE" or event in self.ending, "end without a run")
         check(keys["Product"] == f"P{event}", "lost product")
+        self.check_log(keys, event)
 
     def check_log(self, keys, event):
         log = self.machine.log_of(event, keys["Copy_Name"] or "none")
-        lines = log.read_text(errors="replace").splitlines()
+        text = log.read_text(errors="replace")
         if event in self.copies:
             check(str(log) == keys["Event_Log_File"], "the key names another log")
-            check("( End )" in lines[-1], "log does not end")
-        found = [message for line in lines for message in self.messages_of(line)]
+            check("( End )" in text.splitlines()[-1], "log does not end")
+        found = self.messages_in(text)
         check(len(found) == len(set(found)), "a message twice")
         finished = [message for message in found if message not in self.killed_messages]
         sent = self.messages.get(event, [])
         check(sorted(finished) == sorted(sent), "messages lost or torn")
         check(event in SHARED or finished == sent, "order")
 
-    def messages_of(self, line):
-        """The messages of a line, one or none. What a killed run has written of its message is
-        before that of the next run."""
-        before, *parts = line.split("^")
-        check(not before or not parts, "text before a message")
-        messages = [parts.pop()[:-1]] if parts and line.endswith("$") else []
-        for part in parts:
-            check(any(f"{message}$".startswith(part) for message in self.killed_messages),
-                  "torn message")
+    def messages_in(self, text):
+        """The messages of a log. What a killed run has written of its message is before that of
+        the next run."""
+        check(not re.search(r"(?m)^[^^\n]+\^", text), "text before a message")
+        messages = []
+        for part in re.findall(r"\^[^^\n]*\n?", text):
+            if part.endswith("$\n"):
+                messages.append(part[1:-2])
+            else:
+                check(any(f"^{message}$".startswith(part.rstrip("\n"))
+                          for message in self.killed_messages), "torn message")
         return messages
 
     def check_last_report(self):
@@ -160,35 +168,16 @@ class Round:
         check(not list(self.machine.history.rglob(".*")), "leftover files")
 
 
-class UnlockedRound(Round):
-    """Runs may undo each other's changes here: only what each leaves must be complete."""
-
-    has_complete_events = False
-
-    def before(self):
-        # The delay, in microseconds, leaves a new file empty for so long.
-        return injecting("flock", "error=ENOLCK", "-e", "trace=flock,fchmod",
-                         "-e", "inject=fchmod:delay_enter=3000")
-
-    def record_event(self):
-        event = f"event{next(self.numbers)}"
-        self.run("-start", event)
-        self.run("-end", event, "-CopyName", "C")
-
-    def message_during_start(self):
-        pass
-
-    def check_results(self, outcome):
-        outcome.attempt("overlap, history", self.machine.sections)
+# Name, share of the seconds, command before a run, whether locks work.
+ROUNDS = (("undisturbed", 0.5, lambda: (), True), ("killed", 0.35, sometimes_killing, True),
+          ("without locks", 0.15, without_locks, False))
 
 
 def attack_together(program, outcome, seconds, _):
-    for name, share, kind, options in (
-            ("undisturbed", 0.5, Round, {}), ("killed", 0.35, Round, {"killed_share": 1 / 3}),
-            ("without locks", 0.15, UnlockedRound, {})):
+    for name, share, before, has_locks in ROUNDS:
         with Target(program) as machine:
-            runs = kind(machine, seconds * share, **options)
-            runs.run_all(outcome)
+            runs = Round(machine, outcome, seconds * share, before, has_locks)
+            runs.run_all()
         killed = len(runs.codes) - runs.codes.count(0)
         print(f"overlap, {name}: {len(runs.codes)} runs, {killed} of them killed, "
               f"{len(runs.reports)} archives and {len(runs.parsed)} histories read meanwhile",
