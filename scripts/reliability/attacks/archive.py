@@ -14,12 +14,20 @@ from planted import KINDS
 OLDER = b"an older archive"
 
 
-def failure_line(path):
-    return f" Failed to create file '{path}'\n".encode()
+def failing_report(machine, path, **options):
+    """The output of a report that fails. It replaces nothing and leaves no new file."""
+    def state():
+        data = path.read_bytes() if path.is_file() else None
+        return path.lstat().st_mode, data, sorted(os.listdir(path.parent))
+    before = state()
+    output = machine.must("-report", str(path), code=3, **options)
+    check(state() == before, "replaced, or leftover files")
+    return output
 
 
-def check_no_leftovers(machine):
-    check(os.listdir(machine.archives) == [machine.archive.name], "leftover files")
+def check_refused(machine, path):
+    output = failing_report(machine, path)
+    check(output == f" Failed to create file '{path}'\n".encode(), f"prints {output}")
 
 
 @attack()
@@ -44,12 +52,7 @@ def archive_name_taken_by(machine, kind):
         os.mknod(machine.archive, stat.S_IFCHR | 0o600, os.makedev(1, 3))
     else:
         KINDS[kind](machine.archive, machine.outside)
-    before = machine.archive.lstat()
-    output = machine.report(code=3)
-    check(output == failure_line(machine.archive), f"prints {output}")
-    after = machine.archive.lstat()
-    check((after.st_ino, after.st_mode) == (before.st_ino, before.st_mode), "replaced")
-    check_no_leftovers(machine)
+    check_refused(machine, machine.archive)
 
 
 @attack("History.ini", "C1/../History.ini", "C1/7/ORXInstallEvent.Log", "open/ORXInstallEvent.Log",
@@ -61,11 +64,7 @@ def archive_in_place_of(machine, name):
     (machine.history / "linked").symlink_to("C1/7")
     machine.report()
     os.link(machine.ini, machine.history / "hard link")
-    path = machine.history / name
-    before = path.read_bytes()
-    output = machine.must("-report", str(path), code=3)
-    check(output == failure_line(path), f"prints {output}")
-    check(path.read_bytes() == before, "replaced")
+    check_refused(machine, machine.history / name)
 
 
 @attack()
@@ -115,32 +114,25 @@ def reports_to_one_name(machine):
     for process in processes:
         check(process.wait(20) == 0, "exit code of a report")
         check("big" in machine.packed(), "incomplete")
-    check_no_leftovers(machine)
+    check(os.listdir(machine.archives) == [machine.archive.name], "leftover files")
 
 
 @attack(("at once", 64 << 10), ("near the end", 4 << 20))
 def archive_over_the_file_size_limit(machine, limit):
     record_much(machine, megabytes=4)
     machine.archive.write_bytes(OLDER)
-    output = machine.report(code=3, before=("prlimit", f"--fsize={limit}"))
+    output = failing_report(machine, machine.archive, before=("prlimit", f"--fsize={limit}"))
     check(output == f"The file '{machine.archive}' is created successfully\n".encode(),
           f"prints {output}")
-    check(machine.archive.read_bytes() == OLDER, "older archive lost")
-    check_no_leftovers(machine)
 
 
 @attack(*((f"{left} bytes", left) for left in (0, 4 << 10, 64 << 10, 1 << 20)))
 def archive_on_a_full_disk(machine, left):
-    """The disk of the archive has only so much left."""
+    """The older archive fills the disk, but for so much."""
     record_much(machine, megabytes=2)
     machine.mount(machine.archives, "4m")
-    machine.archive.write_bytes(OLDER)
-    filler = machine.archives / "filler"
-    filler.write_bytes(bytes((4 << 20) - 4096 - left))
-    machine.report(code=3)
-    check(machine.archive.read_bytes() == OLDER, "older archive lost")
-    filler.unlink()
-    check_no_leftovers(machine)
+    machine.archive.write_bytes(bytes((4 << 20) - left))
+    failing_report(machine, machine.archive)
 
 
 # Before a temporary file is opened again to write to it or to flush it, somebody replaces it by a
