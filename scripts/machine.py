@@ -47,7 +47,9 @@ class Machine(contextlib.ExitStack):
 
     def start(self, *arguments, **options):
         """A run in the background, killed at the machine's end."""
-        process = self.popen(arguments, **options)
+        return self.kill_at_end(self.popen(arguments, **options))
+
+    def kill_at_end(self, process):
         self.callback(process.wait)
         self.callback(process.kill)
         return process
@@ -77,10 +79,10 @@ def shown(arguments):
     return " ".join(repr(word) if len(word) < 80 else repr(word[:77]) + "..." for word in arguments)
 
 
-def contents(folder, pattern="*"):
+def contents(folder):
     """The bytes of all files below a folder by their paths there; none for a folder."""
     return {str(path.relative_to(folder)): path.read_bytes() if path.is_file() else b""
-            for path in sorted(folder.rglob(pattern))}
+            for path in sorted(folder.rglob("*"))}
 
 
 def check_equal(found, expected, message):

@@ -4,13 +4,14 @@ how to add an attack."""
 import concurrent.futures
 import hashlib
 import os
+import re
 import stat
 import subprocess
 import time
 
 import history
 from history import check
-from machine import Machine, Skipped, check_equal, contents, shown
+from machine import Machine, Skipped, check_equal, shown
 
 MARKER = b"what is outside stays outside"
 NOBODY = 65534
@@ -32,6 +33,16 @@ def digest(path):
     # The history folder comes and goes in its parent.
     changed = 0 if stat.S_ISDIR(status.st_mode) and path.name == "ZEK" else status.st_mtime_ns
     return str((status.st_mode, status.st_uid, status.st_gid, changed, content))
+
+
+def expected_entry(path):
+    """An entry's attributes, local time and contents."""
+    status = path.stat()
+    written = time.localtime(status.st_mtime)[:6]
+    date = written[:5] + (written[5] // 2 * 2,)
+    if path.is_dir():
+        return str((0x10, date, b""))
+    return str((0x80 if status.st_mode & 0o222 else 0, date, path.read_bytes()))
 
 
 def injecting(call, fault, *options):
@@ -121,9 +132,19 @@ class Target(Machine):
         return logs[0]
 
     def check_report(self, **options):
-        """A report packs exactly what exists, without what begins with a dot."""
+        """A report packs exactly the files and folders that exist, in the order of their names,
+        without what begins with a dot."""
         self.report(**options)
-        check_equal(self.packed(), contents(self.history, "[!.]*"), "archive")
+        expected = {}
+        for path in sorted(self.history.rglob("*")):
+            name = str(path.relative_to(self.history))
+            is_packed = stat.S_IFMT(path.lstat().st_mode) in (stat.S_IFREG, stat.S_IFDIR)
+            if is_packed and not re.search(r"(^|/)\.", name):
+                expected[name] = expected_entry(path)
+        found = history.archive_entries(self.archive)
+        check_equal("\n".join(name for name, _, _ in found), "\n".join(expected), "names")
+        for name, info, data in found:
+            check_equal(str((info.external_attr, info.date_time, data)), expected[name], name)
 
     # What is outside.
 

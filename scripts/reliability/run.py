@@ -36,10 +36,9 @@ import planted  # noqa: E402
 from harness import ATTACKS, run_attack  # noqa: E402
 from machine import Outcome  # noqa: E402
 
-# Name, function, share of the seconds of a sample, seconds without a limit (0: until all is done).
-FAMILIES = (("kill", kill.attack_calls, 0.6, 0),
-            ("overlap", overlap.attack_together, 0.2, 90),
-            ("planted", planted.attack_paths, 0.2, 0))
+# Name, function, share of the seconds of a sample.
+FAMILIES = (("kill", kill.attack_calls, 0.6), ("overlap", overlap.attack_together, 0.2),
+            ("planted", planted.attack_paths, 0.2))
 
 
 def main():
@@ -64,11 +63,11 @@ def main():
     for name in attacks:
         outcome.attempt(name, lambda: run_attack(options.program, ATTACKS[name]))
     print(f"{len(attacks)} attacks: {outcome.summary()}", flush=True)
-    shares = sum(share for _, _, share, _ in families)
-    for name, attack_family, share, unlimited in families:
-        seconds = options.seconds * share / shares if options.seconds else unlimited
-        only = options.only if ":" in options.only else ""
-        outcome.attempt(name, lambda: attack_family(options.program, outcome, seconds, only))
+    shares = sum(share for _, _, share in families)
+    for name, attack_family, share in families:
+        seconds = options.seconds * share / shares
+        outcome.attempt(
+            name, lambda: attack_family(options.program, outcome, seconds, options.only))
     print(outcome.summary())
     sys.exit(1 if outcome.failures else 0)
 

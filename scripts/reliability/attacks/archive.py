@@ -170,9 +170,8 @@ def file_that_grows_while_it_is(machine, name, call):
     """Somebody appends to it all the time, faster than it is read."""
     machine.record("7")
     path = machine.history / name
-    writer = subprocess.Popen(["sh", "-c", f"while sleep 0.002; do echo >>'{path}'; done"])
-    machine.callback(writer.wait)
-    machine.callback(writer.kill)
+    writer = machine.kill_at_end(subprocess.Popen(
+        ["sh", "-c", f"while sleep 0.002; do echo >>'{path}'; done"]))
     wait_for(path.exists, "does not grow")
     machine.report(before=injecting(call, "delay_enter=200000"))
     writer.kill()

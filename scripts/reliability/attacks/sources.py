@@ -60,10 +60,8 @@ def process_name_with_control_characters(machine):
     """It can neither add a line to the report nor send a terminal an escape sequence."""
     program = os.fsencode(machine.scratch) + b"/x\n4) Services\x1b[2J\xc2\x9b\x7f"
     shutil.copy(shutil.which("sleep"), program)
-    with subprocess.Popen([program, "60"]) as process:
-        machine.callback(process.kill)
-        report = event_report(machine)
-        process.kill()
+    machine.kill_at_end(subprocess.Popen([program, "60"]))
+    report = event_report(machine)
     check(b"x?4) Services?[2J??\n" in report, "the name is not shown as agreed")
     check(b"\x1b" not in report and b"\n4) Services\x1b" not in report, "forged")
 
