@@ -123,10 +123,8 @@ class Outcome:
             print(f"skipped {name}: {reason}", flush=True)
         except Failure as failure:
             self.note(name, failure)
-        except Exception as error:  # a case that ends otherwise is no reason to end the others
-            last = traceback.extract_tb(error.__traceback__)[-1]
-            self.note(name, f"{type(error).__name__}: {error} "
-                      f"({Path(last.filename).name}, line {last.lineno})")
+        except Exception:  # a case that ends otherwise is no reason to end the others
+            self.note(name, traceback.format_exc(limit=-1))
         return None
 
     def note(self, name, failure):

@@ -10,14 +10,13 @@ import collections
 import contextlib
 import itertools
 import os
-import random
 import re
 import shutil
 import signal
 import typing
 
 import history
-from harness import Target, injecting, sample
+from harness import Case, Target, injecting, sample
 from history import check
 from machine import check_equal, contents, difference
 
@@ -42,12 +41,6 @@ class Point(typing.NamedTuple):
     number: int
     fault: str
     text: str = ""  # the call with its arguments
-
-    def name(self):
-        return f"kill: {self.run}, {self.call} {self.number}, {self.fault}"
-
-    def kind(self):
-        return self.run, self.call, self.fault
 
     def is_repeated(self):
         """Whether the program repeats the call when it is interrupted. A library opens and writes
@@ -262,21 +255,12 @@ def comparable(data):
     return re.sub(r"\n(1\) User|3\) Current).*?\n(?=[24]\) )", "\n", text, flags=re.DOTALL)
 
 
-def in_order(points):
-    """One point of each kind first, then the others, for a sample."""
-    random.Random(1).shuffle(points)
-    firsts = {point.kind(): point for point in reversed(points)}
-    return [*firsts.values(), *(point for point in points if firsts[point.kind()] is not point)]
-
-
 def attack_calls(program, outcome, seconds, only):
     with contextlib.ExitStack() as machines:
         workers = [machines.enter_context(ScenarioMachine(program))
                    for _ in range(os.cpu_count() or 1)]
-        points = [point for run in workers[0].scenarios for point in workers[0].points(run)
-                  if only in point.name()]
-        done = sample(outcome, [(point.name(), lambda worker, p=point: worker.check_point(p))
-                                for point in in_order(points)], seconds, workers)
-    faults = collections.Counter(name.rpartition(", ")[2] for name in done)
-    print(f"kill: {len(done)} of {len(points)} faults",
-          *(f"{fault} {count}" for fault, count in faults.items()), sep=", ")
+        cases = [Case(f"kill: {run}, {point.call} {point.number}, {point.fault}",
+                      (run, point.call, point.fault),
+                      lambda worker, p=point: worker.check_point(p))
+                 for run in workers[0].scenarios for point in workers[0].points(run)]
+        return sample(outcome, cases, seconds, only, workers)

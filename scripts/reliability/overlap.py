@@ -175,11 +175,12 @@ ROUNDS = (("undisturbed", 0.5, lambda: (), True), ("killed", 0.35, sometimes_kil
 
 def attack_together(program, outcome, seconds, _):
     """Takes a minute and a half when nothing limits it."""
+    counts = []
     for name, share, before, has_locks in ROUNDS:
         with Target(program) as machine:
             runs = Round(machine, outcome, (seconds or 90) * share, before, has_locks)
             runs.run_all()
         killed = len(runs.codes) - runs.codes.count(0)
-        print(f"overlap, {name}: {len(runs.codes)} runs, {killed} of them killed, "
-              f"{len(runs.reports)} archives and {len(runs.parsed)} histories read meanwhile",
-              flush=True)
+        counts.append(f"{name}: {len(runs.codes)} runs, {killed} of them killed, "
+                      f"{len(runs.reports)} archives and {len(runs.parsed)} histories read")
+    return "; ".join(counts)

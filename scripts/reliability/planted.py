@@ -4,11 +4,10 @@ archive."""
 
 import itertools
 import os
-import random
 import shutil
 import socket
 
-from harness import RUNS, Target, sample
+from harness import RUNS, Case, Target, sample
 
 # Below the history folder.
 PATHS = ("History.ini", ".History.tmp", "Summary.txt", "7", "7/ORXInstallEvent.Log",
@@ -59,11 +58,8 @@ def plant(machine, path, kind):
 
 
 def attack_paths(program, outcome, seconds, only):
-    cases = [(f"planted: {path}, {kind}, before {' '.join(RUNS[stage])}",
-              lambda _, case=(path, kind, stage): check_planted(program, *case))
+    cases = [Case(f"planted: {path}, {kind}, before {' '.join(RUNS[stage])}", (path, kind),
+                  lambda _, case=(path, kind, stage): check_planted(program, *case))
              for path, kind, stage in itertools.product(PATHS, KINDS, range(len(RUNS)))
              if kind != "hard link" or path in REPLACED]
-    cases = [case for case in cases if only in case[0]]
-    random.Random(1).shuffle(cases)
-    done = sample(outcome, cases, seconds, range(os.cpu_count() or 1))
-    print(f"planted: {len(done)} of {len(cases)}")
+    return sample(outcome, cases, seconds, only, range(os.cpu_count() or 1))

@@ -36,7 +36,7 @@ import planted  # noqa: E402
 from harness import ATTACKS, run_attack  # noqa: E402
 from machine import Outcome  # noqa: E402
 
-# Name, function, share of the seconds of a sample.
+# Name, function that returns what it has done, share of the seconds of a sample.
 FAMILIES = (("kill", kill.attack_calls, 0.6), ("overlap", overlap.attack_together, 0.2),
             ("planted", planted.attack_paths, 0.2))
 
@@ -66,8 +66,9 @@ def main():
     shares = sum(share for _, _, share in families)
     for name, attack_family, share in families:
         seconds = options.seconds * share / shares
-        outcome.attempt(
+        counts = outcome.attempt(
             name, lambda: attack_family(options.program, outcome, seconds, options.only))
+        print(f"{name}: {counts}", flush=True)
     print(outcome.summary())
     sys.exit(1 if outcome.failures else 0)
 

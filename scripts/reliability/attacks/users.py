@@ -30,16 +30,12 @@ def linked_folder(machine, name):
 def planted_section(machine):
     """The owner of a history has root collect files: his own, and one that only root may read."""
     require_root()
-    os.chown(machine.history, NOBODY, NOBODY)
     secret, own = machine.outside / "file", machine.outside / "folder" / "own.log"
     own.write_text("the user's own words\n")
     os.chown(own, NOBODY, NOBODY)
     for path in (secret, own):
         path.chmod(0o600)
-    machine.watch()
-    machine.must("-start", "7", "-l", str(secret), "-t", str(own), **AS_NOBODY)
-    machine.must("-end", "7", **AS_NOBODY)
-    machine.report()
+    machine.report_for_owner("-l", str(secret), "-t", str(own))
     check(MARKER not in b"".join(machine.packed().values()), "packed what its owner may not read")
     check("7/own.log" in machine.packed(), "a file of his own is missing")
 
