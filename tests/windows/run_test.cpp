@@ -51,7 +51,7 @@ using ProfileOnWindows = ProfileFile;
 TEST_F(ProfileOnWindows, WaitsForAProgramThatHoldsTheFileBriefly) {
   for (const bool isWritten : {false, true}) {
     const Holder holder(Ini, /*share=*/0, 150ms);
-    EXPECT_EQ(isWritten ? WriteProfileValue(Ini, "T", "Key", "more") : Value() == "old", true);
+    EXPECT_TRUE(isWritten ? WriteProfileValue(Ini, "T", "Key", "more") : Value() == "old");
   }
   EXPECT_EQ(Value(), "old");
   EXPECT_EQ(ReadProfileValue(Ini, "T", "Key", "none", 256), "more");
