@@ -9,11 +9,7 @@
 #include "platform/posix/host_name.h"
 #include "platform/posix/text_file.h"
 
-std::optional<std::string> ShortComputerName() {
-  const std::string name = HostName();
-  constexpr size_t longest = 14;
-  return !name.empty() && name.size() <= longest ? std::optional(name) : std::nullopt;
-}
+std::optional<std::string> ShortComputerName() { return ShortNameOf(HostName()); }
 
 std::optional<SystemVersion> QuerySystemVersion(VersionForm form) {
   utsname system = {};

@@ -9,8 +9,6 @@ ScratchHistory::ScratchHistory() {
   Machine().CommonFolder = Root;
 }
 
-ScratchHistory::~ScratchHistory() { Machine().CommonFolder.clear(); }
-
 std::string InHistory(const std::string& path) {
   return JoinPath(GetHistoryDir(), Replaced(path, "/", {kPathSeparator}));
 }

@@ -5,12 +5,8 @@
 #include "tests/support/scratch_folder.h"
 
 // A scratch folder that is the common application data folder of a new fake machine.
-class ScratchHistory : public ScratchFolder {
- public:
+struct ScratchHistory : ScratchFolder {
   ScratchHistory();
-  ~ScratchHistory();
-  ScratchHistory(const ScratchHistory&) = delete;
-  ScratchHistory& operator=(const ScratchHistory&) = delete;
 };
 
 // The full path of one below the history folder, which is written with slashes.
