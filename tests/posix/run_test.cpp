@@ -1,13 +1,11 @@
 // The program as an installer runs it: processes over a scratch folder.
 
 #include <gtest/gtest.h>
-#include <sys/inotify.h>
 #include <sys/wait.h>
 
 #include <cstdlib>
 #include <filesystem>
 #include <string>
-#include <vector>
 
 #include "platform/profile_text.h"
 #include "tests/support/scratch_folder.h"
@@ -34,25 +32,6 @@ class Run : public testing::Test, protected ScratchFolder {
 
   // The program's result; its output goes to the file "output".
   int Call(const std::string& arguments) const { return Shell("$ORX " + arguments + " >output"); }
-
-  // What a call creates, moves from and moves to in the history folder, and "(closed)" for the log
-  // of event 7, in order.
-  std::string EventsDuring(const std::string& arguments) const {
-    const int watch = ::inotify_init1(IN_NONBLOCK);
-    ::inotify_add_watch(watch, History.c_str(), IN_CREATE | IN_MOVE);
-    ::inotify_add_watch(watch, (History + "7/ORXInstallEvent.Log").c_str(), IN_CLOSE_WRITE);
-    EXPECT_EQ(Call(arguments), 0);
-    std::string names;
-    alignas(inotify_event) char buffer[4096];
-    const ssize_t size = ::read(watch, buffer, sizeof buffer);
-    for (ssize_t offset = 0; offset < size;) {
-      const auto* event = reinterpret_cast<const inotify_event*>(buffer + offset);
-      names += (event->len == 0 ? "(closed)" : event->name) + " "s;
-      offset += static_cast<ssize_t>(sizeof *event + event->len);
-    }
-    ::close(watch);
-    return names;
-  }
 
   ProfileText HistoryFile() const { return ProfileText(FileText(History + "History.ini")); }
 
@@ -132,14 +111,6 @@ TEST_F(Run, FailsWhenTheArchiveIsFull) {
                   "(cd $memory/ZEK/ORXHistory/folder; seq 65535 | xargs touch);"
                   "ORX_COMMON_APPDATA=$memory $ORX -report a.zip >output"),
             3);
-}
-
-// A history file is replaced through a temporary file that a report does not pack, if the run is
-// killed. Windows moves no folder in which a file is open.
-TEST_F(Run, ReplacesTheHistoryFileOnceForAStartAndClosesALogBeforeItIsMoved) {
-  EXPECT_EQ(EventsDuring("-start 7"), "7 .History.tmp .History.tmp History.ini ");
-  const std::string replacement = ".History.tmp .History.tmp History.ini ";
-  EXPECT_EQ(EventsDuring("-end 7 -CopyName C1"), replacement + "(closed) C1 7 " + replacement);
 }
 
 // The lock of the history file, which a report takes twice: when it has copied a file, and when it

@@ -1,5 +1,10 @@
 // The program as an installer runs it, and files that other programs, such as a scanner, keep open.
 
+#include <fcntl.h>
+#include <io.h>
+#include <process.h>
+#include <sys/stat.h>
+
 #include <chrono>
 #include <functional>
 #include <future>
@@ -126,26 +131,16 @@ class Run : public Platform {
   // The program's exit code, -1 if it does not start; its output goes to the file "output". Started
   // without a command interpreter, which fails now and then on a busy machine.
   int Call(const std::string& arguments, const std::string& program = ORX_PROGRAM) const {
-    SECURITY_ATTRIBUTES inherited = {sizeof inherited, nullptr, TRUE};
-    const UniqueHandle output =
-        OwnIfValid(::CreateFileA(In("output").c_str(), GENERIC_WRITE, kShareAll, &inherited,
-                                 CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
-    STARTUPINFOA startup = {};
-    startup.cb = sizeof startup;
-    startup.dwFlags = STARTF_USESTDHANDLES;
-    startup.hStdOutput = output.get();
-    PROCESS_INFORMATION process = {};
-    std::string line = '"' + fs::path(program).make_preferred().string() + "\" " + arguments;
-    if (::CreateProcessA(nullptr, line.data(), nullptr, nullptr, TRUE, 0, nullptr, nullptr,
-                         &startup, &process) == FALSE) {
-      return -1;
-    }
-    const UniqueHandle thread(process.hThread);
-    const UniqueHandle owner(process.hProcess);
-    DWORD exitCode = 0;
-    ::WaitForSingleObject(process.hProcess, INFINITE);
-    ::GetExitCodeProcess(process.hProcess, &exitCode);
-    return static_cast<int>(exitCode);
+    const std::string path = fs::path(program).make_preferred().string();
+    const int ownOutput = ::_dup(STDOUT_FILENO);
+    const int output = ::_open(In("output").c_str(), _O_WRONLY | _O_CREAT | _O_TRUNC, _S_IWRITE);
+    ::_dup2(output, STDOUT_FILENO);
+    ::_close(output);
+    const intptr_t code =
+        ::_spawnl(_P_WAIT, path.c_str(), ('"' + path + '"').c_str(), arguments.c_str(), nullptr);
+    ::_dup2(ownOutput, STDOUT_FILENO);
+    ::_close(ownOutput);
+    return static_cast<int>(code);
   }
 
   static std::string InHistory(const std::string& name) { return JoinPath(GetHistoryDir(), name); }
