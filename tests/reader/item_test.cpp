@@ -2,8 +2,9 @@
 
 #include <gtest/gtest.h>
 
-#include <functional>
+#include <algorithm>
 #include <ios>
+#include <utility>
 
 #include "eventlog/logger.h"
 #include "inventory/process_list.h"
@@ -34,147 +35,123 @@ std::string ItemText(const Item& item) {
   return text;
 }
 
-using Printer = std::function<void(const std::string& value)>;
+// A list of every kind, with a row for each column that is tested.
+struct Lists {
+  Lists() {
+    Users.LoggedOnUser = "H\\u";
+    Users.LocalGroups = {"Guests"};
+    Users.LocalMembers = {{"H\\m", "Guests"}};
+    Software.Products = {{"Server", "9.4", "20261101", "C:\\Dir", "ZEK", 1033}};
+    Services.Services = {{"s", "ORX", "The service pause is pending"}};
+    Copies.Copies = {CORXCopy("C1")};
+    Copy().GlobalProfile = {{"LogSize", "4096"}, {"Home", "C:\\ZEK"}};
+    Copy().Products = {CORXProduct("C1", "ORX Server")};
+    Product().ProductCode = "{1}";
+    Product().VersionInfo = {"9", "4", "0", "SL"};
+    Product().LastModifiedDate = "20261114";
+    Copy().Instances = {CORXInstance("C1", "I1")};
+    Copy().Instances[0].Parameters = {{"Port", "5"}};
+    Drivers.Drivers = {CODBCDriver("ZEK ORX")};
+    Drivers.Drivers[0].Parameters = {{"Setup", "5"}};
+  }
+
+  CORXCopy& Copy() { return Copies.Copies[0]; }
+  CORXProduct& Product() { return Copy().Products[0]; }
+
+  // Writes a part of the report, its first rows padded on that side.
+  void Print(size_t part, Padding padding) {
+    CLogger::GetInstance() << (padding == Padding::kRight ? std::left : std::right);
+    switch (part) {
+      case 0:
+        Users.LocalMembers[0].Group = Users.LocalGroups[0];
+        Users.Print();
+        break;
+      case 1:
+        Software.Print();
+        break;
+      case 3:
+        Services.Print();
+        break;
+      case 4:  // the copies of both generations, of which the first has none
+        SetCopyGeneration(0);
+        CORXProductsList().Print();
+        SetCopyGeneration(1);
+        Copies.Print();
+        break;
+      default:
+        Drivers.Print();
+    }
+  }
+
+  CUsersList Users;
+  CProductsList Software;
+  CServicesList Services;
+  CORXProductsList Copies;
+  CODBCDriversList Drivers;
+};
+
+Lists lists;
 
 // A column, printed with values of about its width.
 struct Column {
   const char* Name;
   size_t Part;
   size_t Width;
-  Printer Print;
-  // The item, with "@" for the value.
-  std::string Item;
+  std::string& Value;  // in the lists
+  const char* Item;    // as it reads back with the value that the lists begin with
   // How rows read back with one byte less than the width, exactly it and one more: 'f' with fields,
-  // 'r' as the entire row.
+  // 'r' as the entire row. A fourth letter is for overlong values with a blank, which shift the
+  // columns after it.
   const char* Kinds;
+  std::string Beginning = {};  // of every value: others are not printed
 };
 
-Printer PrintSoftware(std::string CProductInfo::*field) {
-  return [field](const std::string& value) {
-    CProductInfo product = {"Server", "9.4", "20261101", "C:\\ZEK", "ZEK", 1033};
-    product.*field = value;
-    product.Publisher.replace(0, 3, "ZEK");  // others are not printed
-    CProductsList list;
-    list.Products = {product};
-    list.Print();
-  };
-}
-
-// The copies of both generations: none, and one that the value changes.
-Printer PrintCopy(const std::function<void(CORXCopy&, const std::string&)>& change) {
-  return [change](const std::string& value) {
-    SetCopyGeneration(0);
-    CORXProductsList().Print();
-    CORXProduct product("C1", "ORX Server");
-    product.ProductCode = "{1}";
-    product.VersionInfo = {"9", "4", "0", "SL"};
-    product.LastModifiedDate = "20261101";
-    CORXProductsList list;
-    list.Copies = {CORXCopy("C1")};
-    list.Copies[0].Products = {product};
-    change(list.Copies[0], value);
-    SetCopyGeneration(1);
-    list.Print();
-  };
-}
-
-Printer PrintProduct(std::string CORXProduct::*field) {
-  return PrintCopy([field](CORXCopy& copy, const auto& value) { copy.Products[0].*field = value; });
-}
-
-Printer PrintVersion(std::string CORXVersion::*field) {
-  return PrintCopy([field](CORXCopy& copy, const std::string& value) {
-    copy.Products[0].VersionInfo.*field = value;
-  });
-}
-
-Printer PrintProfile(const std::string& text) {
-  return PrintCopy([text](CORXCopy& copy, const auto& name) {
-    copy.GlobalProfile = {{name, text}};
-  });
-}
-
-void ChangeInstance(CORXCopy& copy, const std::string& name) {
-  copy.Instances = {CORXInstance("C1", "I1")};
-  copy.Instances[0].Parameters = {{name, "5"}};
-}
-
-void PrintDriver(const std::string& name) {
-  CODBCDriversList list;
-  list.Drivers = {CODBCDriver("ZEK ORX")};
-  list.Drivers[0].Parameters = {{name, "5"}};
-  list.Print();
-}
-
-void PrintMember(const std::string& group) {
-  CUsersList list;
-  list.LoggedOnUser = "H\\u";
-  list.LocalGroups = {group};
-  list.LocalMembers = {{"H\\m", group}};
-  list.Print();
-}
-
-void PrintService(const std::string& name) {
-  CServicesList list;
-  list.Services = {{"s", "ORX" + name.substr(3), "The service pause is pending"}};
-  list.Print();
-}
+CProductInfo& software = lists.Software.Products[0];
+CORXProduct& product = lists.Product();
+const char* const softwareItem =
+    "software|ZEK|Server|version=9.4|date=20261101|language=1033|location=C:\\Dir";
+const char* const productItem =
+    "products|C1|ORX Server|code={1}|version=9.4.0|service_level=SL|modified=20261114";
 
 const Column columns[] = {
-    {"group", 0, 30, PrintMember, "members|@|H\\m", "fff"},
-    {"publisher", 1, 30, PrintSoftware(&CProductInfo::Publisher),
-     "software|ZEK@|Server|version=9.4|date=20261101|language=1033|location=C:\\ZEK", "frr"},
-    {"software", 1, 65, PrintSoftware(&CProductInfo::DisplayName),
-     "software|ZEK|@|version=9.4|date=20261101|language=1033|location=C:\\ZEK", "frr"},
-    {"software version", 1, 20, PrintSoftware(&CProductInfo::DisplayVersion),
-     "software|ZEK|Server|version=@|date=20261101|language=1033|location=C:\\ZEK", "frr"},
-    {"date", 1, 14, PrintSoftware(&CProductInfo::InstallDate),
-     "software|ZEK|Server|version=9.4|date=@|language=1033|location=C:\\ZEK", "frr"},
-    {"location", 1, 99, PrintSoftware(&CProductInfo::InstallLocation),
-     "software|ZEK|Server|version=9.4|date=20261101|language=1033|location=@", "fff"},
-    {"service", 3, 60, PrintService, "services|ORX@|state=The service pause is pending", "fff"},
-    {"profile", 4, 29, PrintProfile("4096"), "profile|C1|@|value=4096", "fff"},
-    {"profile, a colon in the value", 4, 29, PrintProfile("C:\\ZEK"), "profile|C1|@|value=C:\\ZEK",
-     "frr"},
-    {"product", 4, 40, PrintProduct(&CORXProduct::Name),
-     "products|C1|@|code={1}|version=9.4.0|service_level=SL|modified=20261101", "ffr"},
-    {"code", 4, 40, PrintProduct(&CORXProduct::ProductCode),
-     "products|C1|ORX Server|code=@|version=9.4.0|service_level=SL|modified=20261101", "ffr"},
-    {"version", 4, 6, PrintVersion(&CORXVersion::Version),
-     "products|C1|ORX Server|code={1}|version=@.4.0|service_level=SL|modified=20261101", "ffr"},
-    {"service level", 4, 20, PrintVersion(&CORXVersion::ServiceLevel),
-     "products|C1|ORX Server|code={1}|version=9.4.0|service_level=@|modified=20261101", "ffr"},
-    {"modified", 4, 20, PrintProduct(&CORXProduct::LastModifiedDate),
-     "products|C1|ORX Server|code={1}|version=9.4.0|service_level=SL|modified=@", "fff"},
-    {"parameter of an instance", 4, 36, PrintCopy(ChangeInstance),
-     "instance_profile|C1/I1|@|value=5", "frr"},
-    {"parameter of a driver", 5, 30, PrintDriver, "driver_parameters|ZEK ORX|@|value=5", "frr"},
+    {"group", 0, 30, lists.Users.LocalGroups[0], "members|Guests|H\\m", "fff"},
+    {"publisher", 1, 30, software.Publisher, softwareItem, "frrr", "ZEK"},
+    {"software", 1, 65, software.DisplayName, softwareItem, "frrr"},
+    {"software version", 1, 20, software.DisplayVersion, softwareItem, "frrr"},
+    {"date", 1, 14, software.InstallDate, softwareItem, "frrr"},
+    {"location", 1, 99, software.InstallLocation, softwareItem, "fff"},
+    {"service", 3, 60, lists.Services.Services[0].DisplayName,
+     "services|ORX|state=The service pause is pending", "fff", "ORX"},
+    {"profile", 4, 29, lists.Copy().GlobalProfile[0].Name, "profile|C1|LogSize|value=4096", "fff"},
+    {"profile, a colon in the value", 4, 29, lists.Copy().GlobalProfile[1].Name,
+     "profile|C1|Home|value=C:\\ZEK", "frr"},
+    {"product", 4, 40, product.Name, productItem, "ffrr"},
+    {"code", 4, 40, product.ProductCode, productItem, "ffrr"},
+    {"version", 4, 6, product.VersionInfo.Version, productItem, "ffrr"},
+    {"service level", 4, 20, product.VersionInfo.ServiceLevel, productItem, "ffrr"},
+    {"modified", 4, 20, product.LastModifiedDate, productItem, "fff"},
+    {"parameter of an instance", 4, 36, lists.Copy().Instances[0].Parameters[0].Name,
+     "instance_profile|C1/I1|Port|value=5", "frr"},
+    {"parameter of a driver", 5, 30, lists.Drivers.Drivers[0].Parameters[0].Name,
+     "driver_parameters|ZEK ORX|Setup|value=5", "frr"},
 };
 
-std::string Printed(const Column& column, const std::string& value, Padding padding) {
-  return LoggedText([&] {
-    CLogger::GetInstance() << (padding == Padding::kRight ? std::left : std::right);
-    column.Print(value);
-  });
-}
-
-// The text as the line in which the value is, which is the entire row.
+// The line of the text in which the value is.
 std::string RowWith(const std::string& text, const std::string& value) {
   const size_t found = text.rfind(value);
   const size_t begin = text.rfind('\n', found) + 1;
   return text.substr(begin, text.find('\n', found) - begin);
 }
 
-void Check(const Column& column, const std::string& value, char kind, Padding padding) {
-  const std::string text = Printed(column, value, padding);
+void Check(const Column& column, std::string value, char kind, Padding padding) {
+  value.replace(0, column.Beginning.size(), column.Beginning);
+  const std::string old = std::exchange(column.Value, value);
+  const std::string text = LoggedText([&] { lists.Print(column.Part, padding); });
+  column.Value = old;
   const auto items = ReadItems(text, column.Part, padding);
   ASSERT_TRUE(items) << column.Name << '\n' << text;
-  // The first three letters of some values are fixed by a filter.
-  const bool isFiltered = column.Item.find("ZEK@") != std::string::npos ||
-                          column.Item.find("ORX@") != std::string::npos;
-  const std::string rest = value.substr(isFiltered ? 3 : 0);
   const std::string expected =
-      kind == 'f' ? Replaced(column.Item, "@", rest) : '|' + RowWith(text, rest);
+      kind == 'f' ? Replaced(column.Item, old, value) : '|' + RowWith(text, value);
   EXPECT_TRUE(std::any_of(items->begin(), items->end(),
                           [&](const Item& item) {
                             const std::string read = ItemText(item);
@@ -184,26 +161,19 @@ void Check(const Column& column, const std::string& value, char kind, Padding pa
 }
 
 TEST(Items, ReadBackAtEveryWidth) {
-  for (const Column& column : columns) {
+  for (const auto& column : columns) {
+    const std::string rest(column.Width - 1, 'x');
+    const std::string_view kinds = column.Kinds;
     for (const Padding padding : {Padding::kRight, Padding::kLeft}) {
-      for (size_t i = 0; i < 3; ++i) {
-        Check(column, std::string(column.Width + i - 1, 'x'), column.Kinds[i], padding);
-      }
+      Check(column, rest, kinds[0], padding);
+      Check(column, rest + "x", kinds[1], padding);
+      Check(column, rest + "xx", kinds[2], padding);
       Check(column, "xxxxxx", 'f', padding);
     }
-  }
-}
-
-// An overlong value with a blank where its field ends, or where it would begin if it were padded on
-// the left, shifts the columns after it.
-TEST(Items, AreNotReadFromShiftedColumns) {
-  for (const Column& column : columns) {
-    const bool hasMoreColumns = column.Part == 1 || column.Item.starts_with("products");
-    const std::string rest(column.Width - 1, 'x');
-    if (hasMoreColumns && column.Kinds[2] != 'f') {
-      Check(column, rest + " xxxx", 'r', Padding::kRight);
-      Check(column, rest + " x", 'r', Padding::kRight);
-      Check(column, "x x" + rest, 'r', Padding::kLeft);
+    if (kinds.size() == 4) {  // the blank is where the field ends or, padded on the left, begins
+      Check(column, rest + " xxxx", kinds[3], Padding::kRight);
+      Check(column, rest + " x", kinds[3], Padding::kRight);
+      Check(column, "x x" + rest, kinds[3], Padding::kLeft);
     }
   }
 }
