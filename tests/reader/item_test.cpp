@@ -61,25 +61,20 @@ struct Lists {
   // Writes a part of the report, its first rows padded on that side.
   void Print(size_t part, Padding padding) {
     CLogger::GetInstance() << (padding == Padding::kRight ? std::left : std::right);
-    switch (part) {
-      case 0:
-        Users.LocalMembers[0].Group = Users.LocalGroups[0];
-        Users.Print();
-        break;
-      case 1:
-        Software.Print();
-        break;
-      case 3:
-        Services.Print();
-        break;
-      case 4:  // the copies of both generations, of which the first has none
-        SetCopyGeneration(0);
-        CORXProductsList().Print();
-        SetCopyGeneration(1);
-        Copies.Print();
-        break;
-      default:
-        Drivers.Print();
+    if (part == 0) {
+      Users.LocalMembers[0].Group = Users.LocalGroups[0];
+      Users.Print();
+    } else if (part == 1) {
+      Software.Print();
+    } else if (part == 3) {
+      Services.Print();
+    } else if (part == 4) {  // the copies of both generations, of which the first has none
+      SetCopyGeneration(0);
+      CORXProductsList().Print();
+      SetCopyGeneration(1);
+      Copies.Print();
+    } else {
+      Drivers.Print();
     }
   }
 

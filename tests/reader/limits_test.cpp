@@ -45,34 +45,31 @@ struct LimitCase {
   size_t Within;
   size_t Beyond;  // as much more
   size_t EventsBeyond;
-  std::function<std::string(size_t)> HistoryFile;
-  std::function<std::string(size_t)> Report;
+  std::function<std::string(size_t)> HistoryFile;  // null: the one above
+  std::function<std::string(size_t)> Report = {};  // null: the golden one
 };
 
-std::string SameFile(size_t) { return ini; }
-std::string SameReport(size_t) { return GoldenReport(); }
-
 const LimitCase limitCases[] = {
-    {"warning names-limit : ", 8192, 1, 2, LongName, SameReport},
-    {"error names-limit : ", 10240, 1, 2, LongName, SameReport},
+    {"warning names-limit : ", 8192, 1, 2, LongName},
+    {"error names-limit : ", 10240, 1, 2, LongName},
     {"more than 8 MiB", kMostBytesOfHistoryFile, 1, 1,
-     [](size_t size) { return ini + std::string(size - ini.size(), 'x'); }, SameReport},
+     [](size_t size) { return ini + std::string(size - ini.size(), 'x'); }},
     {"more than 500,000 lines", kMostLinesOfHistoryFile, 1, 1,
-     [](size_t lines) { return ini + std::string(lines - 5, '\n'); }, SameReport},
+     [](size_t lines) { return ini + std::string(lines - 5, '\n'); }},
     // The report is one more.
-    {"more than 40,000 events", kMostEvents - 1, 1, kMostEvents, Sections, SameReport},
+    {"more than 40,000 events", kMostEvents - 1, 1, kMostEvents, Sections},
     // Each of these bytes has three in UTF-8.
     {"take more than 16 MiB", kMostBytesOfFacts / 3 - 1000, 1000, 0,
-     [](size_t size) { return ini + "Product=" + std::string(size, '\x80') + "\n"; }, SameReport},
-    {"take more than 4 MiB", kMostBytesOfEvent - 40000, 40000, 1, SameFile,
+     [](size_t size) { return ini + "Product=" + std::string(size, '\x80') + "\n"; }},
+    {"take more than 4 MiB", kMostBytesOfEvent - 40000, 40000, 1, nullptr,
      [](size_t size) { return ReportWith(std::string(size, 'm'), "Copying files\n"); }},
-    {"breaks off", kMostStarts - 1, 1, 1, SameFile,
+    {"breaks off", kMostStarts - 1, 1, 1, nullptr,
      [](size_t runs) {
-       const std::string whole = SameReport(0);
+       const std::string whole = GoldenReport();
        const std::string open = whole.substr(0, whole.find("Copying files\n"));
        return Repeated(runs, Replaced(open, startTime, "20200101 22:00:03")) + whole;
      }},
-    {"cannot be compared", kMostRows - 10, 10, 1, SameFile,
+    {"cannot be compared", kMostRows - 10, 10, 1, nullptr,
      [](size_t rows) {
        return ReportWith(Repeated(rows, "1                  p\n"), "4                  UNK_NAME\n");
      }},
@@ -80,8 +77,9 @@ const LimitCase limitCases[] = {
 
 HistoryOf HistoryWith(const LimitCase& limit, size_t size) {
   const ScratchHistory scratch;
-  scratch.Make("ZEK/ORXHistory/History.ini", limit.HistoryFile(size));
-  scratch.Make("ZEK/ORXHistory/C1/42/ORXInstallEvent.Log", limit.Report(size));
+  scratch.Make("ZEK/ORXHistory/History.ini", limit.HistoryFile ? limit.HistoryFile(size) : ini);
+  scratch.Make("ZEK/ORXHistory/C1/42/ORXInstallEvent.Log",
+               limit.Report ? limit.Report(size) : GoldenReport());
   return HistoryOf(scratch.In("ZEK/ORXHistory"));
 }
 

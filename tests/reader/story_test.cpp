@@ -38,18 +38,15 @@ void SetSoftware(const std::string& key, const std::string& name, const std::str
   Set(software + key + "\\InstallProperties", "Publisher", "ZEK");
 }
 
-void SetProcesses(const std::vector<std::string>& names) {
+void SetProcesses(const std::string& names) {
   static uint32_t next = 100;  // no process has the number of an earlier one
   Machine().ProcessIDs.emplace();
   Machine().Modules.clear();
-  for (const std::string& name : names) {
+  std::istringstream words(names);
+  for (std::string name; words >> name;) {
     Machine().ProcessIDs->push_back(next);
     Machine().Modules[next++] = {name};
   }
-}
-
-void SetState(size_t service, uint32_t state) {
-  Machine().Services.Entries.at(service).CurrentState = state;
 }
 
 struct Step {
@@ -67,13 +64,11 @@ const std::vector<Step> story = {
        SetSoftware("A", "ORX Server", "9.4");
        Machine().Services.Entries.push_back({"p", "ORX Server - Prod", 1});
      }},
-    {{"Start", "Prod", "0"}, [] { SetState(2, 4); }},
+    {{"Start", "Prod", "0"}, [] { Machine().Services.Entries[2].CurrentState = 4; }},
     {{"Configure", "Prod", "0"}, [] { Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "8192"); }},
     {{"Configure", "Prod", "1603"}, [] { Set(copies + "Prod\\PROFILES\\ORX", "Port", "50010"); }},
     {{"Start", "Prod", "0"},
-     [] {
-       SetProcesses({"init", "orxserver", "orxserver", "orxserver", "orxlistener"});
-     }},
+     [] { SetProcesses("init orxserver orxserver orxserver orxlistener"); }},
     {{"Configure", "Prod", "0"},
      [] {
        Machine().LocalGroups[0].second = {"H\\ana"};
@@ -93,11 +88,10 @@ const std::vector<Step> story = {
      }},
     {{"Install", "Test", "0"}, [] { Set(copies + "Test", "", ""); }},
     {{"Verify", "Test", "Nothing to do"},
-     [] {
-       SetProcesses({"orxserver", "init", "orxserver", "orxserver", "orxlistener"});
-     }},
+     [] { SetProcesses("orxserver init orxserver orxserver orxlistener"); }},
     // Of two services with one name one stops: which, nobody can see.
-    {{"Stop", "Test", "Failed (1603), rolled back"}, [] { SetState(0, 1); }},
+    {{"Stop", "Test", "Failed (1603), rolled back"},
+     [] { Machine().Services.Entries[0].CurrentState = 1; }},
     {{"Remove", "Test", "0"}, [] { Remove(copies + "Test"); }},
 };
 
@@ -110,7 +104,7 @@ void SetMachine() {
   SetSoftware("T", "Tools", "1.0");
   // The key above the copies, which the recorder lists as a copy prior to V9.
   Set("SOFTWARE\\ZEK\\ORX", "", "");
-  SetProcesses({"init", "orxserver", "editor"});
+  SetProcesses("init orxserver editor");
 }
 
 TEST(Story, ReadsBackWhatWasDoneAndNothingElse) {
