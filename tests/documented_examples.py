@@ -6,33 +6,38 @@ usage: documented_examples.py PROGRAMS          the sessions of both and the she
        documented_examples.py PROGRAMS --wine   the batch file, with the programs for Windows
 """
 import os
-import pathlib
 import re
 import shutil
 import subprocess
 import sys
 import tempfile
+from pathlib import Path
 
-REPOSITORY = pathlib.Path(__file__).resolve().parent.parent
+sys.path.insert(0, str(Path(__file__).resolve().parents[1] / "scripts"))
+
+from history import REPOSITORY, check  # noqa: E402
+from machine import Machine, check_equal  # noqa: E402
+
 GUIDE = "docs/integrating.md"
 
 
 def blocks(page, language):
     text = (REPOSITORY / page).read_text(encoding="utf-8")
     found = re.findall(rf"^```{language}\n(.*?)^```$", text, re.M | re.S)
-    assert found, f"{page} has no {language} example"
+    check(found, f"{page} has no {language} example")
     return found
 
 
-def check(condition, what, evidence=""):
-    if not condition:
-        sys.exit(f"{what}\n{evidence}")
-
-
-def check_links(_programs, _scratch):
+def check_links(_machine):
     for page in [*REPOSITORY.glob("*.md"), *REPOSITORY.glob("docs/*.md")]:
         for link in re.findall(r"\]\(([^)#:]+)", page.read_text(encoding="utf-8")):
             check((page.parent / link).exists(), f"{page} has a link to {link}")
+
+
+def output_of(machine, *command, code=0, **variables):
+    found, output = machine.run(*command, variables=variables, timeout=600)
+    check(found == code, f"{command} returned {found}, not {code}\n{output.decode()}")
+    return output.decode()
 
 
 def check_recorded(scratch, history, result):
@@ -41,41 +46,35 @@ def check_recorded(scratch, history, result):
     identity = log.stem.removeprefix("setup-")
     keys = (history / "History.ini").read_text().split(f"[{identity}]\n")[1].split("\n[")[0]
     for line in ("Complete_Flag=TRUE", "Copy_Name=Main", f"Result={result}"):
-        check(line in keys.splitlines(), f"Not in the history: {line}", keys)
-    collected = history / "Main" / identity / log.name
-    check(collected.read_text() == log.read_text(), f"Not collected: {collected}")
+        check(line in keys.splitlines(), f"Not in the history: {line}\n{keys}")
+    check_equal((history / "Main" / identity / log.name).read_text(), log.read_text(),
+                "the collected log")
 
 
-def check_shell_script(programs, scratch, status):
-    environment = dict(os.environ, ORX_COMMON_APPDATA=str(scratch))
-    if programs:
-        environment["PATH"] = f"{programs}:{environment['PATH']}"
-    (scratch / "install.sh").write_text(blocks(GUIDE, "sh")[0])
-    setup = scratch / "setup"
+def check_shell_script(machine, status, has_recorder=True):
+    (machine.root / "install.sh").write_text(blocks(GUIDE, "sh")[0])
+    setup = machine.root / "setup"
     setup.write_text(f"#!/bin/sh\necho output of setup\nexit {status}\n")
     setup.chmod(0o755)
-    run = subprocess.run(["sh", "install.sh"], cwd=scratch, env=environment, stderr=subprocess.PIPE)
-    check(run.returncode == status, f"install.sh returned {run.returncode}, not {status}",
-          run.stderr)
-    if programs:
-        subprocess.run([programs / "ORXInstallEventLog", "-report", "history.zip"], cwd=scratch,
-                       env=environment, check=True)
-        check_recorded(scratch, scratch / "ZEK/ORXHistory", status)
+    if not has_recorder:
+        machine.variables["PATH"] = "/usr/bin:/bin"
+    output_of(machine, "sh", "install.sh", code=status)
+    if has_recorder:
+        output_of(machine, "ORXInstallEventLog", "-report", "history.zip")
+        check_recorded(machine.root, machine.history, status)
 
 
-def check_batch_file(programs, scratch, status):
-    wine = str(REPOSITORY / "scripts/wine.sh")
-    shutil.copy(programs / "ORXInstallEventLog.exe", scratch)
-    (scratch / "install.bat").write_text(blocks(GUIDE, "bat")[0], newline="\r\n")
-    setup = f'#include <stdio.h>\nint main() {{ puts("output of setup"); return {status}; }}\n'
-    subprocess.run(["x86_64-w64-mingw32-gcc-posix", "-x", "c", "-", "-o", "setup.exe"], cwd=scratch,
-                   input=setup.encode(), check=True)
-    run = subprocess.run([wine, "cmd", "/c", "install.bat"], cwd=scratch)
-    check(run.returncode == status, f"install.bat returned {run.returncode}, not {status}")
-    subprocess.run([wine, "ORXInstallEventLog.exe", "-report", "history.zip"], cwd=scratch,
-                   check=True)
-    prefix = os.environ.get("WINEPREFIX") or REPOSITORY / "build/wine"
-    check_recorded(scratch, pathlib.Path(prefix) / "drive_c/ProgramData/ZEK/ORXHistory", status)
+def check_batch_file(machine, programs, status):
+    wine = REPOSITORY / "scripts/wine.sh"
+    shutil.copy(programs / "ORXInstallEventLog.exe", machine.root)
+    (machine.root / "install.bat").write_text(blocks(GUIDE, "bat")[0], newline="\r\n")
+    (machine.root / "setup.c").write_text(
+        f'#include <stdio.h>\nint main() {{ puts("output of setup"); return {status}; }}')
+    output_of(machine, "x86_64-w64-mingw32-gcc-posix", "setup.c", "-o", "setup.exe")
+    output_of(machine, wine, "cmd", "/c", "install.bat", code=status)
+    output_of(machine, wine, "ORXInstallEventLog.exe", "-report", "history.zip")
+    prefix = Path(os.environ.get("WINEPREFIX") or REPOSITORY / "build/wine")
+    check_recorded(machine.root, prefix / "drive_c/ProgramData/ZEK/ORXHistory", status)
 
 
 def without_variables(line):
@@ -87,38 +86,34 @@ def without_variables(line):
     return " ".join(line.split())
 
 
-def check_sessions(programs, scratch, page, before):
+def check_sessions(machine, page, before):
     """The sessions of a page, as one: the lines that it shows come in their order."""
     session = f"$ {before}\n" + "".join(blocks(page, "console"))
     steps = re.findall(r"^\$ (.*)\n((?:(?!\$ ).*\n)*)", session, re.M)
-    (scratch / "scripts").symlink_to(REPOSITORY / "scripts")
-    environment = dict(os.environ, PATH=f"{programs}:{os.environ['PATH']}", TMPDIR=str(scratch),
-                       ORX_COMMON_APPDATA=str(scratch))
-    run = subprocess.run(["sh", "-ev"], input="".join(f"{command}\n" for command, _ in steps),
-                         cwd=scratch, env=environment, text=True,
-                         stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
-    check(run.returncode == 0, f"The session of {page} failed", run.stdout)
-    printed = iter([without_variables(line) for line in run.stdout.splitlines()])
-    for command, output in steps:
-        for line in [command, *output.splitlines()]:
-            check(without_variables(line) in printed, f"{command}\nlacks: {line}", run.stdout)
+    (machine.root / "scripts").symlink_to(REPOSITORY / "scripts")
+    (machine.root / "session.sh").write_text("".join(f"{command}\n" for command, _ in steps))
+    output = output_of(machine, "sh", "-ev", "session.sh", TMPDIR=machine.root)
+    printed = iter([without_variables(line) for line in output.splitlines()])
+    for command, shown in steps:
+        for line in [command, *shown.splitlines()]:
+            check(without_variables(line) in printed, f"{command}\nlacks: {line}\n{output}")
 
 
 def main():
-    programs = pathlib.Path(sys.argv[1]).resolve()
+    programs = Path(sys.argv[1]).resolve()
     if "--wine" in sys.argv:
         cases = [(check_batch_file, programs, status) for status in (0, 3)]
     else:
-        cases = [(check_links, None)]
-        cases += [(check_shell_script, programs, status) for status in (0, 3)]
-        cases += [(check_shell_script, None, 0)]
         start = 'ORXInstallEventLog -start 43 -Product "ORX Client 9.5" -Action Install'
-        cases += [(check_sessions, programs, "README.md", ":"),
-                  (check_sessions, programs, GUIDE, start)]
+        cases = [(check_links,), (check_shell_script, 0), (check_shell_script, 3),
+                 (check_shell_script, 0, False), (check_sessions, "README.md", ":"),
+                 (check_sessions, GUIDE, start)]
     for function, *arguments in cases:
-        with tempfile.TemporaryDirectory() as scratch:
-            function(arguments[0], pathlib.Path(scratch), *arguments[1:])
-        print("ok:", function.__name__, *arguments[1:])
+        with tempfile.TemporaryDirectory() as scratch, Machine(root=Path(scratch)) as machine:
+            machine.variables["PATH"] = f"{programs}:{os.environ['PATH']}"
+            machine.options |= {"cwd": scratch, "stderr": subprocess.STDOUT}
+            function(machine, *arguments)
+        print("ok:", function.__name__, *arguments)
 
 
 main()
