@@ -130,11 +130,3 @@ class HistoryModel {
 
   ProfileModel File;
 };
-
-// What is stored of the event's options reads as the model has it.
-inline void CheckGetters(const Event& event, const HistoryModel& model) {
-  for (const OptionModel& option : kOptions) {
-    Require(option.Get == nullptr ||
-            (event.*option.Get)() == model.Read(event.EventID, option.Key));
-  }
-}

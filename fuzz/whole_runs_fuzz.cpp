@@ -1,25 +1,41 @@
 #include <filesystem>
 #include <iostream>
 #include <set>
+#include <utility>
 
 #include "app/install_history.h"
 #include "fuzz/history_model.h"
 #include "history/locations.h"
 #include "platform/path.h"
 #include "tests/support/archive_reader.h"
+#include "tests/support/fake_machine.h"
 #include "tests/support/run_tool.h"
 #include "tests/support/scratch_history.h"
 
 // The command lines of up to four runs over one new history: arguments with a NUL between them,
-// runs with an RS (0x1E). After each run the history file is byte for byte that of the model, the
-// event reads as the model does, and nothing was made outside the history folder, which has a link
-// that leads out.
+// runs with an RS (0x1E). Each event has the fields that the model finds. After each run the
+// history file is byte for byte that of the model, the event reads as the model does, and nothing
+// was made outside the history folder, which has a link that leads out.
 
 namespace {
 
 namespace fs = std::filesystem;
 
 HistoryModel HistoryNow() { return HistoryModel(FileText(GetHistoryFilePath())); }
+
+// What an event has of its command line. A start writes: here there is no folder for it.
+void CheckFields(const CommandLineModel& line, const std::vector<std::string>& words) {
+  const std::string folder = std::exchange(Machine().CommonFolder, "/no/folder");
+  ProgramArguments arguments(words);
+  const Event event(arguments.Count(), arguments.Vector());
+  Require(event.Mode == line.Mode && event.Valid == line.NamesEvent());
+  Require(event.EventFolder == (event.Valid ? JoinPath(GetHistoryDir(), event.EventID) : ""));
+  Require(event.Valid == event.EventLogPath.ends_with("ORXInstallEvent.Log"));
+  for (const OptionModel& option : kOptions) {
+    Require(event.*option.Field == line.Value(option.Key));
+  }
+  Machine().CommonFolder = folder;
+}
 
 // The log of an event whose folder is one, with no link on the way: it cannot fail to be written.
 void CheckLog(const CommandLineModel& line, const std::string& before, const std::string& after) {
@@ -53,6 +69,7 @@ void UpdateModel(HistoryModel& model, const CommandLineModel& line, const std::s
 
 void RunEvent(HistoryModel& model, const std::vector<std::string>& words) {
   const CommandLineModel line(words);
+  CheckFields(line, words);
   const std::string identity = line.Value("Event_ID");
   const std::string folder = JoinPath(GetHistoryDir(), identity);
   const std::string logPath = JoinPath(folder, "ORXInstallEvent.Log");
@@ -66,8 +83,10 @@ void RunEvent(HistoryModel& model, const std::vector<std::string>& words) {
   if (line.NamesEvent() && isFolder && !fs::is_directory(logPath)) {
     CheckLog(line, before, FileText(logPath));
   }
-  const CInstallEvent event(identity);
-  CheckGetters(event, model);
+  const Event event(identity);
+  for (const OptionModel& option : kOptions) {
+    Require(option.Get == nullptr || (event.*option.Get)() == model.Read(identity, option.Key));
+  }
   Require(event.GetCompleteFlag() == model.Read(identity, "Complete_Flag"));
   Require(event.GetEventLogFile() == model.Read(identity, "Event_Log_File"));
 }
