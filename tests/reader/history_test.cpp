@@ -44,13 +44,10 @@ TEST(Events, HaveTheTimesThatExist) {
   }
 }
 
-// The table of services with these names and states.
-std::string Table(const std::vector<std::pair<std::string, std::string>>& services) {
+std::string Table(const std::vector<CServiceInfo>& services) {
   return LoggedText([&services] {
     CServicesList list;
-    for (const auto& [name, state] : services) {
-      list.Services.push_back({"", name, state});
-    }
+    list.Services = services;
     list.Print();
   });
 }
@@ -58,9 +55,9 @@ std::string Table(const std::vector<std::pair<std::string, std::string>>& servic
 // Items of one identity: the equal ones belong together, then the first of each with the other. A
 // text that is no table is not compared.
 TEST(Changes, PairItemsOfOneIdentity) {
-  const std::pair<std::string, std::string> started = {"ORX", "Started"};
-  const std::pair<std::string, std::string> stopped = {"ORX", "Stopped"};
-  const std::pair<std::string, std::string> paused = {"ORX", "Paused"};
+  const CServiceInfo started = {"", "ORX", "Started"};
+  const CServiceInfo stopped = {"", "ORX", "Stopped"};
+  const CServiceInfo paused = {"", "ORX", "Paused"};
   const std::string table = Table({started});
   const std::string stops = "changed services ORX|state Started > Stopped\n";
   const std::tuple<std::string, std::string, std::string> cases[] = {
@@ -69,7 +66,7 @@ TEST(Changes, PairItemsOfOneIdentity) {
       {Table({started, paused}), Table({paused, stopped, stopped}),
        stops + "added services ORX|state - > Stopped\n"},
       {Table({started, started}), table, "removed services ORX|state Started > -\n"},
-      {Table({}), Table({{"b ORX", "Paused"}, {"a ORX", "Paused"}}),
+      {Table({}), Table({{"", "b ORX", "Paused"}, {"", "a ORX", "Paused"}}),
        "added services b ORX|state - > Paused\nadded services a ORX|state - > Paused\n"},
       {table, table.substr(0, table.size() - 1), "not compared"},
       {table, table + "\n", "not compared"},

@@ -9,12 +9,6 @@
 
 namespace {
 
-ArchiveBytes BytesOf(const std::string& bytes) {
-  return {bytes.size(), [bytes](uint64_t offset, char* buffer, size_t size) {
-            return offset < bytes.size() ? bytes.copy(buffer, size, offset) : 0;
-          }};
-}
-
 // The paths and texts of the files, then the findings; or the error.
 std::string Content(const std::unique_ptr<Source>& source, const std::string& error) {
   if (!source) {
@@ -32,9 +26,11 @@ std::string Content(const std::unique_ptr<Source>& source, const std::string& er
 }
 
 std::string ContentOf(const std::string& archive) {
+  const auto read = [&archive](uint64_t offset, char* buffer, size_t size) {
+    return offset < archive.size() ? archive.copy(buffer, size, offset) : 0;
+  };
   std::string error;
-  const std::unique_ptr<Source> source = OpenArchive(BytesOf(archive), error);
-  return Content(source, error);
+  return Content(OpenArchive({archive.size(), read}, error), error);
 }
 
 constexpr uint32_t folder = 0x10;
@@ -165,8 +161,7 @@ TEST(Source, FindsTheHistoryBelowAFolder) {
       {"none", "error: @/none is not there; name an archive or a folder."}};
   for (const auto& [path, found] : cases) {
     std::string error;
-    const std::unique_ptr<Source> source = OpenSource(scratch.In(path), error);
-    EXPECT_EQ(scratch.Neutral(Content(source, error)), found);
+    EXPECT_EQ(scratch.Neutral(Content(OpenSource(scratch.In(path), error), error)), found);
   }
 }
 

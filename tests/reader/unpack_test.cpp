@@ -20,17 +20,12 @@ TEST(Unpack, RestoresAllButWhatIsRefused) {
                                           {"short", "x", 0, 0, 0, 1}}));
   size_t entries = 0;
   const UnpackResult result = UnpackArchive(archive, scratch.In("out"), [&entries] { ++entries; });
-  std::string leftOut;
-  for (const std::string& text : result.LeftOut) {
-    leftOut += text + '\n';
-  }
   EXPECT_TRUE(result.IsDone && result.Restored == 1 && entries == 7);
-  EXPECT_EQ(leftOut,
-            "../up leads out of the folder or is no name here.\n"
-            "A/link is a link.\n"
-            "there is there already.\n"
-            "A/r/below cannot be made: a folder above it is a link or a file.\n"
-            "short is damaged.\n");
+  const std::vector<std::string> leftOut = {
+      "../up leads out of the folder or is no name here.", "A/link is a link.",
+      "there is there already.", "A/r/below cannot be made: a folder above it is a link or a file.",
+      "short is damaged."};
+  EXPECT_EQ(result.LeftOut, leftOut);
   EXPECT_EQ(scratch.Tree(), "a.zip\nout/\nout/A/\nout/A/r\nout/there\n");
   EXPECT_EQ(FileText(scratch.In("out/A/r")) + FileText(scratch.In("out/there")), "xold");
 }
