@@ -37,8 +37,7 @@ class ProfileModel {
   std::vector<std::string_view> SectionNames() const {
     std::vector<std::string_view> names;
     for (const Line& line : Lines) {
-      const std::string_view name = line.Name ? std::string_view(*line.Name) : "";
-      names.push_back(name.substr(0, name.find('\0')));
+      names.emplace_back(line.Name ? line.Name->c_str() : "");  // to its first NUL
     }
     std::erase(names, "");
     return names;
