@@ -20,13 +20,7 @@ const std::string before = report.substr(box, afterBefore - box);
 const std::string ending = report.substr(afterBefore + message.size());
 const std::string changes = Golden("report_changes.txt");
 
-ReportFacts Facts(const char* end = endTime) {
-  ReportFacts facts;
-  facts.Identity = "42";
-  facts.StartTime = startTime;
-  facts.EndTime = end;
-  return facts;
-}
+ReportFacts Facts(const char* end = endTime) { return {"42", startTime, end}; }
 
 std::string MessagesOf(const ReportRun& run) {
   std::string text;
