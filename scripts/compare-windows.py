@@ -43,6 +43,7 @@ class Side(Machine):
         self.root_name = f"{beginning}ProgramData"
         self.separator = beginning[-1]
         self.encoding = encoding
+        self.reader = Machine(*program[:-1], program[-1].with_stem("orxhistory"), root=folder)
         self.options |= {"cwd": self.files, "stdout": subprocess.PIPE, "stderr": subprocess.STDOUT}
 
     def reset(self):
@@ -92,10 +93,26 @@ class Side(Machine):
                              + self.contents(name, data))
         yield from (f"archive: {name}, {entries[name]}" for name in sorted(entries))
 
-    def outcome_of(self, runs):
-        """Makes runs. Returns what they print and leave."""
+    def outcome_of(self, runs, ini=""):
+        """Makes runs, in a history that has such a file. Returns what they print and leave."""
+        self.reset()
+        if ini:
+            self.history.mkdir()
+            self.ini.write_text(ini)
         outputs = [self.output_of(arguments) for arguments in runs]
         return "\n".join([*outputs, *self.tree(), *self.archive()])
+
+    def read_archive(self, folder):
+        """What the reader prints for the archive in the folder."""
+        def read(*arguments):
+            code, output = self.reader.run("--from", "out.zip", *arguments, cwd=folder, timeout=120)
+            return f"{arguments}\n" + output.decode().replace("\r\n", "\n") + f"exit code {code}"
+        listed = read("list", "--json")
+        events = dict.fromkeys(json.loads(line)["event"] for line in listed.split("\n")
+                               if line.startswith("{"))
+        return "\n".join([listed, read("list"), read("check", "--json"),
+                          read("find", "--json", "e"),
+                          *(read("show", "--json", "--", event) for event in events)])
 
 
 def history_lines(text):
@@ -158,21 +175,10 @@ def filled(word):
     return re.sub(r"\{(\d+)-letters\}", lambda m: (string.ascii_lowercase * 240)[:int(m[1])], word)
 
 
-def run_history(side, runs):
-    side.reset()
-    return side.outcome_of(runs)
-
-
-def run_section_names(side):
-    """Reports over files whose section names end below, at and above the limit."""
-    texts = []
-    for last in (227, 228, 229, 900):
-        side.reset()
-        side.history.mkdir()
-        names = ["History", *(letter * 999 for letter in "abcdefghij"), "z" * (last + 2), "after"]
-        side.ini.write_text("".join(f"[{name}]\nAction={len(name)}\n" for name in names))
-        texts.append(side.outcome_of([REPORT]))
-    return "\n".join(texts)
+def ini_with_names(last):
+    """A history file with section names whose length is below, at or above the limit."""
+    names = ["History", *(letter * 999 for letter in "abcdefghij"), "z" * (last + 2), "after"]
+    return "".join(f"[{name}]\nAction={len(name)}\n" for name in names)
 
 
 def run_overlapping(side):
@@ -238,17 +244,14 @@ class Comparison:
         drive = Path(os.environ["WINEPREFIX"]).absolute() / "drive_c"
         self.windows = Side([WINE, windows_program], drive, "C:\\", "cp1252")
         self.linux = Side([linux_program], scratch, f"{scratch}/", "utf-8")
-        self.readers = [Machine(WINE, windows_program.with_name("orxhistory.exe"), root=scratch),
-                        Machine(linux_program.with_name("orxhistory"), root=scratch)]
         self.export = self.linux.history.parent / "Registry.reg"
         self.outcome = Outcome()
         for side in (self.windows, self.linux):
             side.reset()
 
-    def compare(self, name, run, *arguments, machines=None):
+    def compare(self, name, run, *arguments):
         def check_same():
-            windows, linux = (run(machine, *arguments)
-                              for machine in machines or (self.windows, self.linux))
+            windows, linux = (run(side, *arguments) for side in (self.windows, self.linux))
             check_equal(windows, linux, "Windows differs from Linux")
             lines = linux.count("\n") + 1
             print(f"{name:40} same ({lines} lines)", flush=True)
@@ -257,8 +260,7 @@ class Comparison:
     def compare_readers(self):
         """Both builds of the reader over the archives that the last history has left."""
         for system, side in (("Windows", self.windows), ("Linux", self.linux)):
-            self.compare(f"  read, archive of {system}", read_archive, side.files,
-                         machines=self.readers)
+            self.compare(f"  read, archive of {system}", Side.read_archive, side.files)
 
     def load(self, name):
         """Replaces the tool's keys on both systems by those of an export."""
@@ -269,41 +271,31 @@ class Comparison:
         regedit(self.windows, "/S", "load.reg")
 
 
-def read_archive(reader, folder):
-    """What a reader prints for the archive in the folder."""
-    def read(*arguments):
-        code, output = reader.run("--from", "out.zip", *arguments, cwd=folder, timeout=120)
-        return f"{arguments}\n" + output.decode().replace("\r\n", "\n") + f"exit code {code}"
-    listed = read("list", "--json")
-    events = dict.fromkeys(json.loads(line)["event"] for line in listed.split("\n")
-                           if line.startswith("{"))
-    return "\n".join([listed, read("list"), read("check", "--json"), read("find", "--json", "e"),
-                      *(read("show", "--json", "--", event) for event in events)])
-
-
 def main():
     comparison = Comparison(*(Path(word).absolute() for word in sys.argv[1:]))
     histories = read_histories()
     japanese = histories.pop("second bytes like separators")
     comparison.load("sample-machine/Registry.reg")
     write_export(comparison.export, export_registry(comparison.windows))
-    comparison.compare("the sample machine", run_history, histories["a complete event"])
+    comparison.compare("the sample machine", Side.outcome_of, histories["a complete event"])
     comparison.compare_readers()
     # All kinds of values, and texts and names at the limits. In the order of the names, as the
     # registry keeps keys; Wine keeps values so too, Windows in the order of their writing. No path
     # of a key is longer than 260 characters: Wine opens none by the narrow calls, Windows does.
     comparison.load("comparison/Limits.reg")
     for name, runs in histories.items():
-        comparison.compare(name, run_history, runs)
+        comparison.compare(name, Side.outcome_of, runs)
     comparison.compare_readers()
+    for last in (227, 228, 229, 900):  # below, at and above the limit
+        comparison.compare(f"section names, {last}", Side.outcome_of, [REPORT],
+                           ini_with_names(last))
     for name, run in (("links instead of the folders", run_links),
-                      ("section names at the limit", run_section_names),
                       ("overlapping starts", run_overlapping), ("killed starts", run_killed)):
         comparison.compare(name, run)
     # In code page 932 the second byte of 表 is that of a backslash.
     comparison.windows.encoding = "cp932"
     comparison.windows.variables["ORX_LOCALE"] = "ja_JP.UTF-8"
-    comparison.compare("second bytes like separators", run_history, japanese)
+    comparison.compare("second bytes like separators", Side.outcome_of, japanese)
     print(comparison.outcome.summary())
     return 1 if comparison.outcome.failures else 0
 

@@ -74,11 +74,6 @@ def changed(sections, *changes):
     return result
 
 
-def without_times(sections):
-    return {name: {key: TIME.sub("TIME", value) if key.endswith("_Time") else value
-                   for key, value in keys.items()} for name, keys in sections.items()}
-
-
 def archive_entries(path, encoding="utf-8"):
     """The entries of a valid archive in its order: name, zipfile's properties, contents."""
     try:

@@ -121,16 +121,12 @@ class Outcome:
         except Skipped as reason:
             self.skipped += 1
             print(f"skipped {name}: {reason}", flush=True)
-        except Failure as failure:
-            self.note(name, failure)
-        except Exception:  # a case that ends otherwise is no reason to end the others
-            self.note(name, traceback.format_exc(limit=-1))
+        except Exception as error:  # a case that ends otherwise is no reason to end the others
+            self.failures += 1
+            text = error if isinstance(error, Failure) else traceback.format_exc(limit=-1)
+            if self.failures <= 50:
+                print(f"FAILED {name}: {str(text)[:2000]}", flush=True)
         return None
-
-    def note(self, name, failure):
-        self.failures += 1
-        if self.failures <= 50:
-            print(f"FAILED {name}: {str(failure)[:2000]}", flush=True)
 
     def summary(self):
         return (f"{self.attempts - self.skipped - self.failures} held, {self.skipped} skipped, "

@@ -40,12 +40,8 @@ class Point(typing.NamedTuple):
     call: str
     number: int
     fault: str
+    before: tuple  # the command before a run that makes it happen
     text: str = ""  # the call with its arguments
-
-    def is_repeated(self):
-        """Whether the program repeats the call when it is interrupted. A library opens and writes
-        the archive, and does not."""
-        return self.call not in ("openat", "write") or "/archives/" not in self.text
 
 
 class Scenario(typing.NamedTuple):
@@ -127,7 +123,9 @@ class ScenarioMachine(Target):
         }
 
     def state(self):
-        return history.without_times(self.sections()) if self.ini.exists() else {}
+        if not self.ini.exists():
+            return {}
+        return history.parse_history(comparable(self.ini.read_bytes()).encode())
 
     def begin(self, scenario):
         shutil.rmtree(self.root)
@@ -166,27 +164,21 @@ class ScenarioMachine(Target):
                 faults += ["EIO", "EINTR"] if writes or call in OPENING | READING else []
                 faults += ["ENOSPC"] if writes else []
             for fault in faults:
-                yield Point(run, call, number, fault, text)
+                effect = "signal=SIGKILL" if fault == "kill" else f"error={fault}"
+                yield Point(run, call, number, fault,
+                            injecting(call, f"{effect}:when={number}"), text)
         file = self.scratch / self.scenarios[run].base / history.HISTORY / "History.ini"
         length = file.stat().st_size if file.exists() else 0
         for size in sorted({0, 1, 17, *range(100, length + 1500, 150)}):
-            yield Point(run, "size", size, "EFBIG")
-
-    def disturb(self, point, arguments):
-        """Makes the run with the point's fault; returns its exit code and output."""
-        fault = "signal=SIGKILL" if point.fault == "kill" else f"error={point.fault}"
-        before = injecting(point.call, f"{fault}:when={point.number}")
-        if point.call == "size":
             # The write up to the size is done, and the next one fails. The signal that the system
             # sends then ends every program that does not expect it.
-            before = ("prlimit", "--core=0", f"--fsize={point.number}")
-        return self.run(*arguments, before=before)
+            yield Point(run, "size", size, "EFBIG", ("prlimit", "--core=0", f"--fsize={size}"))
 
     def check_point(self, point):
         scenario = self.scenarios[point.run]
         self.begin(scenario)
         old = self.state()
-        self.check_code(point, *self.disturb(point, scenario.arguments))
+        self.check_code(point, *self.run(*scenario.arguments, before=point.before))
         new = self.state()
         allowed = scenario.killed_states if point.fault == "kill" else scenario.failed_states
         check(new in allowed(old), f"history {difference(new, old)}")
@@ -197,7 +189,9 @@ class ScenarioMachine(Target):
                   "log lost its beginning")
         if not self.is_older_archive():
             self.packed()
-        if point.fault == "EINTR" and point.is_repeated():
+        # A library opens and writes the archive, and does not repeat that.
+        is_library = point.call in ("openat", "write") and "/archives/" in point.text
+        if point.fault == "EINTR" and not is_library:
             check_equal(self.snapshot(), self.undisturbed[point.run], "lost")
         self.check_next_runs(point.run, scenario, new)
 
