@@ -32,16 +32,16 @@ CHROMIUM = ["chromium", "--headless", "--no-sandbox", "--disable-gpu", "--disabl
 
 
 class Page(html.parser.HTMLParser):
-    """What the browser made of the page: its elements with their attributes, and its text."""
+    """What the browser made of the page: its elements, their attributes, and its text."""
 
     def __init__(self, dom):
         super().__init__()
-        self.elements = []
-        self.text = ""
+        self.tags, self.attributes, self.text = [], [], ""
         self.feed(dom)
 
     def handle_starttag(self, tag, attrs):
-        self.elements.append((tag, attrs))
+        self.tags.append(tag)
+        self.attributes += attrs
 
     def handle_data(self, data):
         self.text += data
@@ -76,13 +76,12 @@ def browse(machine, address):
 
 def faults_of(address, dom, requests, names):
     page = Page(dom)
-    attributes = [attribute for _, attributes in page.elements for attribute in attributes]
-    targets = {f"#{value}" for name, value in attributes if name == "id"}
-    faults = [f"an element {tag}" for tag, _ in page.elements
+    targets = {f"#{value}" for name, value in page.attributes if name == "id"}
+    faults = [f"an element {tag}" for tag in page.tags
               if tag in ("script", "img", "link", "iframe", "object", "form", "base")]
-    faults += [f"an attribute {name}" for name, _ in attributes
+    faults += [f"an attribute {name}" for name, _ in page.attributes
                if name.startswith("on") or name in ("src", "srcset", "action", "style")]
-    faults += [f"a link to {value}" for name, value in attributes
+    faults += [f"a link to {value}" for name, value in page.attributes
                if name == "href" and value not in targets]
     faults += [f"fetched {url}" for url in requests if url != address]
     faults += [f"not shown: {name!r}" for name in names if page.text.count(shown(name)) < 3]

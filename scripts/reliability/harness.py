@@ -16,6 +16,7 @@ from history import check
 from machine import Machine, Skipped, check_equal, shown
 
 MARKER = b"what is outside stays outside"
+OLDER = b"an older archive"
 NOBODY = 65534
 AS_NOBODY = {"user": NOBODY, "group": NOBODY, "extra_groups": []}  # options of a run
 

@@ -16,7 +16,7 @@ import signal
 import typing
 
 import history
-from harness import Case, Target, injecting, sample
+from harness import OLDER, Case, Target, injecting, sample
 from history import check
 from machine import check_equal, contents, difference
 
@@ -29,8 +29,6 @@ WRITING = {"creat", "write", "writev", "pwrite64", "pwritev", "rename", "renamea
 OPENING = {"open", "openat"}
 READING = {"read", "pread64", "lseek", "stat", "lstat", "fstat", "newfstatat", "statx", "access",
            "faccessat", "faccessat2", "getdents64"}
-
-OLDER_ARCHIVE = b"an older archive"
 
 
 class Point(typing.NamedTuple):
@@ -130,12 +128,12 @@ class ScenarioMachine(Target):
     def begin(self, scenario):
         shutil.rmtree(self.root)
         shutil.copytree(self.scratch / scenario.base, self.root)
-        self.archive.write_bytes(OLDER_ARCHIVE)
+        self.archive.write_bytes(OLDER)
         for file in self.archives.glob(".*"):  # of a run that was killed
             file.unlink()
 
     def is_older_archive(self):
-        return self.archive.read_bytes() == OLDER_ARCHIVE
+        return self.archive.read_bytes() == OLDER
 
     def trace_calls(self, run):
         """The calls of an undisturbed run with their numbers, from its first access to the history

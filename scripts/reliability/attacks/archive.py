@@ -7,11 +7,9 @@ import subprocess
 import time
 
 import history
-from harness import RUNS, attack, injecting, require_root, wait_for
+from harness import OLDER, RUNS, attack, injecting, require_root, wait_for
 from history import check
 from planted import KINDS
-
-OLDER = b"an older archive"
 
 
 def failing_report(machine, path, **options):

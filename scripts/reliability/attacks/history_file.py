@@ -1,4 +1,4 @@
-"""The history file: who may read it, who holds its lock, what the file system refuses."""
+"""The history file: its readers, its lock, what the file system refuses, a full disk."""
 
 import fcntl
 import os
@@ -8,6 +8,35 @@ import time
 
 from harness import attack, injecting
 from history import check
+
+
+@attack()
+def full_disk(machine):
+    """A small file system with less and less space left."""
+    machine.mount(machine.root, "512k")
+    machine.history.mkdir(parents=True)
+    machine.watch()
+    machine.must("-start", "7")
+    filler, archive = machine.root / "filler", machine.root / "full.zip"
+    for left in (0, 4096, 8192, 12288, 20480, 65536):
+        filler.unlink(missing_ok=True)
+        status = os.statvfs(machine.root)
+        filler.write_bytes(bytes(max(status.f_bavail * status.f_bsize - left, 0)))
+        old = machine.sections()
+        for arguments in (
+                ("-start", f"new{left}"), ("-logmessage", "7", "-message", "m" * 9000),
+                ("-report", str(archive)), ("-end", "7"), ("-report", str(machine.archive))):
+            check(machine.run(*arguments)[0] in (0, 3), f"exit code: {arguments}")
+            new = machine.sections()
+            check(set(old) <= set(new), "lost a section")
+            old = new
+        machine.packed()
+    filler.unlink()
+    archive.unlink(missing_ok=True)
+    count = machine.count()
+    machine.must("-start", "after")
+    check(machine.count() == count + 1, "does not recover")
+    machine.watch()
 
 
 @attack("fchown", "fchmod")
@@ -59,7 +88,8 @@ def lock_that_is_never_freed(machine):
 @attack(("first start", "-start", "7"), ("start", "-start", "9"), ("restart", "-start", "8"),
         ("end", "-end", "8", "-CopyName", "C1"))
 def one_replacement(machine, *arguments):
-    """An end makes another one, for the log's new path. Windows moves no folder with an open log."""
+    """And one for a log's new path, after the move of its folder: Windows moves none with an open
+    file."""
     if arguments != ("-start", "7"):
         machine.must("-start", "8")
     trace = machine.scratch / "trace"
