@@ -68,20 +68,17 @@ class Round:
             self.run("-logmessage", log, "-message", f"^{event} {text}$")
         copy = f"C{random.randrange(COPIES)}"
         self.run("-end", event, "-CopyName", copy, "-Result", f"R{event}")
-        if random.random() < 0.1:
-            self.report(self.machine.scratch / f"{event}.zip")
+        archive = self.machine.scratch / f"{event}.zip"
+        if random.random() < 0.1 and self.run("-report", str(archive)):
+            entries = history.read_archive(archive)
+            history.parse_history(entries["History.ini"], self.has_locks)
+            archive.unlink()
 
     def replace_history(self):
         """What replaces the history file, and nothing else, so as often as possible."""
         event = f"event{next(self.numbers)}"
         self.run("-start", event)
         self.run("-end", event, "-CopyName", "C")
-
-    def report(self, archive):
-        if self.run("-report", str(archive)):
-            entries = history.read_archive(archive)
-            history.parse_history(entries["History.ini"], self.has_locks)
-            archive.unlink()
 
     def message_during_start(self):
         """A run appends a message while the start still writes the log."""

@@ -46,7 +46,6 @@ def foreign_history(machine):
     require_root()
     os.chown(machine.history, NOBODY, NOBODY)
     os.chmod(machine.archives, 0o777)
-    machine.watch()
     machine.must("-start", "first", **AS_NOBODY)
     os.chmod(machine.ini, 0o640)
     for arguments in RUNS:
