@@ -24,9 +24,9 @@ from machine import Machine, Outcome, check_equal, contents
 
 WINE = REPOSITORY / "scripts/wine.sh"
 HISTORIES = REPOSITORY / "scripts/comparison/histories.txt"
-SOFTWARE = "HKEY_LOCAL_MACHINE\\SOFTWARE\\"
+SOFTWARE = "HKEY_LOCAL_MACHINE\\SOFTWARE"
 PRODUCTS = "Microsoft\\Windows\\CurrentVersion\\Installer\\UserData\\S-1-5-18\\Products"
-TOOL_KEYS = [SOFTWARE + "ZEK", SOFTWARE + "ODBC\\ODBCINST.INI", SOFTWARE + PRODUCTS]
+TOOL_KEYS = [f"{SOFTWARE}\\{key}" for key in ("ZEK", "ODBC\\ODBCINST.INI", PRODUCTS)]
 REPORT = ["-report", "{files}/out.zip"]
 INSTALLER_FILES = ("setup.log", "sub/setup.log", "setup.rsp", "setup.trc", "ORXInstallEvent.Log",
                    "予定表.log", "表/予定表.log")
@@ -129,30 +129,6 @@ def without_machine(report):
     # The rows are between the rule below the head of a table and the next rule.
     return re.sub(r"(?m)^((?:Group Name|Group   |Process ID|Service Name) .*\n-----.*\n)"
                   r"(?:(?!-----).*\n)*", r"\1", report)
-
-
-# --- The registry ---
-
-
-def regedit(side, option, name, *arguments):
-    """Runs it on a file of the installer's folder; a path of Linux would look like an option."""
-    path = side.files_name + side.separator + name
-    subprocess.run([WINE, "regedit", option, path, *arguments], check=True)
-
-
-def write_export(path, text):
-    """In the encoding that Windows knows."""
-    path.write_text(text, "utf-16", newline="\r\n")
-
-
-def export_registry(side):
-    """The tool's keys as the registry orders them."""
-    text = ""
-    for key in TOOL_KEYS:
-        regedit(side, "/E", "part.reg", key)
-        header, keys = (side.files / "part.reg").read_text("utf-16").split("\n", 1)
-        text = (text or f"{header}\n") + f"{keys}\n"
-    return text
 
 
 # --- The histories ---
@@ -262,13 +238,23 @@ class Comparison:
         for system, side in (("Windows", self.windows), ("Linux", self.linux)):
             self.compare(f"  read, archive of {system}", Side.read_archive, side.files)
 
+    def regedit(self, option, name, *arguments):
+        """On a file of the installer's folder: a path of Linux would look like an option."""
+        path = self.windows.files_name + self.windows.separator + name
+        subprocess.run([WINE, "regedit", option, path, *arguments], check=True)
+
     def load(self, name):
         """Replaces the tool's keys on both systems by those of an export."""
         header, keys = (REPOSITORY / "scripts" / name).read_text("utf-8").split("\n", 1)
-        write_export(self.export, f"{header}\n{keys}")
         removed = "".join(f"\n[-{key}]\n" for key in TOOL_KEYS)
-        write_export(self.windows.files / "load.reg", f"{header}\n{removed}{keys}")
-        regedit(self.windows, "/S", "load.reg")
+        for path, text in ((self.export, keys), (self.windows.files / "load.reg", removed + keys)):
+            path.write_text(f"{header}\n{text}", "utf-16", newline="\r\n")
+        self.regedit("/S", "load.reg")
+
+    def load_from_windows(self):
+        """Gives Linux the keys of the registry, in its order."""
+        self.regedit("/E", "registry.reg", SOFTWARE)
+        shutil.move(self.windows.files / "registry.reg", self.export)
 
 
 def main():
@@ -276,7 +262,7 @@ def main():
     histories = read_histories()
     japanese = histories.pop("second bytes like separators")
     comparison.load("sample-machine/Registry.reg")
-    write_export(comparison.export, export_registry(comparison.windows))
+    comparison.load_from_windows()
     comparison.compare("the sample machine", Side.outcome_of, histories["a complete event"])
     comparison.compare_readers()
     # All kinds of values, and texts and names at the limits. In the order of the names, as the
