@@ -135,7 +135,7 @@ TEST(History, HasWhatWentWrongInTheCalls) {
 }
 
 // The facts as the history file has them: names without case, the first of two, no quotation marks;
-// bytes beyond UTF-8; a report in which the tool left none.
+// bytes beyond UTF-8; a report, of Windows by its path, in which the tool left none.
 TEST(History, IsReadFromFilesEditedByHand) {
   const ScratchHistory scratch;
   scratch.Make("ZEK/ORXHistory/History.ini",
@@ -145,11 +145,13 @@ TEST(History, IsReadFromFilesEditedByHand) {
                "Product=\"ORX\tServer\"\r\nResult=\x01\x7F\xE2\x82\xAC\r\nCopy_Name=C1\r\n"
                "[b\xFChne \"1\"]\r\nEvent_ID=second\r\n"
                "[late]\r\nEvent_ID=late\r\nStart_Time=\r\n"
-               "[early]\r\nStart_Time=20261114 22:00:02\r\n");
+               "[early]\r\nStart_Time=20261114 22:00:02\r\n"
+               "Event_Log_File=D:\\Data\\zek\\ORXHISTORY\\c1\\EARLY\\x.Log\r\n");
+  scratch.Make("ZEK/ORXHistory/C1/early/X.log");
   const HistoryOf history(scratch.In("ZEK/ORXHistory"));
   std::string lines;
   for (const Event& event : history.Result.Events) {
-    lines += EventJson("s", event) + '\n';
+    lines += EventJson("s", event) + " report " + event.Report.value_or("-") + '\n';
   }
   EXPECT_EQ(lines, Golden("edited_events.txt"));
 }

@@ -122,6 +122,22 @@ TEST(Report, TakesNoMessageForABlock) {
   }
 }
 
+// Rows, and no other line, can be missing from a part.
+TEST(Report, IsNotReadWithoutALineOfATable) {
+  const Snapshot snapshot = ParseReport(report, Facts()).front().Before.value();
+  std::vector<size_t> rows;
+  for (size_t part = 0; part < kSnapshotParts; ++part) {
+    const std::string text(*snapshot.Parts[part]);
+    rows.push_back(0);
+    for (size_t begin = 0, end = 0; begin < text.size(); begin = end) {
+      end = text.find('\n', begin) + 1;
+      const std::string rest = text.substr(0, begin) + text.substr(end);
+      rows.back() += ReadItems(rest, part, PaddingOfPart(snapshot, part)) ? 1 : 0;
+    }
+  }
+  EXPECT_EQ(rows, (std::vector<size_t>{14, 4, 2, 11, 9, 0}));
+}
+
 // A second end that finds the report moved has changed the time in the history file alone.
 TEST(Report, HasTheEndAndTheMessagesThatItsFactsAllow) {
   const std::string broken = "broken from 20261114 22:00:03 to ";

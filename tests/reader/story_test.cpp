@@ -8,7 +8,9 @@
 #include <functional>
 
 #include "app/install_history.h"
+#include "reader/event_text.h"
 #include "reader/json.h"
+#include "reader/views.h"
 #include "tests/reader/history_text.h"
 #include "tests/support/fake_machine.h"
 #include "tests/support/run_tool.h"
@@ -125,15 +127,18 @@ TEST(Story, ReadsBackWhatWasDoneAndNothingElse) {
   const HistoryOf history(archive);
   ASSERT_EQ(history.Result.Events.size(), story.size());
   std::string changes;
+  std::string shown;
   for (size_t i = 0; i < story.size(); ++i) {
     const Event& event = history.Result.Events[i];
     for (const Change& change : event.Differences.List) {
       changes += ChangeJson("story.zip", event, change) + '\n';
     }
+    shown += TitleOf(event) + '\n' + DifferencesText(event, {}) + '\n';
     EXPECT_EQ(event.Messages, std::string("Message of ") + story[i].Call[0] + '\n');
     EXPECT_EQ(event.Computer, "ORXHOST");
   }
   EXPECT_EQ(changes, Golden("story_changes.txt"));
+  EXPECT_EQ(shown, Golden("story_shown.txt"));
   EXPECT_EQ(history.Findings(), "");
 }
 
