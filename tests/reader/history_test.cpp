@@ -65,6 +65,7 @@ TEST(Changes, PairItemsOfOneIdentity) {
       {Table({started, started}), Table({stopped, started}), stops},
       {Table({started, paused}), Table({paused, stopped, stopped}),
        stops + "added services ORX|state - > Stopped\n"},
+      {table, Table({stopped, paused}), stops + "added services ORX|state - > Paused\n"},
       {Table({started, started}), table, "removed services ORX|state Started > -\n"},
       {Table({}), Table({{"", "b ORX", "Paused"}, {"", "a ORX", "Paused"}}),
        "added services b ORX|state - > Paused\nadded services a ORX|state - > Paused\n"},

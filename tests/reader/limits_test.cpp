@@ -50,8 +50,10 @@ struct LimitCase {
 };
 
 const LimitCase limitCases[] = {
-    {"warning names-limit : ", 8192, 1, 2, LongName},
-    {"error names-limit : ", 10240, 1, 2, LongName},
+    {"warning names-limit : the list of section names has 8193 of 10240 bytes: beyond", 8192, 1, 2,
+     LongName},
+    {"error names-limit : the list of section names has 10241 of 10240 bytes: the", 10240, 1, 2,
+     LongName},
     {"more than 8 MiB", kMostBytesOfHistoryFile, 1, 1,
      [](size_t size) { return ini + std::string(size - ini.size(), 'x'); }},
     {"more than 500,000 lines", kMostLinesOfHistoryFile, 1, 1,
