@@ -131,13 +131,6 @@ const Column columns[] = {
      "driver_parameters|ZEK ORX|Setup|value=5", "frr"},
 };
 
-// The line of the text in which the value is.
-std::string RowWith(const std::string& text, const std::string& value) {
-  const size_t found = text.rfind(value);
-  const size_t begin = text.rfind('\n', found) + 1;
-  return text.substr(begin, text.find('\n', found) - begin);
-}
-
 void Check(const Column& column, std::string value, char kind, Padding padding) {
   value.replace(0, column.Beginning.size(), column.Beginning);
   const std::string old = std::exchange(column.Value, value);
@@ -145,13 +138,14 @@ void Check(const Column& column, std::string value, char kind, Padding padding) 
   column.Value = old;
   const auto items = ReadItems(text, column.Part, padding);
   ASSERT_TRUE(items) << column.Name << '\n' << text;
-  const std::string expected =
-      kind == 'f' ? Replaced(column.Item, old, value) : '|' + RowWith(text, value);
-  EXPECT_TRUE(std::any_of(items->begin(), items->end(),
-                          [&](const Item& item) {
-                            const std::string read = ItemText(item);
-                            return kind == 'f' ? read == expected : read.ends_with(expected);
-                          }))
+  const std::string expected = Replaced(column.Item, old, value);
+  const auto isExpected = [&](const Item& item) {
+    const std::string name(item.Name);
+    const bool isRow = item.FieldCount == 0 && name.find(value) != name.npos &&
+                       text.find('\n' + name + '\n') != text.npos;
+    return kind == 'f' ? ItemText(item) == expected : isRow;
+  };
+  EXPECT_TRUE(std::any_of(items->begin(), items->end(), isExpected))
       << column.Name << ' ' << value.size() << "\n expected: " << expected << "\n in: " << text;
 }
 
