@@ -1,7 +1,6 @@
 // Files and folders under their paths, and the classes that open files.
 
 #include <chrono>
-#include <ctime>
 #include <fstream>
 #include <set>
 #include <tuple>
@@ -97,19 +96,6 @@ TEST_F(Files, AreListedWithTheirProperties) {
   EXPECT_EQ(ListFolder(In("folder")).size(), 2U);
   EXPECT_TRUE(ListFolder(In("none")).empty() && ListFolder(In("plain")).empty());
   fs::permissions(In("fixed"), fs::perms::owner_all);
-}
-
-TEST_F(Files, HaveTheTimeOfTheirLastWrite) {
-  const std::time_t seconds = 1'000'000'000;
-  const auto time = std::chrono::system_clock::from_time_t(seconds);
-  fs::last_write_time(Make("file", "x"), std::chrono::file_clock::from_sys(time));
-  const CalendarTime written = LastWriteTime(In("file")).value();
-  const tm* expected = std::localtime(&seconds);
-  EXPECT_EQ(std::tuple(written.Year - 1900, written.Month - 1, written.Day, written.Hour,
-                       written.Minute, written.Second),
-            std::tuple(expected->tm_year, expected->tm_mon, expected->tm_mday, expected->tm_hour,
-                       expected->tm_min, expected->tm_sec));
-  EXPECT_GT(LastWriteTime(Root).value().Year, 2001);
 }
 
 const fs::perms owners = fs::perms::owner_read | fs::perms::owner_write;
