@@ -81,16 +81,19 @@ const std::vector<Step> story = {
      [] {
        Set(drivers + "ODBC Drivers", "ZEK ORX", "Installed");
        Set(drivers + "ZEK ORX", "Driver", "C:\\ZEK\\orx.dll");
+       SetProcesses("init orxserver orxserver orxserver orxlistener svchost.exe");
      }},
     {{"Upgrade", "Prod", "Successful"},
      [] {
        SetSoftware("A", "ORX Server", "9.5");
+       SetSoftware("B", "Of thirty with maker's", "1.0");
+       SetSoftware("C", "Longer than the column of other names", "1.0");
        Remove(software + "T");
        Set(copies + "Prod\\ORX Server\\CurrentVersion", "Version", "10");
      }},
     {{"Install", "Test", "0"}, [] { Set(copies + "Test", "", ""); }},
     {{"Verify", "Test", "Nothing to do"},
-     [] { SetProcesses("orxserver init orxserver orxserver orxlistener"); }},
+     [] { SetProcesses("orxserver svchost.exe init orxserver orxserver orxlistener"); }},
     // Of two services with one name one stops: which, nobody can see.
     {{"Stop", "Test", "Failed (1603), rolled back"},
      [] { Machine().Services.Entries[0].CurrentState = 1; }},

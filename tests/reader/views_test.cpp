@@ -7,7 +7,6 @@
 #include <tuple>
 
 #include "reader/event_text.h"
-#include "reader/hits.h"
 
 namespace {
 
@@ -50,43 +49,6 @@ TEST(Views, FitAListIntoTheTerminal) {
     const std::string text = ListText({&event}, {static_cast<size_t>(width)});
     EXPECT_NE(text.find(begin + rest), text.npos) << text;
   }
-}
-
-TEST(Views, ShowChangesInOrderAndValuesInOneColumn) {
-  Event event;
-  event.HasBefore = event.HasAfter = true;
-  event.Differences.Compared.fill(true);
-  const auto change = [&event](Section section, const std::string& name) {
-    event.Differences.List.push_back(
-        {ChangeKind::kChanged, section, {}, name, {{"value", "1", "2"}}});
-  };
-  change(Section::kProcesses, "orxserver");
-  change(Section::kProcesses, "svchost.exe");
-  change(Section::kServices, std::string(30, 's'));
-  change(Section::kServices, std::string(41, 's'));
-  change(Section::kDrivers, "d");
-  const std::string column(29, ' ');
-  const std::string text = DifferencesText(event, {});
-  EXPECT_TRUE(text.starts_with("services\n  " + std::string(30, 's') + "  1 -> 2\n  " +
-                               std::string(41, 's') + "  1 -> 2\ndrivers\n  d" + column +
-                               "  1 -> 2\nprocesses\n  orxserver" + column.substr(8) +
-                               "  1 -> 2\n  1 other name (--all shows it)\n"))
-      << text;
-}
-
-TEST(Views, FindAPartOfAnEvent) {
-  Event event;
-  event.Action = "Install";
-  event.Files = {{"Log_File_Name", "C:\\Temp\\Setup.log", "Setup.log"}};
-  event.Messages = "setup runs\nother\n";
-  event.Differences.List = {{ChangeKind::kAdded, Section::kGroups, {}, "SETUP users", {}}};
-  std::string found;
-  ForEachHit(event, "setup", [&found](const Hit& hit) {
-    found.append(hit.Kind).append(" ").append(hit.Name).append(": ").append(hit.Text).append("\n");
-  });
-  EXPECT_EQ(found,
-            "fact Log_File_Name: C:\\Temp\\Setup.log\nmessage : setup runs\n"
-            "change groups: groups: SETUP users added\n");
 }
 
 }  // namespace
