@@ -85,25 +85,6 @@ TEST_F(Run, AcceptsAnyHistoryFile) {
   }
 }
 
-// A script that prepares the history folder before a run, and a condition that holds after it.
-TEST_F(Run, DoesNotTouchSpecialFiles) {
-  const char* cases[][2] = {
-      {"mkdir -p History.ini/inside", "test -d History.ini/inside"},
-      {"echo '[Other]' >other; ln -s other History.ini",
-       "test -h History.ini -a $(cat other) = '[Other]'"},
-      {"mkfifo History.ini", "test -p History.ini"},
-      {"mkdir 1; ln -s ../../../new 1/ORXInstallEvent.Log", "test ! -e ../../new"},
-      {"ln -s ../../new Summary.txt", "test ! -e ../../new"},
-      {"mkfifo Summary.txt stray", "test -p Summary.txt -a -p stray"},
-      {"mkdir ../../out; touch ../../out/far; ln -s ../../out .", "! grep -q far ../../a.zip"},
-      {"mkdir -p C/l ../../out/7; ln -s ../../out l", "test -d ../../out/7"}};
-  for (const auto& [before, after] : cases) {
-    EXPECT_EQ(Shell("cd ZEK/ORXHistory; rm -rf *; " + std::string(before)), 0);
-    EXPECT_EQ(Call("-start 1") + Call("-end l/7 -CopyName C") + Call("-report a.zip"), 0);
-    EXPECT_EQ(Shell("cd ZEK/ORXHistory; " + std::string(after)), 0) << after;
-  }
-}
-
 // More entries than other programs can read are left out: then the archive is not complete.
 TEST_F(Run, FailsWhenTheArchiveIsFull) {
   EXPECT_EQ(Shell("memory=$(mktemp -d -p /dev/shm);"  // as so many files take long on a disk

@@ -18,8 +18,11 @@ LONG = "v" * 65536
 @attack()
 def hostile_names(machine):
     """Each as an identity and as a copy's name; then the history must still be in order."""
+    (machine.outside / "folder" / "inside").mkdir()
+    machine.watch()
     os.symlink(machine.outside / "folder", machine.history / "linked")
-    names = (*HOSTILE, "linked", "linked/new", str(machine.outside), str(machine.outside / "new"))
+    names = (*HOSTILE, "linked", "linked/new", "linked/inside", str(machine.outside),
+             str(machine.outside / "new"))
     for number, name in enumerate(names):
         event = f"event{number}"
         machine.run_checked("-start", name, "-Path", PATH, "-Command", LONG)
