@@ -39,8 +39,16 @@ TEST(Commands, PrintWhatTheGoldenSessionShows) {
   scratch.Make("ZEK/ORXHistory/C1/42/ORXInstallEvent.Log",
                Replaced(GoldenReport(), "Copying files\n", "Copying files\nSetting up\n"));
   scratch.Make("ZEK/ORXHistory/C1/42/orx.log");
-  const std::string ini = "[7]\nEnd_Time=20261114 22:41:55\nResult=0\n";
-  scratch.Make("a.zip", BuildArchive({{"History.ini", ini}, {"../up", ""}}));
+  scratch.Make("a.zip",
+               BuildArchive({{"History.ini", "[7]\nEnd_Time=20261114 22:41:55\nResult=0\n"},
+                             {"A", "", 0x10},
+                             {"A/r", "x", 0, 0, 8},
+                             {"../up", "x"},
+                             {"A/link", "/etc/passwd", 0xA1FFU << 16},
+                             {"there", "new"},
+                             {"A/r/below", "x"},
+                             {"short", "x", 0, 0, 0, 1}}));
+  scratch.Make("out/there", "old");
   const std::filesystem::path before = std::filesystem::current_path();
   std::filesystem::current_path(scratch.Root);
   const std::string golden = Golden("reader_session.txt");
@@ -54,7 +62,10 @@ TEST(Commands, PrintWhatTheGoldenSessionShows) {
   std::filesystem::current_path(before);
   EXPECT_EQ(session, golden);
   EXPECT_TRUE(FileText(scratch.In("page.html")).starts_with("<!DOCTYPE html>"));
-  EXPECT_EQ(FileText(scratch.In("out/History.ini")), ini);
+  const std::string tree = scratch.Tree();
+  EXPECT_EQ(tree.substr(tree.find("a.zip")),
+            "a.zip\nout/\nout/A/\nout/A/r\nout/History.ini\nout/there\npage.html\n");
+  EXPECT_EQ(FileText(scratch.In("out/A/r")) + FileText(scratch.In("out/there")), "xold");
 }
 
 }  // namespace

@@ -7,6 +7,7 @@
 #include <tuple>
 
 #include "reader/event_text.h"
+#include "reader/text_encoding.h"
 
 namespace {
 
@@ -48,6 +49,18 @@ TEST(Views, FitAListIntoTheTerminal) {
         std::pair(20, "ORX Ser…  Product…  -        1007 of…\n")}) {
     const std::string text = ListText({&event}, {static_cast<size_t>(width)});
     EXPECT_NE(text.find(begin + rest), text.npos) << text;
+  }
+}
+
+TEST(Views, KnowWellFormedUtf8) {
+  for (const char* text : {"", "a\x7F", "\xC2\x80", "\xDF\xBF", "\xE0\xA0\x80", "\xED\x9F\xBF",
+                           "\xEF\xBF\xBF", "\xF0\x90\x80\x80", "\xF4\x8F\xBF\xBF"}) {
+    EXPECT_TRUE(IsUtf8(text)) << text;
+  }
+  for (const char* text :
+       {"\x80", "\xC1\xBF", "\xC2", "\xC2z", "\xE0\x9F\xBF", "\xED\xA0\x80", "\xE2\x82",
+        "\xE2\x82z", "\xF0\x8F\xBF\xBF", "\xF0\x90\x80", "\xF4\x90\x80\x80", "\xF5\x80\x80\x80"}) {
+    EXPECT_FALSE(IsUtf8(text)) << text;
   }
 }
 
