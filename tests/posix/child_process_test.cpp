@@ -1,4 +1,4 @@
-// Processes, their output and the descriptors that they have.
+// Child processes: their output, the descriptors that they have, and the terminal that they find.
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
@@ -12,7 +12,6 @@
 
 #include "platform/posix/child_output.h"
 #include "platform/posix/text_file.h"
-#include "platform/process_setup.h"
 #include "platform/terminal.h"
 
 namespace {
@@ -88,41 +87,6 @@ std::string WidthOf(unsigned short columns) {
 TEST(Terminal, HasAWidth) {
   EXPECT_EQ(WidthOf(132), "132 0");
   EXPECT_EQ(WidthOf(0), "80 0");  // one that does not say
-}
-
-TEST(Calls, AreRepeatedWhenASignalInterruptsThem) {
-  int calls = 0;
-  const auto callWith = [&calls](int interruptions, ssize_t last) {
-    calls = 0;
-    return RetryOnInterrupt([&, interruptions, last] {
-      const bool isInterrupted = ++calls <= interruptions;
-      errno = isInterrupted ? EINTR : ENOENT;
-      return isInterrupted ? ssize_t{-1} : last;
-    });
-  };
-  EXPECT_TRUE(callWith(5, 7) == 7 && calls == 6);
-  EXPECT_TRUE(callWith(0, -1) == -1 && calls == 1);
-}
-
-int NextDescriptor() {
-  const int next = ::open("/", O_RDONLY);
-  ::close(next);
-  return next;
-}
-
-TEST(ProcessSetup, OpensClosedDescriptorsAndIgnoresSignals) {
-  const auto run = [] {
-    const int next = NextDescriptor();
-    ::close(STDIN_FILENO);
-    ::close(STDOUT_FILENO);
-    PrepareProcess();
-    std::raise(SIGPIPE);
-    std::raise(SIGXFSZ);
-    const bool areOpen = (::fcntl(STDIN_FILENO, F_GETFL) & O_ACCMODE) == O_RDWR &&
-                         ::write(STDOUT_FILENO, "x", /*count=*/1) == 1;
-    ::_exit(areOpen && NextDescriptor() == next ? 7 : 1);
-  };
-  EXPECT_EXIT(run(), testing::ExitedWithCode(7), "");
 }
 
 }  // namespace

@@ -36,9 +36,10 @@ def closed_descriptors(machine, closing):
     for arguments in (("-start", "7", "-l", str(machine.source)), ("-start", "../x"),
                       ("-report", str(machine.archive))):
         machine.must(*arguments, before=caller)
-        taken = [line for line in trace.read_text().splitlines()
-                 if str(machine.root) in line and line.endswith((" = 0", " = 1", " = 2"))]
+        opened = [line for line in trace.read_text().splitlines() if str(machine.root) in line]
+        taken = [line for line in opened if line.endswith((" = 0", " = 1", " = 2"))]
         check(not taken, f"opened as a standard stream: {taken[:1]}")
+        check(any(line.endswith(" = 3") for line in opened), "a descriptor is left open")
     check(len(machine.sections()) == 3, "not recorded")
 
 
