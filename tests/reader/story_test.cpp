@@ -86,8 +86,8 @@ const std::vector<Step> story = {
     {{"Upgrade", "Prod", "Successful"},
      [] {
        SetSoftware("A", "ORX Server", "9.5");
-       SetSoftware("B", "Of thirty with maker's", "1.0");
-       SetSoftware("C", "Longer than the column of other names", "1.0");
+       SetSoftware("B", "A name that fills the whole column", "1.0");
+       SetSoftware("C", "A name that is longer than a column", "1.0");
        Remove(software + "T");
        Set(copies + "Prod\\ORX Server\\CurrentVersion", "Version", "10");
      }},
