@@ -61,7 +61,7 @@ TEST_F(Files, AreCopiedToAnUnusedNameOnly) {
   const std::string text(100000, 't');
   const std::string source = Make("source", text);
   fs::last_write_time(source, fs::last_write_time(source) - std::chrono::hours(1000));
-  fs::permissions(source, fs::perms::owner_read);
+  fs::permissions(source, fs::perms(0444));
   Make("taken", "old");
   Make("folder/");
   EXPECT_TRUE(CopyToNewFile(source, In("copy"), /*trusted=*/Root));

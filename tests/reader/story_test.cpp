@@ -68,7 +68,11 @@ const std::vector<Step> story = {
      }},
     {{"Start", "Prod", "0"}, [] { Machine().Services.Entries[2].CurrentState = 4; }},
     {{"Configure", "Prod", "0"}, [] { Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "8192"); }},
-    {{"Configure", "Prod", "1603"}, [] { Set(copies + "Prod\\PROFILES\\ORX", "Port", "50010"); }},
+    {{"Configure", "Prod", "1603"},
+     [] {
+       Set(copies + "Prod\\PROFILES\\ORX", "Port", "50010");
+       Set("SOFTWARE\\ZEK\\ORX\\GLOBAL_PROFILE", "Old", "1");
+     }},
     {{"Start", "Prod", "0"},
      [] { SetProcesses("init orxserver orxserver orxserver orxlistener"); }},
     {{"Configure", "Prod", "0"},
