@@ -93,12 +93,9 @@ class Side(Machine):
                              + self.contents(name, data))
         yield from (f"archive: {name}, {entries[name]}" for name in sorted(entries))
 
-    def outcome_of(self, runs, ini=""):
-        """Makes runs, in a history that has such a file. Returns what they print and leave."""
+    def outcome_of(self, runs):
+        """Makes runs in a new history. Returns what they print and leave."""
         self.reset()
-        if ini:
-            self.history.mkdir()
-            self.ini.write_text(ini)
         outputs = [self.output_of(arguments) for arguments in runs]
         return "\n".join([*outputs, *self.tree(), *self.archive()])
 
@@ -149,12 +146,6 @@ def read_histories():
 def filled(word):
     word = word.replace("{newline}", "\n")
     return re.sub(r"\{(\d+)-letters\}", lambda m: (string.ascii_lowercase * 240)[:int(m[1])], word)
-
-
-def ini_with_names(last):
-    """A history file with section names whose length is below, at or above the limit."""
-    names = ["History", *(letter * 999 for letter in "abcdefghij"), "z" * (last + 2), "after"]
-    return "".join(f"[{name}]\nAction={len(name)}\n" for name in names)
 
 
 def run_overlapping(side):
@@ -272,9 +263,6 @@ def main():
     for name, runs in histories.items():
         comparison.compare(name, Side.outcome_of, runs)
     comparison.compare_readers()
-    for last in (227, 228, 229, 900):  # below, at and above the limit
-        comparison.compare(f"section names, {last}", Side.outcome_of, [REPORT],
-                           ini_with_names(last))
     for name, run in (("links instead of the folders", run_links),
                       ("overlapping starts", run_overlapping), ("killed starts", run_killed)):
         comparison.compare(name, run)

@@ -65,7 +65,9 @@ TEST(Changes, PairItemsOfOneIdentity) {
       {Table({started, started}), Table({stopped, started}), stops},
       {Table({started, paused}), Table({paused, stopped, stopped}),
        stops + "added services ORX|state - > Stopped\n"},
-      {table, Table({stopped, paused}), stops + "added services ORX|state - > Paused\n"},
+      {Table({stopped, paused}), Table({started, {"", "ORX", "Is starting"}}),
+       "changed services ORX|state Stopped > Started\n"
+       "changed services ORX|state Paused > Is starting\n"},
       {Table({started, started}), table, "removed services ORX|state Started > -\n"},
       {Table({}), Table({{"", "b ORX", "Paused"}, {"", "a ORX", "Paused"}}),
        "added services b ORX|state - > Paused\nadded services a ORX|state - > Paused\n"},
