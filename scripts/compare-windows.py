@@ -243,7 +243,7 @@ class Comparison:
         self.regedit("/S", "load.reg")
 
     def load_from_windows(self):
-        """Gives Linux the keys of the registry, in its order."""
+        """Makes the export of Linux from the registry, in its order."""
         self.regedit("/E", "registry.reg", SOFTWARE)
         shutil.move(self.windows.files / "registry.reg", self.export)
 
