@@ -4,7 +4,6 @@
 
 #include <filesystem>
 #include <numeric>
-#include <regex>
 
 #include "app/install_history.h"
 #include "inventory/service_list.h"
@@ -121,8 +120,8 @@ TEST(History, HasWhatWentWrongInTheCalls) {
   RunTool({"-end", "again"});
   // Two starts at once can leave the report of the earlier one before that of the later.
   RunTool({"-start", "both", "-Product", "first"});
-  const std::string first = std::regex_replace(FileText(InHistory("both/ORXInstallEvent.Log")),
-                                               std::regex("[0-9]{8} "), "20200101 ");
+  const std::string first = Replaced(WithoutTimes(FileText(InHistory("both/ORXInstallEvent.Log"))),
+                                     "<time>", "20200101 00:00:00");
   Record("both", "-Product", "second");
   const std::string log = InHistory("C1/both/ORXInstallEvent.Log");
   WriteFileText(log, first + FileText(log));
