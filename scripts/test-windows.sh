@@ -33,20 +33,21 @@ rm -rf "$WINEPREFIX"
 scripts/wine.sh wineboot --init
 trap 'wineserver --kill || true' EXIT  # it may have ended by itself
 
-# The unit tests once more, without the runs of the program, which ctest does.
+# Unit tests once more, without the runs of the program, which ctest does.
 run_unit_tests() {
-  for tests in orx_tests orx_reader_tests orx_platform_tests; do
-    scripts/wine.sh "build/windows/tests/$tests.exe" --gtest_brief=1 --gtest_filter=-Run.*
-  done
+  scripts/wine.sh "build/windows/tests/$1.exe" --gtest_brief=1 --gtest_filter=-Run.*
 }
 for language in ja_JP ru_RU; do
   echo "Unit tests: $language"
-  ORX_LOCALE="$language.UTF-8" run_unit_tests
+  for tests in orx_tests orx_reader_tests orx_platform_tests; do
+    ORX_LOCALE="$language.UTF-8" run_unit_tests "$tests"
+  done
 done
+# Only the platform layer calls what differs between versions.
 for version in vista win7 win8 win81 win10; do
   echo "Unit tests: $version"
   scripts/wine.sh reg add 'HKCU\Software\Wine' /v Version /d "$version" /f > /dev/null
-  run_unit_tests
+  run_unit_tests orx_platform_tests
 done
 
 ctest --preset windows
