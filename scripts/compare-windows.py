@@ -27,7 +27,6 @@ HISTORIES = REPOSITORY / "scripts/comparison/histories.txt"
 SOFTWARE = "HKEY_LOCAL_MACHINE\\SOFTWARE"
 PRODUCTS = "Microsoft\\Windows\\CurrentVersion\\Installer\\UserData\\S-1-5-18\\Products"
 TOOL_KEYS = [f"{SOFTWARE}\\{key}" for key in ("ZEK", "ODBC\\ODBCINST.INI", PRODUCTS)]
-REPORT = ["-report", "{files}/out.zip"]
 INSTALLER_FILES = ("setup.log", "sub/setup.log", "setup.rsp", "setup.trc", "ORXInstallEvent.Log",
                    "予定表.log", "表/予定表.log")
 
@@ -174,7 +173,8 @@ def run_links(side):
         linked.symlink_to(target)
         before = contents(target)
         try:
-            texts += [side.output_of(arguments) for arguments in (["-start", "42"], REPORT)]
+            texts += [side.output_of(arguments)
+                      for arguments in (["-start", "42"], ["-report", "{files}/out.zip"])]
         finally:
             linked.unlink()
             target.rename(linked)

@@ -2,7 +2,7 @@
 
 #include <sys/utsname.h>
 
-static std::string FirstLabel(const std::string& hostName) {
+std::string FirstLabel(const std::string& hostName) {
   return hostName.substr(0, hostName.find('.'));
 }
 
@@ -12,8 +12,7 @@ std::string HostName() {
   return FirstLabel(system.nodename);
 }
 
-std::optional<std::string> ShortNameOf(const std::string& hostName) {
-  const std::string name = FirstLabel(hostName);
+std::optional<std::string> ShortNameOf(const std::string& label) {
   constexpr size_t longest = 14;
-  return !name.empty() && name.size() <= longest ? std::optional(name) : std::nullopt;
+  return !label.empty() && label.size() <= longest ? std::optional(label) : std::nullopt;
 }

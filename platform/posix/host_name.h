@@ -3,8 +3,11 @@
 #include <optional>
 #include <string>
 
-// The host name (uname) up to its first dot, of any length; empty if the kernel has none.
+// A host name up to its first dot.
+std::string FirstLabel(const std::string& hostName);
+
+// The first label of this machine's host name (uname), of any length; empty if the kernel has none.
 std::string HostName();
 
-// What ShortComputerName returns for a host name; tests supply others than the kernel's.
-std::optional<std::string> ShortNameOf(const std::string& hostName);
+// What ShortComputerName returns for that label; tests supply others.
+std::optional<std::string> ShortNameOf(const std::string& label);

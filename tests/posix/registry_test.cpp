@@ -4,6 +4,7 @@
 #include "platform/registry.h"
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <cstdlib>
 #include <filesystem>
@@ -182,10 +183,13 @@ TEST(Registry, DoesNotReadMoreForMoreQueries) {
 
 TEST(Registry, FindsTheExportOfTheMachine) {
   const ScratchFolder scratch;
+  scratch.Make("folder/ZEK/Registry.reg/");
   scratch.Make("link/ZEK/");
+  scratch.Make("pipe/ZEK/");
+  ::mkfifo(scratch.In("pipe/ZEK/Registry.reg").c_str(), 0600);
   fs::create_symlink(scratch.Make("export", hive + "S]\n\"a\"=\"b\"\n"),
                      scratch.In("link/ZEK/Registry.reg"));
-  for (const std::string kind : {"link", "missing"}) {
+  for (const std::string kind : {"link", "folder", "pipe", "missing"}) {
     ::setenv("ORX_COMMON_APPDATA", scratch.In(kind).c_str(), /*overwrite=*/1);
     const size_t found = kind == "link" ? 1 : 0;
     EXPECT_EQ(EnumRegistrySubKeys("").size(), found) << kind;

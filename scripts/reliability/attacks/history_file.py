@@ -87,9 +87,9 @@ def lock_that_is_never_freed(machine):
 
 @attack(("first start", "-start", "7"), ("start", "-start", "9"), ("restart", "-start", "8"),
         ("end", "-end", "8", "-CopyName", "C1"))
-def one_replacement(machine, *arguments):
-    """An end makes a second one, for the log's new path, when the log is closed and its folder is
-    moved: Windows moves no folder with an open file."""
+def replacements_of_the_history_file(machine, *arguments):
+    """One for a start. An end makes a second one, for the log's new path, after the log is closed
+    and its folder moved: Windows moves no folder with an open file."""
     if arguments != ("-start", "7"):
         machine.must("-start", "8")
     trace = machine.scratch / "trace"
