@@ -14,10 +14,17 @@ if [ "$1" = format ]; then
   git ls-files '*.py' | xargs pycodestyle --max-line-length=100
 else
   scripts/build.sh release
-  # The shallow mode of the path analysis takes a third of the time, and skips calls of calls.
+  # Twelve sources at a time, as most of the time goes into the headers that they share. The path
+  # analysis enters sources that another one includes only if that one's name begins like this.
+  rm -rf build/analysis
+  mkdir -p build/analysis
   git ls-files 'app/*.cpp' 'history/*.cpp' 'eventlog/*.cpp' 'inventory/*.cpp' 'products/*.cpp' \
-    'report/*.cpp' 'reader/*.cpp' 'platform/*.cpp' ':!platform/windows' |
-    xargs -P "$(nproc)" -n 4 clang-tidy -p build/release --quiet \
-      --extra-arg=-Wno-unknown-warning-option --extra-arg=-fno-caret-diagnostics --extra-arg=-Xclang --extra-arg=-analyzer-config \
-      --extra-arg=-Xclang --extra-arg=mode=shallow
+    'report/*.cpp' 'reader/*.cpp' 'platform/*.cpp' ':!platform/windows' ':!*/main.cpp' |
+    awk '{ printf "#include \"%s\"\n", $0 > "build/analysis/UnifiedSource" int((NR - 1) / 12) ".cpp" }'
+  # The shallow mode of the path analysis takes a third of the time, and skips calls of calls.
+  printf '%s\n' app/main.cpp reader/main.cpp build/analysis/*.cpp |
+    xargs -P "$(nproc)" -n 1 clang-tidy -p build/release --quiet \
+      --checks=-bugprone-suspicious-include \
+      --extra-arg=-Wno-unknown-warning-option --extra-arg=-fno-caret-diagnostics --extra-arg=-Xclang \
+      --extra-arg=-analyzer-config --extra-arg=-Xclang --extra-arg=mode=shallow
 fi
