@@ -16,6 +16,7 @@ if(CMAKE_CROSSCOMPILING)
   add_library(${ORX_MINIZIP_LIBRARY} STATIC ${folder}/minizip/zip.c ${folder}/minizip/ioapi.c
     ${folder}/minizip/unzip.c)
   target_compile_options(${ORX_MINIZIP_LIBRARY} PRIVATE -w)
+  set_target_properties(${ORX_MINIZIP_LIBRARY} PROPERTIES UNITY_BUILD OFF)  # its files share names
   target_link_libraries(${ORX_MINIZIP_LIBRARY} PRIVATE ZLIB::ZLIB)
 else()
   find_library(ORX_MINIZIP_LIBRARY NAMES libminizip.a minizip REQUIRED)
