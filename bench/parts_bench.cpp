@@ -1,8 +1,6 @@
 #include <benchmark/benchmark.h>
 
-#include <cstring>
-#include <filesystem>
-#include <fstream>
+#include <functional>
 #include <string>
 
 #include "eventlog/logger.h"
@@ -11,6 +9,7 @@
 #include "platform/profile_file.h"
 #include "platform/profile_text.h"
 #include "report/zipper.h"
+#include "tests/support/scratch_folder.h"
 
 // The parts whose cost depends on the size of a machine or a history.
 
@@ -35,26 +34,6 @@ std::string HistoryText(int64_t events) {
   }
   return text;
 }
-
-// A folder for one measurement.
-class ScratchFolder {
- public:
-  ScratchFolder() {
-    std::string name = (std::filesystem::temp_directory_path() / "orx-bench-XXXXXX").string();
-    Path = ::mkdtemp(name.data());
-  }
-  ~ScratchFolder() { std::filesystem::remove_all(Path); }
-  ScratchFolder(const ScratchFolder&) = delete;
-  ScratchFolder& operator=(const ScratchFolder&) = delete;
-
-  std::string Make(const std::string& name, const std::string& text) const {
-    const std::string file = (Path / name).string();
-    std::ofstream(file, std::ios::binary) << text;
-    return file;
-  }
-
-  std::filesystem::path Path;
-};
 
 void ParseHistory(benchmark::State& state) {
   const std::string text = HistoryText(state.range(0));
@@ -110,13 +89,10 @@ std::string ExportText(int64_t keys) {
 // A first question: it reads the entire export once and keeps one branch.
 void AskExport(benchmark::State& state) {
   const std::string text = ExportText(state.range(0));
-  const auto read = [&text](uint64_t offset, char* buffer, size_t size) {
-    const std::string_view rest = std::string_view(text).substr(std::min(offset, text.size()));
-    std::memcpy(buffer, rest.data(), std::min(size, rest.size()));
-    return std::min(size, rest.size());
-  };
+  const auto read = ReaderOf(text);  // not copied with its text each time
   for (auto _ : state) {
-    benchmark::DoNotOptimize(RegistryExport(read).Read("SOFTWARE\\ZEK\\ORX", "Version", 100));
+    benchmark::DoNotOptimize(
+        RegistryExport(std::ref(read)).Read("SOFTWARE\\ZEK\\ORX", "Version", 100));
   }
   state.SetBytesProcessed(state.iterations() * static_cast<int64_t>(text.size()));
 }
@@ -124,13 +100,12 @@ void AskExport(benchmark::State& state) {
 void PackFolder(benchmark::State& state) {
   const ScratchFolder folder;
   const std::string text = HistoryText(40);
-  std::filesystem::create_directory(folder.Path / "history");
   for (int64_t i = 0; i < state.range(0); ++i) {
     folder.Make("history/" + EventName(i), text);
   }
-  const std::string history = (folder.Path / "history").string();
+  const std::string history = folder.In("history");
   for (auto _ : state) {
-    CZipper zipper((folder.Path / "history.zip").c_str(), history.c_str());
+    CZipper zipper(folder.In("history.zip").c_str(), history.c_str());
     zipper.AddFolder(history);
   }
   state.SetBytesProcessed(state.iterations() * state.range(0) * static_cast<int64_t>(text.size()));
@@ -144,7 +119,7 @@ void PrintMembers(benchmark::State& state) {
     users.LocalMembers.push_back({"HOST\\user" + EventName(i), "group" + EventName(i / 10)});
   }
   for (auto _ : state) {
-    CLogger::GetInstance().Open((folder.Path / "log").string(), std::ios::out);
+    CLogger::GetInstance().Open(folder.In("log"), std::ios::out);
     users.Print();
     CLogger::GetInstance().Close();
   }

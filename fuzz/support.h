@@ -8,6 +8,8 @@
 #include <string_view>
 #include <vector>
 
+#include "tests/support/file_text.h"
+
 // What the fuzzer calls with each input; every target defines it.
 void CheckInput(const std::string& input);
 
@@ -28,12 +30,4 @@ inline std::vector<std::string> Split(std::string_view text, char separator) {
   }
   parts.emplace_back(text);
   return parts;
-}
-
-// Reads the bytes as a file is read: fills at most size bytes of the buffer from the offset on and
-// returns how many. The bytes must outlive it.
-inline auto ReaderOf(const std::string& bytes) {
-  return [&bytes](uint64_t offset, char* buffer, size_t size) {
-    return offset < bytes.size() ? bytes.copy(buffer, size, offset) : size_t{0};
-  };
 }

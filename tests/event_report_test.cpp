@@ -237,25 +237,20 @@ TEST(Lists, LeaveOutThisProcessAndWhatCannotBeLookedAt) {
   EXPECT_EQ(CollectedProcesses(), "0 1:KERNEL32.DLL 3:PLAIN.EXE 4:root.exe");
 }
 
-TEST(Lists, TakeTheOldCopyInItsOwnCaseOnly) {
-  Machine() = FakeMachine();
-  Machine().Load("[SOFTWARE\\ZEK\\orx]\n");
-  SetCopyGeneration(0);
-  const std::string text = LoggedText([] {
-    CORXProductsList list;
-    list.Collect();
-    list.Print();
-  });
-  EXPECT_TRUE(text.ends_with("*\nThere is no ORX prior to V9 Installed \n")) << text;
-}
-
 const int32_t firstGeneration = GetCopyGeneration();
 
 TEST(Lists, AppendTheCopiesOfTheLayoutInForce) {
   EXPECT_EQ(firstGeneration, 1);
   Machine() = FakeMachine();
-  Machine().Load(Golden("registry_added.txt"));
+  Machine().Load("[SOFTWARE\\ZEK\\orx]\n");  // in this case it is no copy of the old layout
+  SetCopyGeneration(0);
   CORXProductsList list;
+  list.Collect();
+  const std::string text = LoggedText([&list] { list.Print(); });
+  EXPECT_TRUE(text.ends_with("*\nThere is no ORX prior to V9 Installed \n")) << text;
+
+  Machine() = FakeMachine();
+  Machine().Load(Golden("registry_added.txt"));
   for (const int32_t generation : {0, 1, 1}) {
     SetCopyGeneration(generation);
     EXPECT_EQ(list.Collect(), 0);

@@ -25,12 +25,6 @@ std::string Case(const std::string& name) {
   return FileText(ORX_POSIX_TESTS "/registry_cases/" + name);
 }
 
-RegistryExport Parsed(const std::string& bytes) {
-  return RegistryExport([bytes](uint64_t offset, char* buffer, size_t size) {
-    return offset < bytes.size() ? bytes.copy(buffer, size, offset) : 0;
-  });
-}
-
 // A key and all below it: values as name=type:data, in which a byte can be <number>.
 std::string Dump(RegistryExport& registry, const std::string& path = "") {
   std::string text = "[" + path + "]\n";
@@ -63,7 +57,7 @@ TEST(Registry, ReadsEveryFormOfExport) {
       const std::string text = Replaced(Case(name + ".reg"), "\n", lineEnd);
       const std::string tree = Replaced(Case(name + ".txt"), "<line end>", shownEnd);
       for (const std::string& form : {text, "\xEF\xBB\xBF" + text, AsUtf16(text)}) {
-        RegistryExport registry = Parsed(form);
+        RegistryExport registry(ReaderOf(form));
         EXPECT_EQ(Dump(registry), tree) << name;
       }
     }
@@ -76,7 +70,7 @@ TEST(Registry, ReadsATruncatedExport) {
        {std::pair(text, "Second"s), std::pair(AsUtf16(text), AsUtf16("Second").substr(2))}) {
     const size_t firstKeyEnd = complete.find(marker);
     for (size_t size = firstKeyEnd; size < complete.size(); size += 3) {
-      RegistryExport registry = Parsed(complete.substr(0, size));
+      RegistryExport registry(ReaderOf(complete.substr(0, size)));
       EXPECT_NE(Dump(registry).find("\nOther=4294901778:A\n"), std::string::npos);
     }
   }
@@ -99,7 +93,7 @@ TEST(Registry, KeepsTheLimitsOfNames) {
     text += hive + "S]\n\"" + name + "\"=\"abc\"\n" + hive + "S\\" + name + "]\n@=\"of " + name +
             "\"\n";
   }
-  RegistryExport registry = Parsed(text);
+  RegistryExport registry(ReaderOf(text));
   EXPECT_EQ(registry.ValueNames("S"), std::vector{longest});
   EXPECT_EQ(registry.SubKeyNames("S"), (std::vector{longest, "after"s}));
   EXPECT_EQ(registry.Read("S", longest + "l", 4).Bytes, "abc\0"s);
@@ -110,7 +104,7 @@ TEST(Registry, KeepsTheLimitsOfNames) {
   EXPECT_EQ(registry.Read("S", "none", 4).Type, 0U);
   for (const size_t levels : {512, 513}) {
     const std::string path = "S" + Repeated("\\k", levels - 1);
-    EXPECT_EQ(Parsed(hive + path + "]\n@=\"1\"\n").Read(path, "", 9).Bytes,
+    EXPECT_EQ(RegistryExport(ReaderOf(hive + path + "]\n@=\"1\"\n")).Read(path, "", 9).Bytes,
               levels == 512 ? "1\0"s : "");
   }
 }
@@ -118,7 +112,7 @@ TEST(Registry, KeepsTheLimitsOfNames) {
 // Whatever was queried before.
 TEST(Registry, IgnoresABackslashAtTheEndOfAPath) {
   for (const std::string earlier : {"", "A\\B", "A\\B\\", "A\\B\\C\\", "A\\B\\C\\\\"}) {
-    RegistryExport registry = Parsed(hive + "A\\B\\C]\n\"a\"=\"b\"\n");
+    RegistryExport registry(ReaderOf(hive + "A\\B\\C]\n\"a\"=\"b\"\n"));
     registry.SubKeyNames(earlier);
     registry.ValueNames(earlier);
     EXPECT_EQ(registry.Read("A\\B\\C\\", "a", 9).Bytes, "b\0"s) << earlier;
@@ -131,7 +125,7 @@ TEST(Registry, IgnoresABackslashAtTheEndOfAPath) {
 
 TEST(Registry, HasNothingBelowAKeyThatIsRemovedLater) {
   const std::string text = hive + "A\\B\\C]\n\"a\"=\"b\"\n[-HKEY_LOCAL_MACHINE\\A]\n";
-  EXPECT_EQ(Parsed(text).Read("A\\B\\C", "a", 9).Type, 0U);
+  EXPECT_EQ(RegistryExport(ReaderOf(text)).Read("A\\B\\C", "a", 9).Type, 0U);
 }
 
 // With a careless parser each of these takes minutes or overflows the stack.
@@ -153,7 +147,7 @@ TEST(Registry, ReadsHugeLinesInLinearTime) {
   for (const std::string& huge : hugeLines) {
     const std::string text = key + huge + '\n' + key + "\"after\"=\"2\"\n";
     for (const std::string& bytes : {text, AsUtf16(text)}) {
-      RegistryExport registry = Parsed(bytes);
+      RegistryExport registry(ReaderOf(bytes));
       EXPECT_EQ(registry.Read("S", "after", 100).Bytes, "2\0"s) << huge.substr(0, 40);
       EXPECT_EQ(registry.SubKeyNames("S").size(), 0U);
     }
@@ -168,11 +162,12 @@ TEST(Registry, DoesNotReadMoreForMoreQueries) {
     text += hive + parent + std::to_string(i) + "]\n\"a\"=\"b\"\n";
   }
   size_t bytesRead = 0;
-  RegistryExport registry([&](uint64_t offset, char* buffer, size_t size) {
-    const size_t got = offset < text.size() ? text.copy(buffer, size, offset) : 0;
-    bytesRead += got;
-    return got;
-  });
+  RegistryExport registry(
+      [&bytesRead, read = ReaderOf(text)](uint64_t offset, char* buffer, size_t size) {
+        const size_t got = read(offset, buffer, size);
+        bytesRead += got;
+        return got;
+      });
   for (int i = 1000; i < 2000; ++i) {
     const std::string path = "SOFTWARE\\ZEK\\ORX\\" + std::to_string(i);
     EXPECT_EQ(registry.Read(path, "a", 100).Bytes, "b\0"s);

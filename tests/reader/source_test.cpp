@@ -26,11 +26,8 @@ std::string Content(const std::unique_ptr<Source>& source, const std::string& er
 }
 
 std::string ContentOf(const std::string& archive) {
-  const auto read = [&archive](uint64_t offset, char* buffer, size_t size) {
-    return offset < archive.size() ? archive.copy(buffer, size, offset) : 0;
-  };
   std::string error;
-  return Content(OpenArchive({archive.size(), read}, error), error);
+  return Content(OpenArchive({archive.size(), ReaderOf(archive)}, error), error);
 }
 
 constexpr uint32_t folder = 0x10;
