@@ -130,6 +130,7 @@ std::string EventJson(std::string_view source, const Event& event) {
 
 std::string EventDetailsJson(std::string_view source, const Event& event) {
   Json object = Facts(event);
+  object.erase("changes");  // their list has that name here
   object["command_line"] = event.CommandLine;
   object["report"] = OrNull(event.Report);
   object["files"] = FilesOf(event);

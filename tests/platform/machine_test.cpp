@@ -18,7 +18,9 @@ TEST(Computer, HasAVersionAndProcessors) {
   EXPECT_EQ(version.PlatformID <= 2, isWindows);
   const SystemInfo info = QuerySystemInfo();
   EXPECT_GT(info.NumberOfProcessors, 0U);
-  EXPECT_TRUE(info.ProcessorLevel > 0 || info.ProcessorArchitecture == 0xFFFF);
+#if defined(__x86_64__) || defined(_M_X64)
+  EXPECT_TRUE(info.ProcessorLevel > 0 && info.ProcessorArchitecture == 9);
+#endif
 }
 
 TEST(KnownFolders, IncludeCommonApplicationData) {

@@ -8,8 +8,6 @@
 
 #include <cstdlib>
 #include <filesystem>
-#include <iterator>
-#include <sstream>
 
 #include "platform/posix/registry/registry_export.h"
 #include "tests/support/scratch_folder.h"
@@ -74,12 +72,6 @@ TEST(Registry, ReadsATruncatedExport) {
       EXPECT_NE(Dump(registry).find("\nOther=4294901778:A\n"), std::string::npos);
     }
   }
-}
-
-std::string Repeated(const std::string& text, size_t times) {
-  std::ostringstream result;
-  std::fill_n(std::ostream_iterator<std::string>(result), times, text);
-  return result.str();
 }
 
 // A heading with more than Windows allows is damaged; a name that is allowed but does not fit the

@@ -13,14 +13,6 @@ namespace {
 const std::string ini = "[42]\nStart_Time=" + std::string(startTime) + "\nEnd_Time=" + endTime +
                         "\nCopy_Name=C1\nResult=0\n";
 
-std::string Repeated(size_t count, const std::string& text) {
-  std::string all;
-  for (size_t i = 0; i < count; ++i) {
-    all += text;
-  }
-  return all;
-}
-
 // The golden report with something inserted before each occurrence of a text.
 std::string ReportWith(const std::string& inserted, const std::string& before) {
   return Replaced(GoldenReport(), before, inserted + before);
@@ -69,11 +61,11 @@ const LimitCase limitCases[] = {
      [](size_t runs) {
        const std::string whole = GoldenReport();
        const std::string open = whole.substr(0, whole.find("Copying files\n"));
-       return Repeated(runs, Replaced(open, startTime, "20200101 22:00:03")) + whole;
+       return Repeated(Replaced(open, startTime, "20200101 22:00:03"), runs) + whole;
      }},
     {"cannot be compared", kMostRows - 10, 10, 1, nullptr,
      [](size_t rows) {
-       return ReportWith(Repeated(rows, "1                  p\n"), "4                  UNK_NAME\n");
+       return ReportWith(Repeated("1                  p\n", rows), "4                  UNK_NAME\n");
      }},
 };
 

@@ -96,6 +96,8 @@ TEST(Source, FindsTheHistoryOrSaysWhatIsWrong) {
        "A/r=x HISTORY.INI=i"},
       {BuildArchive({{"d/History.ini", "no"}, {"ZEK/ORXHistory/History.ini", "i"}}),
        "History.ini=i ! More than one history is here; the one in ZEK/ORXHistory/ is read."},
+      {BuildArchive({{"d/History.ini", "i"}, {"e/History.ini", "no"}}),
+       "History.ini=i ! More than one history is here; the one in d/ is read."},
       {BuildArchive({{"ZEK/ORXHistory/A/42/ORXInstallEvent.Log", "r"}, {"x", ""}}),
        "A/42/ORXInstallEvent.Log=r"},
       {BuildArchive({{"a", "x"}}), "error: holds no history; name an archive that the report made"},

@@ -36,3 +36,11 @@ std::string Replaced(std::string text, const std::string& old, const std::string
   }
   return text;
 }
+
+std::string Repeated(const std::string& text, size_t times) {
+  std::string all;
+  for (size_t i = 0; i < times; ++i) {
+    all += text;
+  }
+  return all;
+}

@@ -17,6 +17,8 @@ std::string WithoutTimes(const std::string& text);
 // The text with each occurrence replaced.
 std::string Replaced(std::string text, const std::string& old, const std::string& by);
 
+std::string Repeated(const std::string& text, size_t times);
+
 // Reads bytes as a file is read: fills at most size bytes of the buffer from the offset on, and
 // returns how many.
 inline auto ReaderOf(std::string bytes) {

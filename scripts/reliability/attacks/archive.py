@@ -180,6 +180,17 @@ def file_that_grows_while_it_is(machine, name, call):
 
 
 @attack()
+def file_that_is_cut_while_it_is_collected(machine):
+    machine.record("7")
+    report = machine.start("-report", str(machine.archive),
+                           before=injecting("sendfile", "delay_enter=300000"))
+    wait_for(lambda: list(machine.history.glob("C1/7/.*")), "copies nothing")
+    machine.source.write_text("")
+    machine.watch()
+    check(report.wait(20) == 0, "exit code of the report")
+
+
+@attack()
 def containers_with_equal_process_numbers(machine):
     """Two reports collect one file at once."""
     require_root()
