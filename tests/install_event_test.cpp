@@ -170,18 +170,11 @@ TEST(InstallEvent, HasNamesThatLeadElsewhere) {
 
 TEST(InstallEvent, FailsWithoutTheHistoryFolder) {
   const ScratchHistory scratch;
-  const std::string path = scratch.Make("ZEK/ORXHistory");  // a file in the way
-  const auto start = [&scratch] {
-    testing::internal::CaptureStdout();
-    const int result = RunTool({"-start", "1"});
-    return std::to_string(result) + scratch.Neutral(testing::internal::GetCapturedStdout());
-  };
-  const std::string failure = "1 Failed to create path:@/ZEK/ORXHistoryInitialiation Failed:\n";
-  EXPECT_EQ(start(), failure);
-  std::filesystem::remove(path);
-  std::error_code noLinks;  // they are not possible everywhere
-  std::filesystem::create_directory_symlink(scratch.Make("outside/"), path, noLinks);
-  EXPECT_TRUE(noLinks || start() == failure);
+  scratch.Make("ZEK/ORXHistory");  // a file in the way
+  testing::internal::CaptureStdout();
+  EXPECT_EQ(RunTool({"-start", "1"}), 1);
+  EXPECT_EQ(scratch.Neutral(testing::internal::GetCapturedStdout()),
+            " Failed to create path:@/ZEK/ORXHistoryInitialiation Failed:\n");
 }
 
 }  // namespace

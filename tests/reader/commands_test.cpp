@@ -16,7 +16,7 @@
 namespace {
 
 // What a call prints, its errors last, and its exit code.
-std::string OutputOf(const std::string& call) {
+std::string OutputOf(const std::string& call, bool hasColours) {
   std::istringstream words(call);
   ProgramArguments arguments({std::istream_iterator<std::string>(words), {}});
   testing::internal::CaptureStdout();
@@ -25,6 +25,7 @@ std::string OutputOf(const std::string& call) {
   if (const auto line =
           ParseCommandLine(arguments.Count(), arguments.Vector(), /*version=*/"1.0", result)) {
     ViewOptions options;
+    options.HasColours = hasColours;
     options.ShowsAll = line->ShowsAll;
     result = RunCommand(*line, options);
   }
@@ -32,13 +33,15 @@ std::string OutputOf(const std::string& call) {
   return output + testing::internal::GetCapturedStderr() + "exit code " + std::to_string(result);
 }
 
-// The golden session has the calls too, each after "$ orxhistory ".
+// The golden session has the calls too, each after "$ orxhistory ", or "% orxhistory " for one with
+// colours, where "^[" is the escape character.
 TEST(Commands, PrintWhatTheGoldenSessionShows) {
   const ScratchHistory scratch;
   scratch.Make("ZEK/ORXHistory/History.ini", Golden("reader_history.ini"));
   scratch.Make("ZEK/ORXHistory/C1/42/ORXInstallEvent.Log",
                Replaced(GoldenReport(), "Copying files\n", "Copying files\nSetting up\n"));
   scratch.Make("ZEK/ORXHistory/C1/42/orx.log");
+  scratch.Make("ZEK/ORXHistory/C2/44/ORXInstallEvent.Log", "cut off");
   scratch.Make("a.zip",
                BuildArchive({{"History.ini", "[7]\nEnd_Time=20261114 22:41:55\nResult=0\n"},
                              {"A", "", 0x10},
@@ -55,8 +58,9 @@ TEST(Commands, PrintWhatTheGoldenSessionShows) {
   std::istringstream lines(golden);
   std::string session;
   for (std::string line; std::getline(lines, line);) {
-    if (line.starts_with("$ orxhistory")) {
-      session += line + '\n' + OutputOf(line.substr(12)) + "\n\n";
+    if (line.find("orxhistory") == 2) {
+      const std::string output = OutputOf(line.substr(12), line.starts_with('%'));
+      session += line + '\n' + Replaced(output, "\x1B", "^[") + "\n\n";
     }
   }
   std::filesystem::current_path(before);

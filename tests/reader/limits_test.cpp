@@ -63,7 +63,7 @@ const LimitCase limitCases[] = {
        const std::string open = whole.substr(0, whole.find("Copying files\n"));
        return Repeated(Replaced(open, startTime, "20200101 22:00:03"), runs) + whole;
      }},
-    {"cannot be compared", kMostRows - 10, 10, 1, nullptr,
+    {"damaged 42: the report C1/42/ORXInstallEvent.Log has a list", kMostRows - 10, 10, 1, nullptr,
      [](size_t rows) {
        return ReportWith(Repeated("1                  p\n", rows), "4                  UNK_NAME\n");
      }},
