@@ -61,6 +61,8 @@ const std::vector<Step> story = {
      [] {
        Set(copies + "Prod\\GLOBAL_PROFILE", "LogSize", "4096");
        Set(copies + "Prod\\PROFILES\\ORX", "Port", "50000");
+       Set(copies + "Prod\\PROFILES\\ORX", "Old", "1");
+       Set(copies + "Prod\\PROFILES\\TEST", "Port", "50000");
        Set(copies + "Prod\\ORX Server\\CurrentVersion", "Version", "9");
        Set(copies + "Prod\\ORX Server\\CurrentVersion", "ProductCode", "{1}");
        SetSoftware("A", "ORX Server", "9.4");
@@ -71,6 +73,8 @@ const std::vector<Step> story = {
     {{"Configure", "Prod", "1603"},
      [] {
        Set(copies + "Prod\\PROFILES\\ORX", "Port", "50010");
+       Remove(copies + "Prod\\PROFILES\\ORX", "Old");
+       Set(copies + "Prod\\PROFILES\\TEST", "Port", "50010");
        Set("SOFTWARE\\ZEK\\ORX\\GLOBAL_PROFILE", "Old", "1");
      }},
     {{"Start", "Prod", "0"},
