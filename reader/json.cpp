@@ -43,7 +43,6 @@ Json TimeOrNull(const std::optional<LocalTime>& time) {
 }
 
 Json Facts(const Event& event) {
-  const ChangeCounts& counts = event.Differences.Counts;
   return {{"event", event.Identity},
           {"computer", OrNull(event.Computer)},
           {"started", TimeOrNull(event.Started)},
@@ -56,9 +55,7 @@ Json Facts(const Event& event) {
           {"service_level", event.ServiceLevel},
           {"path", event.Path},
           {"copy", event.Copy},
-          {"result", event.Result},
-          {"changes",
-           {{"added", counts.Added}, {"removed", counts.Removed}, {"changed", counts.Changed}}}};
+          {"result", event.Result}};
 }
 
 Json Fields(const Change& change) {
@@ -123,14 +120,16 @@ Json NotCompared(const Event& event) {
 }  // namespace
 
 std::string EventJson(std::string_view source, const Event& event) {
+  const ChangeCounts& counts = event.Differences.Counts;
   Json object = Facts(event);
+  object["changes"] = {
+      {"added", counts.Added}, {"removed", counts.Removed}, {"changed", counts.Changed}};
   object["source"] = source;
   return Line(object);
 }
 
 std::string EventDetailsJson(std::string_view source, const Event& event) {
   Json object = Facts(event);
-  object.erase("changes");  // their list has that name here
   object["command_line"] = event.CommandLine;
   object["report"] = OrNull(event.Report);
   object["files"] = FilesOf(event);

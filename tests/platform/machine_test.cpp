@@ -19,8 +19,9 @@ TEST(Computer, HasAVersionAndProcessors) {
   const SystemInfo info = QuerySystemInfo();
   EXPECT_GT(info.NumberOfProcessors, 0U);
 #if defined(__x86_64__) || defined(_M_X64)
-  EXPECT_TRUE(info.ProcessorLevel > 0 && info.ProcessorArchitecture == 9);
+  EXPECT_EQ(info.ProcessorArchitecture, 9);
 #endif
+  EXPECT_TRUE(info.ProcessorLevel > 0 || info.ProcessorArchitecture == 0xFFFF);
 }
 
 TEST(KnownFolders, IncludeCommonApplicationData) {

@@ -188,6 +188,7 @@ def file_that_is_cut_while_it_is_collected(machine):
     machine.source.write_text("")
     machine.watch()
     check(report.wait(20) == 0, "exit code of the report")
+    check("C1/7/setup.log" in machine.packed(), "not packed")
 
 
 @attack()
